@@ -1,0 +1,241 @@
+#include <zv/arrays.h>
+
+#include <gtest/gtest.h>
+
+namespace {
+
+// Capacities a Resize(n) on a full array of capacity c must reach, by the halving/doubling rule.
+unsigned int ExpectedCapacity(unsigned int cap, unsigned int n) {
+  if ((cap >> 1) < n && n <= cap) return cap;
+  while (cap > n)
+    cap >>= 1;
+  while (cap < n)
+    cap = cap ? cap << 1 : 1;
+  return cap ? cap : 1;
+}
+
+TEST(ArrayConstruction, CapacityArgumentsFollowTheRules) {
+  ZvDoubleArray a(0);
+  EXPECT_EQ(a.size, 0u);
+  EXPECT_EQ(a.capacity, 1u);
+
+  ZvPoint2fArray b(ZvPoint2<float>{1.5f, 2.5f}, 0);
+  EXPECT_EQ(b.size, 1u);
+  EXPECT_EQ(b.capacity, 1u);
+  EXPECT_EQ(b[0].x, 1.5f);
+
+  ZvPoint2fArray c(ZvPoint2<float>{1, 2}, 7);  // a capacity, not a repeat count
+  EXPECT_EQ(c.size, 1u);
+  EXPECT_EQ(c.capacity, 7u);
+
+  const double values[3] = {1, 2, 3};
+  ZvDoubleArray d(values, 3);
+  EXPECT_EQ(d.size, 3u);
+  EXPECT_EQ(d.capacity, 3u);
+  EXPECT_EQ(d[2], 3.0);
+
+  ZvDoubleArray e(values, 0);
+  EXPECT_EQ(e.capacity, 0u);
+  EXPECT_EQ(e.size, 0u);
+}
+
+TEST(ArrayConstruction, PointArraysAreZeroedOnAllocation) {
+  ZvPoint3dArray a(4);
+  a.Resize(4);
+  for (unsigned int i = 0; i < 4; ++i) {
+    EXPECT_EQ(a[i].x, 0.0);
+    EXPECT_EQ(a[i].z, 0.0);
+  }
+}
+
+TEST(ArrayConstruction, CopyAndAssignmentTakeSizeAndCapacity) {
+  ZvULongArray a(8);
+  for (unsigned int i = 0; i < 5; ++i)
+    a.Add(i * 10);
+  ZvULongArray b(a);
+  EXPECT_EQ(b.size, 5u);
+  EXPECT_EQ(b.capacity, 8u);
+  EXPECT_EQ(b[4], 40u);
+  EXPECT_NE(b.data, a.data);
+
+  ZvULongArray c(1);
+  c = a;
+  EXPECT_EQ(c.capacity, 8u);
+  EXPECT_EQ(c[3], 30u);
+  const unsigned int* before = c.data;
+  c = c;
+  EXPECT_EQ(c.data, before);
+}
+
+TEST(ArrayCapacity, ResizeHalvesAndDoublesByTheRule) {
+  ZvDoubleArray a(8);
+  for (int i = 0; i < 5; ++i)
+    a.Add(i);
+  double* block = a.data;
+  a.Resize(5);
+  EXPECT_EQ(a.capacity, 8u);
+  EXPECT_EQ(a.data, block);
+  a.Resize(4);  // at most half full: a fresh, smaller block
+  EXPECT_EQ(a.capacity, 4u);
+  EXPECT_EQ(a[3], 3.0);
+
+  ZvDoubleArray z(5);
+  z.Resize(10);
+  EXPECT_EQ(z.capacity, 10u);
+  z.Resize(2);
+  EXPECT_EQ(z.capacity, 2u);  // 10 -> 5 -> 2: truncating halving
+
+  ZvDoubleArray r(1);
+  r.Add(1.0);
+  r.Resize(0);
+  EXPECT_EQ(r.size, 0u);
+  EXPECT_EQ(r.capacity, 1u);
+}
+
+TEST(ArrayCapacity, ResizeMatchesTheRuleOverManySizes) {
+  for (unsigned int cap = 1; cap < 40; ++cap) {
+    for (unsigned int n = 0; n < 90; ++n) {
+      ZvFloatArray a(cap);
+      a.Resize(n);
+      EXPECT_EQ(a.capacity, ExpectedCapacity(cap, n)) << "cap " << cap << " n " << n;
+      EXPECT_EQ(a.size, n);
+    }
+  }
+}
+
+TEST(ArrayCapacity, ChopKeepsStorage) {
+  ZvUByteArray a(16);
+  for (int i = 0; i < 10; ++i)
+    a.Add(static_cast<unsigned char>(i));
+  a.Chop(2);
+  EXPECT_EQ(a.size, 2u);
+  EXPECT_EQ(a.capacity, 16u);
+  a.ChopAndResize(5);  // not below size: nothing
+  EXPECT_EQ(a.capacity, 16u);
+  EXPECT_EQ(a.size, 2u);
+  a.Add(7);
+  a.Add(8);
+  a.Add(9);
+  a.ChopAndResize(1);
+  EXPECT_EQ(a.size, 1u);
+  EXPECT_EQ(a.capacity, 1u);
+}
+
+TEST(ArrayEditing, AddOfOwnElementSurvivesTheMove) {
+  ZvPoint2dArray a(2);
+  a.Add(1.0, 2.0);
+  a.Add(3.0, 4.0);
+  a.Add(a[0]);  // full: the block moves while the argument points into it
+  ASSERT_EQ(a.size, 3u);
+  EXPECT_EQ(a.capacity, 4u);
+  EXPECT_EQ(a[2].x, 1.0);
+  EXPECT_EQ(a[2].y, 2.0);
+
+  ZvDoubleArray d(1);
+  d.Add(5.0);
+  d.Add(d.data, 1);  // bulk append of its own run
+  EXPECT_EQ(d[1], 5.0);
+}
+
+TEST(ArrayEditing, InsertAndRemoveKeepOrder) {
+  ZvULongArray a(1);
+  for (unsigned int v : {1u, 2u, 4u})
+    a.Add(v);
+  a.InsertBefore(2, 3u);
+  a.InsertBefore(0, 0u);
+  const unsigned int block[2] = {8, 9};
+  a.InsertBefore(5, block, 2);
+  ASSERT_EQ(a.size, 7u);
+  for (unsigned int i = 0; i < 5; ++i)
+    EXPECT_EQ(a[i], i);
+  EXPECT_EQ(a[6], 9u);
+
+  ZvULongArray other(1);
+  other.Add(100);
+  other.Add(101);
+  a.InsertBefore(1, other);
+  EXPECT_EQ(a[1], 100u);
+  EXPECT_EQ(a[2], 101u);
+  EXPECT_EQ(a[3], 1u);
+
+  a.Remove(1);
+  EXPECT_EQ(a[1], 101u);
+  EXPECT_EQ(a.size, 8u);
+}
+
+TEST(ArrayEditing, RemoveShrinksToTheSmallestChainValue) {
+  ZvDoubleArray a(16);
+  for (int i = 0; i < 9; ++i)
+    a.Add(i);
+  a.Remove(0);  // 8 left: not below half of 16
+  EXPECT_EQ(a.capacity, 16u);
+  a.Remove(0);  // 7 left: 16 -> 8
+  EXPECT_EQ(a.capacity, 8u);
+  EXPECT_EQ(a[0], 2.0);
+  EXPECT_EQ(a[6], 8.0);
+  a.RemoveClosedRange(1, 4);  // 3 left: 8 -> 4
+  EXPECT_EQ(a.size, 3u);
+  EXPECT_EQ(a.capacity, 4u);
+  EXPECT_EQ(a[1], 7.0);
+}
+
+TEST(ArrayEditing, RemoveOnCapacityOneOnlyDropsTheCount) {
+  ZvDoubleArray a(1);
+  a.Add(42.0);
+  a.Remove(0);
+  EXPECT_EQ(a.size, 0u);
+  EXPECT_EQ(a.data[0], 42.0);
+}
+
+TEST(ArrayEditing, PointRangeAppendCopiesAClosedRange) {
+  ZvPoint2fArray src(1);
+  for (int i = 0; i < 6; ++i)
+    src.Add(i, -i);
+  ZvPoint2fArray dst(1);
+  dst.Add(src, 2, 4);
+  ASSERT_EQ(dst.size, 3u);
+  EXPECT_EQ(dst[0].x, 2.0f);
+  EXPECT_EQ(dst[2].y, -4.0f);
+  dst.Add(src, 3, 2);  // first past last: a zero count, nothing copied
+  EXPECT_EQ(dst.size, 3u);
+}
+
+struct Record {
+  int key;
+  double value;
+};
+
+TEST(RecordArray, OpenedAndFreedSlotsAreZero) {
+  ZvAltDynArray<Record> a(4);
+  a.Add(Record{1, 1.5});
+  a.Add(Record{3, 3.5});
+  a.InsertBefore(1, Record{2, 2.5});
+  EXPECT_EQ(a[1].key, 2);
+  EXPECT_EQ(a[2].value, 3.5);
+  a.RemoveClosedRange(0, 1);
+  EXPECT_EQ(a.size, 1u);
+  EXPECT_EQ(a[0].key, 3);
+  EXPECT_EQ(a.data[1].key, 0);  // capacity 4 kept until below half
+  EXPECT_EQ(a.data[2].value, 0.0);
+}
+
+TEST(ObjectArray, ElementsOwningBlocksCopyDeeply) {
+  ZvDynArray<ZvDoubleArray> a(1);
+  ZvDoubleArray first(1);
+  first.Add(1.0);
+  a.Add(first);
+  a.Add(a[0]);  // aliasing add of a class element
+  a[1].Add(2.0);
+  ASSERT_EQ(a.size, 2u);
+  EXPECT_EQ(a[0].size, 1u);
+  EXPECT_EQ(a[1].size, 2u);
+  EXPECT_NE(a[0].data, a[1].data);
+
+  for (int i = 0; i < 20; ++i)
+    a.InsertBefore(0, first);
+  a.Remove(0);
+  EXPECT_EQ(a.size, 21u);
+  EXPECT_EQ(a[20].size, 2u);
+}
+
+}  // namespace
