@@ -161,8 +161,8 @@ TEST(BaseFCurve, WholeKeySetsAndCopies) {
   EXPECT_EQ(curve.CopyKeyUserData(curve, 1.0, 1.0), 1u);
   EXPECT_EQ(curve.GetUserDataSet(1.0)->GetCount(), 2u);
   // Nothing at the source: still 1, nothing made.
-  EXPECT_EQ(curve.CopyKeyUserData(other, 7.0, 1.5), 1u);
-  EXPECT_EQ(curve.GetUserDataSet(1.5), nullptr);
+  EXPECT_EQ(other.CopyKeyUserData(curve, 7.0, 1.5), 1u);
+  EXPECT_EQ(other.GetUserDataSet(1.5), nullptr);
 
   // An empty set removes the key's entry.
   EXPECT_EQ(curve.SetUserDataSet(CFCUserDataSet(), 2.0), 1u);

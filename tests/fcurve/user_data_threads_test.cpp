@@ -14,7 +14,7 @@
 // every read must see whole items.
 TEST(UserDataThreads, OneCurveSharedByFourThreads) {
   const int kThreads = 4;
-  const int kIterations = 600;
+  const int kIterations = 2000;
   const std::vector<double> keys = {0, 1, 2, 3, 4, 5, 6, 7};
   TestFCurve curve(keys);
   std::atomic<int> failures(0);
