@@ -5,6 +5,7 @@
 
 #include <zv/api.h>
 
+#include <cstring>
 #include <map>
 
 // 16-byte identifier of one user data item.
@@ -15,7 +16,10 @@ struct _zvUID {
   unsigned char Data4[8];
 };
 
-ZV_API bool operator==(const _zvUID& a, const _zvUID& b);
+inline bool operator==(const _zvUID& a, const _zvUID& b) {
+  return a.Data1 == b.Data1 && a.Data2 == b.Data2 && a.Data3 == b.Data3 &&
+         std::memcmp(a.Data4, b.Data4, sizeof a.Data4) == 0;
+}
 inline bool operator!=(const _zvUID& a, const _zvUID& b) {
   return !(a == b);
 }
