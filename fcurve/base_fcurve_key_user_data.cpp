@@ -5,15 +5,17 @@
 
 #include "fcurve/fcurve_lock.h"
 
+#include <cmath>
+
 unsigned int ZvBaseFCurve::SetKeyUserData(double& parameter, const _zvUID& uid,
                                           const unsigned char* data, unsigned int size,
                                           double tolerance) {
   ZvFCurveLockGuard guard(*this);
   if (GetNumKeys() == 0) return 0;
   double key = parameter;
-  if (!GetNearestKeyParameterInCenteredInterval(key, tolerance)) return 0;
+  if (!GetNearestKeyParameterInCenteredInterval(key, tolerance) || std::isnan(key)) return 0;
   parameter = key;
-  GetOrCreateUserDataStore().GetOrCreateKeySet(key).SetUserData(uid, data, size);
+  GetOrCreateUserDataStore().GetOrCreateKeySet(key)->SetUserData(uid, data, size);
   return 1;
 }
 
@@ -60,9 +62,8 @@ unsigned int ZvBaseFCurve::CopyKeyUserData(const ZvBaseFCurve& source, double so
   ZvFCurveLockGuard sourceGuard(source);
   const CFCUserDataSet* set =
       source.m_userData != nullptr ? source.m_userData->FindKeySet(sourceParameter) : nullptr;
-  if (set == nullptr || set->IsEmpty()) return 1;
-  CFCUserDataSet& target = GetOrCreateUserDataStore().GetOrCreateKeySet(parameter);
-  target.MergeUserData(*set);
+  if (set == nullptr || set->IsEmpty() || std::isnan(parameter)) return 1;
+  GetOrCreateUserDataStore().GetOrCreateKeySet(parameter)->MergeUserData(*set);
   return 1;
 }
 
@@ -72,6 +73,7 @@ const CFCUserDataSet* ZvBaseFCurve::GetUserDataSet(double parameter) const {
 }
 
 unsigned int ZvBaseFCurve::SetUserDataSet(const CFCUserDataSet& set, double parameter) {
+  if (std::isnan(parameter)) return 0;
   ZvFCurveLockGuard guard(*this);
   if (set.IsEmpty() && m_userData == nullptr) return 1;
   GetOrCreateUserDataStore().SetKeySet(parameter, set);
@@ -85,15 +87,15 @@ unsigned int ZvBaseFCurve::RemoveAllKeyUserData() {
 }
 
 unsigned int ZvBaseFCurve::TranslateAllKeyUserData(double delta) {
+  if (!std::isfinite(delta)) return 0;
   ZvFCurveLockGuard guard(*this);
-  if (m_userData != nullptr) m_userData->TranslateKeySets(delta);
-  return 1;
+  return m_userData != nullptr ? m_userData->TranslateKeySets(delta) : 1;
 }
 
 unsigned int ZvBaseFCurve::ScaleAllKeyUserData(double factor) {
+  if (!std::isfinite(factor)) return 0;
   ZvFCurveLockGuard guard(*this);
-  if (m_userData != nullptr) m_userData->ScaleKeySets(factor);
-  return 1;
+  return m_userData != nullptr ? m_userData->ScaleKeySets(factor) : 1;
 }
 
 unsigned int ZvBaseFCurve::MoveKeyUserDataTail(const ZvDoubleArray& oldParameters,

@@ -286,10 +286,13 @@ class ZV_API ZvBaseFCurve {
   // the curve.
   const CFCUserDataSet* GetUserDataSet(double parameter) const;
   // Replaces the set at exactly this parameter by a copy (an empty set
-  // removes it).
+  // removes it); 0 for a NaN parameter.
   unsigned int SetUserDataSet(const CFCUserDataSet& set, double parameter);
   // Frees all per-key sets; the curve-level items stay.
   unsigned int RemoveAllKeyUserData();
+  // Every per-key set moves to its parameter plus delta, or times factor;
+  // sets whose parameters meet are merged. 0 for a delta or factor that is
+  // not finite.
   unsigned int TranslateAllKeyUserData(double delta);
   unsigned int ScaleAllKeyUserData(double factor);
   // Moves the sets of the keys from oldParameters[0] onward. The two arrays

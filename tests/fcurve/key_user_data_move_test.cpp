@@ -3,6 +3,7 @@
 
 #include <gtest/gtest.h>
 
+#include <limits>
 #include <string>
 #include <utility>
 #include <vector>
@@ -121,4 +122,24 @@ TEST(KeyUserDataMove, TailRefusalsAndTheEmptyList) {
   TestFCurve bare({1.0});
   EXPECT_EQ(bare.MoveKeyUserDataTail(Array({1.0}), Array({2.0})), 1u);
   EXPECT_EQ(bare.HasUserData(), 0u);
+}
+
+// A NaN orders equal to everything in a map: it must never reach one.
+TEST(KeyUserDataMove, NonFiniteParametersAreRefused) {
+  const double nan = std::numeric_limits<double>::quiet_NaN();
+  const double inf = std::numeric_limits<double>::infinity();
+  TestFCurve curve({1.0, 2.0});
+  Tag(curve, {{1.0, "a"}, {2.0, "b"}});
+  EXPECT_EQ(curve.GetUserDataSet(nan), nullptr);
+  EXPECT_EQ(curve.HasUserData(nan), 0u);
+  EXPECT_EQ(curve.RemoveKeyUserData(nan), 0u);
+  CFCUserDataSet set;
+  set.SetUserData(MakeUID(1), Bytes("n"), 1);
+  EXPECT_EQ(curve.SetUserDataSet(set, nan), 0u);
+  EXPECT_EQ(curve.CopyKeyUserData(curve, 1.0, nan), 1u);
+  EXPECT_EQ(curve.MoveKeyUserDataTail(Array({2.0}), Array({nan})), 0u);
+  EXPECT_EQ(curve.TranslateAllKeyUserData(inf), 0u);
+  EXPECT_EQ(curve.ScaleAllKeyUserData(nan), 0u);
+  EXPECT_EQ(Entries(curve, {1.0, 2.0}), (EntryList{{1.0, "a"}, {2.0, "b"}}));
+  EXPECT_EQ(curve.GetLockCount(), 0u);
 }
