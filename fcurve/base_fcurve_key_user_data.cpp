@@ -7,15 +7,28 @@
 
 #include <cmath>
 
+namespace {
+
+// Snaps the parameter onto the nearest key within the tolerance and leaves
+// the key's parameter in it; false, with the parameter untouched, when the
+// curve has no key there.
+bool SnapToKey(const ZvBaseFCurve& curve, double& parameter, double tolerance) {
+  if (curve.GetNumKeys() == 0) return false;
+  double key = parameter;
+  if (!curve.GetNearestKeyParameterInCenteredInterval(key, tolerance) || std::isnan(key))
+    return false;
+  parameter = key;
+  return true;
+}
+
+}  // namespace
+
 unsigned int ZvBaseFCurve::SetKeyUserData(double& parameter, const _zvUID& uid,
                                           const unsigned char* data, unsigned int size,
                                           double tolerance) {
   ZvFCurveLockGuard guard(*this);
-  if (GetNumKeys() == 0) return 0;
-  double key = parameter;
-  if (!GetNearestKeyParameterInCenteredInterval(key, tolerance) || std::isnan(key)) return 0;
-  parameter = key;
-  GetOrCreateUserDataStore().GetOrCreateKeySet(key)->SetUserData(uid, data, size);
+  if (!SnapToKey(*this, parameter, tolerance)) return 0;
+  GetOrCreateUserDataStore().GetOrCreateKeySet(parameter)->SetUserData(uid, data, size);
   return 1;
 }
 
@@ -23,11 +36,8 @@ unsigned int ZvBaseFCurve::GetKeyUserData(double& parameter, const _zvUID& uid,
                                           const unsigned char*& data, unsigned int& size,
                                           double tolerance) const {
   ZvFCurveLockGuard guard(*this);
-  if (GetNumKeys() == 0) return 0;
-  double key = parameter;
-  if (!GetNearestKeyParameterInCenteredInterval(key, tolerance)) return 0;
-  parameter = key;
-  const CFCUserDataSet* set = m_userData != nullptr ? m_userData->FindKeySet(key) : nullptr;
+  if (!SnapToKey(*this, parameter, tolerance)) return 0;
+  const CFCUserDataSet* set = m_userData != nullptr ? m_userData->FindKeySet(parameter) : nullptr;
   const CFCUserDataValue* value = set != nullptr ? set->FindUserData(uid) : nullptr;
   if (value == nullptr) return 0;
   data = value->GetData();
@@ -38,11 +48,8 @@ unsigned int ZvBaseFCurve::GetKeyUserData(double& parameter, const _zvUID& uid,
 unsigned int ZvBaseFCurve::RemoveKeyUserData(double& parameter, const _zvUID& uid,
                                              double tolerance) {
   ZvFCurveLockGuard guard(*this);
-  if (GetNumKeys() == 0) return 0;
-  double key = parameter;
-  if (!GetNearestKeyParameterInCenteredInterval(key, tolerance)) return 0;
-  parameter = key;
-  return m_userData != nullptr ? m_userData->RemoveKeyUserData(key, uid) : 0;
+  if (!SnapToKey(*this, parameter, tolerance)) return 0;
+  return m_userData != nullptr ? m_userData->RemoveKeyUserData(parameter, uid) : 0;
 }
 
 unsigned int ZvBaseFCurve::RemoveKeyUserData(double parameter) {
