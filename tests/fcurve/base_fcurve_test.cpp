@@ -8,26 +8,6 @@
 #include <limits>
 #include <memory>
 
-// These values are written into buffers: a renumbering breaks stored files.
-TEST(BaseFCurve, EnumerationValuesAreTheStoredOnes) {
-  const int kinds[] = {ZvBaseFCurve::BooleanKind, ZvBaseFCurve::IntegerKind, ZvBaseFCurve::StdKind,
-                       ZvBaseFCurve::RawKind, ZvBaseFCurve::QuatKind};
-  const int expectedKinds[] = {10, 15, 20, 30, 40};
-  for (int i = 0; i < 5; ++i)
-    EXPECT_EQ(kinds[i], expectedKinds[i]);
-  EXPECT_EQ(ZvBaseFCurve::LeftSide, 1);
-  EXPECT_EQ(ZvBaseFCurve::RightSide, 2);
-  EXPECT_EQ(ZvBaseFCurve::ConstantSegment, 1);
-  EXPECT_EQ(ZvBaseFCurve::LinearSegment, 2);
-  EXPECT_EQ(ZvBaseFCurve::CubicSegment, 3);
-  EXPECT_EQ(ZvBaseFCurve::ConstantExtrapolation, 1);
-  EXPECT_EQ(ZvBaseFCurve::CycleWithOffsetExtrapolation, 4);
-  EXPECT_EQ(ZvBaseFCurve::BottomHandle | ZvBaseFCurve::LeftHandle << 4 |
-                ZvBaseFCurve::RightHandle << 8 | ZvBaseFCurve::TopHandle << 12,
-            0x8421);
-  EXPECT_EQ(sizeof(_zvUID), 16u);
-}
-
 TEST(BaseFCurve, ConstraintCodesMapToKeyFlagBits) {
   // code -> KeyFlags bits, in the order of the codes.
   const unsigned int expected[][2] = {
