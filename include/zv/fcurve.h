@@ -299,7 +299,8 @@ class ZV_API ZvBaseFCurve {
   // have the same length (else 0) and ascend: the set at oldParameters[i]
   // goes to newParameters[i]; a set the lists do not name stays. The first
   // moved set, when it lands within 1e-15 of the last set that stays, is
-  // merged into it (its items win). An empty list answers 1 at once and
+  // merged into it (its items win). A NaN in the lists is refused with 0,
+  // nothing moved. An empty list answers 1 at once and
   // leaves the curve locked once more: callers never pass one, and one that
   // does must Unlock after it.
   unsigned int MoveKeyUserDataTail(const ZvDoubleArray& oldParameters,
@@ -311,7 +312,9 @@ class ZV_API ZvBaseFCurve {
   unsigned int WriteUserDataToBuffer(void* buffer) const;
   unsigned int GetUserDataBufferSize() const;
   // Given the block past its length field; returns the body bytes consumed,
-  // 0 for a refused version, 5 when the block holds nothing.
+  // 0 for a refused version, 5 when the block holds nothing. A curve that
+  // has a store already only steps over the block; otherwise it takes the
+  // block's store, created even when empty.
   unsigned int ReadUserDataFromBufferBody(const void* body);
 
  protected:
