@@ -5,6 +5,8 @@
 #include <zv/api.h>
 #include <zv/arrays.h>
 #include <zv/critical_section.h>
+#include <zv/fcurve.h>
+#include <zv/fcurve_userdata.h>
 #include <zv/point.h>
 #include <zv/trace.h>
 
