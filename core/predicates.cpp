@@ -2,27 +2,31 @@
 
 #include <cmath>
 
-template <class T>
-int ZvPoint2_FindClosestPointOnLineSegment(const ZvPoint2<T>& p, const ZvPoint2<T>& a,
-                                           const ZvPoint2<T>& b, double maxDistance2,
-                                           double& outDistance2, double& outT) {
-  const double abx = double(b.x) - a.x, aby = double(b.y) - a.y;
-  const double l2 = abx * abx + aby * aby;
-  double t = 0.0;
-  double cx = a.x, cy = a.y;
-  if (std::fabs(l2) > 1e-7) {
-    t = ((double(p.x) - a.x) * abx + (double(p.y) - a.y) * aby) / l2;
-    outT = t;
-    if (t >= 1.0) {
-      cx = b.x;
-      cy = b.y;
-    } else if (t > 0.0) {
-      cx = a.x + t * abx;
-      cy = a.y + t * aby;
-    }
+namespace {
+
+// The closest point of segment a-b to p, over N components in double. A segment whose squared
+// length is within the degeneracy bound measures to a; the plane form counts exactly 1e-7 as
+// degenerate, the space form does not.
+template <int N>
+int ClosestPointOnSegment(const double* p, const double* a, const double* b, bool inclusiveBound,
+                          double maxDistance2, double& outDistance2, double& outT) {
+  double ab[N], l2 = 0.0, dot = 0.0;
+  for (int i = 0; i < N; ++i) {
+    ab[i] = b[i] - a[i];
+    l2 += ab[i] * ab[i];
+    dot += (p[i] - a[i]) * ab[i];
   }
-  const double dx = p.x - cx, dy = p.y - cy;
-  const double d2 = dx * dx + dy * dy;
+  const bool degenerate = inclusiveBound ? std::fabs(l2) <= 1e-7 : std::fabs(l2) < 1e-7;
+  double t = 0.0;
+  if (!degenerate) {
+    t = dot / l2;
+    outT = t;  // written even when the distance test then fails
+  }
+  double d2 = 0.0;
+  for (int i = 0; i < N; ++i) {
+    const double c = t <= 0.0 ? a[i] : (t >= 1.0 ? b[i] : a[i] + t * ab[i]);
+    d2 += (p[i] - c) * (p[i] - c);
+  }
   if (d2 > maxDistance2) return 0;
   outDistance2 = d2;
   if (t <= 0.0) {
@@ -33,33 +37,25 @@ int ZvPoint2_FindClosestPointOnLineSegment(const ZvPoint2<T>& p, const ZvPoint2<
   return 1;
 }
 
+}  // namespace
+
+template <class T>
+int ZvPoint2_FindClosestPointOnLineSegment(const ZvPoint2<T>& p, const ZvPoint2<T>& a,
+                                           const ZvPoint2<T>& b, double maxDistance2,
+                                           double& outDistance2, double& outT) {
+  const double pp[2] = {double(p.x), double(p.y)}, aa[2] = {double(a.x), double(a.y)},
+               bb[2] = {double(b.x), double(b.y)};
+  return ClosestPointOnSegment<2>(pp, aa, bb, true, maxDistance2, outDistance2, outT);
+}
+
 template <class T>
 int ZvPoint3_FindClosestPointOnLineSegment(const ZvPoint3<T>& p, const ZvPoint3<T>& a,
                                            const ZvPoint3<T>& b, double maxDistance2,
                                            double& outDistance2, double& outT) {
-  const double ab[3] = {double(b.x) - a.x, double(b.y) - a.y, double(b.z) - a.z};
-  const double ap[3] = {double(p.x) - a.x, double(p.y) - a.y, double(p.z) - a.z};
-  const double l2 = ab[0] * ab[0] + ab[1] * ab[1] + ab[2] * ab[2];
-  double t = 0.0;
-  // The 3-D form treats exactly 1e-7 as a real segment, unlike the plane form.
-  if (std::fabs(l2) >= 1e-7) {
-    t = (ap[0] * ab[0] + ap[1] * ab[1] + ap[2] * ab[2]) / l2;
-    outT = t;
-  }
-  const double k = t <= 0.0 ? 0.0 : (t >= 1.0 ? 1.0 : t);
-  double d2 = 0.0;
-  for (int i = 0; i < 3; ++i) {
-    const double d = ap[i] - k * ab[i];
-    d2 += d * d;
-  }
-  if (d2 > maxDistance2) return 0;
-  outDistance2 = d2;
-  if (t <= 0.0) {
-    outT = 0.0;
-  } else if (t >= 1.0) {
-    outT = 1.0;
-  }
-  return 1;
+  const double pp[3] = {double(p.x), double(p.y), double(p.z)},
+               aa[3] = {double(a.x), double(a.y), double(a.z)},
+               bb[3] = {double(b.x), double(b.y), double(b.z)};
+  return ClosestPointOnSegment<3>(pp, aa, bb, false, maxDistance2, outDistance2, outT);
 }
 
 namespace {
