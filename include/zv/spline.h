@@ -62,13 +62,22 @@ class ZV_API ZvSplineT {
   static int GetInputExtent(const ZvDoubleArray& params, const ArrayT& values, double& paramSpan,
                             ExtentT& extent);
 
-  // Fits an open curve through at least 2 samples with strictly increasing parameters.
-  // Fails for arrays of different sizes, a negative tolerance or a kind other than CatmullRom and
+  // Fits an open curve through at least 2 samples with strictly increasing parameters; the keys
+  // are a subset of the samples, always including the first and the last. Fails for arrays of
+  // different sizes, a negative (or NaN) tolerance or a kind other than CatmullRom and
   // BezierCubicFCurve.
+  //
+  // BezierCubicFCurve: every sample is reproduced within the tolerance. Segments are halved at
+  // the middle sample until they fit, with central differences of the samples as derivatives.
+  // CatmullRom: samples are removed greedily from left to right, a removal standing when the
+  // three pieces it changes keep their samples within the tolerance. The two end pieces are
+  // judged on the first (last) three samples rather than on the kept keys, which keeps samples
+  // next to the ends whenever those three samples do not describe the whole end piece.
   int OpenFit(const ZvDoubleArray& params, const ArrayT& values, double tolerance,
               ZvSpline::Kind kind);
   // As OpenFit for a closed curve: at least 3 samples, and the last value repeats the first
-  // (exactly in 1-D, within 1e-9 per component in 2-D and 3-D).
+  // (exactly in 1-D, within 1e-9 per component in 2-D and 3-D). The curve is smooth across the
+  // seam; a Catmull-Rom fit gives the keys next to the seam a trial of their own afterwards.
   int ClosedFit(const ZvDoubleArray& params, const ArrayT& values, double tolerance,
                 ZvSpline::Kind kind);
 
