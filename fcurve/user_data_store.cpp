@@ -73,7 +73,7 @@ void CFCUserDataStore::SetKeySet(double parameter, const CFCUserDataSet& set) {
     delete existing;
   } else {
     m_keySets.emplace(parameter, copy.get());
-    copy.release();
+    static_cast<void>(copy.release());  // the map owns it now
   }
 }
 
@@ -86,7 +86,7 @@ void CFCUserDataStore::AdoptKeySet(double parameter, CFCUserDataSet* set) {
     return;
   }
   m_keySets.emplace_hint(it, parameter, owned.get());
-  owned.release();
+  static_cast<void>(owned.release());  // the map owns it now
 }
 
 unsigned int CFCUserDataStore::RemoveKeySet(double parameter) {
