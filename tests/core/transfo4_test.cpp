@@ -3,8 +3,10 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <cstring>
 #include <limits>
 #include <sstream>
+#include <vector>
 
 namespace {
 
@@ -227,6 +229,33 @@ TEST(Transfo4Map, AllFormsAgree) {
   ZvPoint3<double> single{1, 1, 1};
   t.MapInPlace(single);
   ExpectNear(single, t.Map(ZvPoint3<double>{1, 1, 1}), 0);
+}
+
+TEST(Transfo4Map, ArraysRoundLikeSinglePoints) {
+  // Long enough for any vectorised loop body and its tail: every element must be the same bits
+  // as the single-point form, so no path may fuse or reorder the products.
+  ZvTransfo4 t;
+  t.RotateXY(31, ZvPoint2<double>{0.3, 7}).ScaleXY(1.1, 0.7, ZvPoint2<double>{1, 1});
+  t.Translate(0.125, -3, 0.5).RotateXYZ(ZvPoint3<double>{3, 5, 7});
+  const unsigned int n = 1037;
+  std::vector<ZvPoint2<float>> in2(n), out2(n);
+  std::vector<ZvPoint3<double>> in3(n), out3(n);
+  for (unsigned int i = 0; i < n; ++i) {
+    in2[i] = {0.37f * i - 100, 1.0f / (i + 1)};
+    in3[i] = {0.11 * i, -1.0 / (i + 3), 1e3 - i};
+  }
+  t.Map(in2.data(), n, out2.data());
+  t.Map(in3.data(), n, out3.data());
+  t.MapInPlace(in2.data(), n);
+  for (unsigned int i = 0; i < n; ++i) {
+    ZvPoint2<float> one2;
+    ZvPoint3<double> one3;
+    t.Map(ZvPoint2<float>{0.37f * i - 100, 1.0f / (i + 1)}, one2);
+    t.Map(in3[i], one3);
+    ASSERT_EQ(std::memcmp(&one2, &out2[i], sizeof one2), 0) << i;
+    ASSERT_EQ(std::memcmp(&one2, &in2[i], sizeof one2), 0) << i;
+    ASSERT_EQ(std::memcmp(&one3, &out3[i], sizeof one3), 0) << i;
+  }
 }
 
 TEST(Transfo4Map, Extents) {
