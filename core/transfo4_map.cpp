@@ -95,7 +95,8 @@ inline __attribute__((always_inline)) void MapLoop(const double* m, const P* in,
 }
 
 #if defined(__x86_64__) || defined(__i386__)
-// GCC: no fused multiply-add, and the full vectoriser cost model even in -O2 builds.
+// The wide copies of the loop. For GCC they also turn off fused multiply-add (its default lets
+// it fuse across statements) and ask for the full vectoriser cost model even in -O2 builds.
 #if defined(__clang__)
 #define ZV_WIDE_LOOP(isa) __attribute__((target(isa)))
 #else
@@ -126,9 +127,15 @@ Isa DetectIsa() {
   return __builtin_cpu_supports("avx2") ? Isa::Avx2 : Isa::Base;
 }
 
+// Asked once per process; a read-only value afterwards.
+Isa ProcessorIsa() {
+  static const Isa isa = DetectIsa();
+  return isa;
+}
+
 template <class P>
 void MapArray(const double* m, const P* in, unsigned int count, P* out) {
-  static const Isa isa = DetectIsa();
+  const Isa isa = ProcessorIsa();
   if (isa == Isa::Avx512) {
     MapLoopAvx512(m, in, count, out);
   } else if (isa == Isa::Avx2) {
