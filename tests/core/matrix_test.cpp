@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <climits>
+#include <new>
 #include <sstream>
 
 namespace {
@@ -48,6 +50,8 @@ TEST(MatrixStorage, CallerChosenRanges) {
   shifted[1][7] = 1e-3;
   EXPECT_EQ(shifted.IsIdentity(1e-4), 0);
   EXPECT_EQ(shifted.IsIdentity(1e-3), 1);  // a difference equal to the tolerance passes
+  // A size no block can hold fails as an allocation does, before anything is allocated.
+  EXPECT_THROW(ZvMatrix(INT_MIN, INT_MAX, INT_MIN, INT_MAX), std::bad_alloc);
   // Vectors hold high - low + 2 zeroed elements indexed from the block start.
   ZvVectorLong l(1, 4);
   for (int i = 0; i <= 4; ++i)
