@@ -74,7 +74,8 @@ TEST(Transfo4Composition, ProductsAndEditsOrder) {
 }
 
 TEST(Transfo4Rotation, SnappedAndOrdered) {
-  const double* m = ZvTransfo4().Rotate(90, 0, 0, 1).GetMatrixPtr();
+  const ZvTransfo4 quarter = ZvTransfo4().Rotate(90, 0, 0, 1);
+  const double* m = quarter.GetMatrixPtr();
   EXPECT_TRUE(m[0] == 0 && m[1] == 1 && m[4] == -1 && m[5] == 0);
   const double flip[4][4] = {{1, 0, 0, 0}, {0, -1, 0, 0}, {0, 0, -1, 0}, {0, 0, 0, 1}};
   ExpectNear(ZvTransfo4().Rotate(180, 1, 0, 0), FromRows(flip), 0);
