@@ -7,8 +7,10 @@
 #include <zv/critical_section.h>
 #include <zv/fcurve.h>
 #include <zv/fcurve_userdata.h>
+#include <zv/matrix.h>
 #include <zv/point.h>
 #include <zv/spline.h>
 #include <zv/trace.h>
+#include <zv/transfo4.h>
 
 #endif
