@@ -6,6 +6,7 @@
 #include <zv/arrays.h>
 #include <zv/critical_section.h>
 #include <zv/point.h>
+#include <zv/polyline.h>
 #include <zv/trace.h>
 
 #endif

@@ -1,0 +1,127 @@
+#include "core/convex_hull.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstdint>
+#include <memory>
+#include <new>
+
+namespace {
+
+struct HullPoint {
+  double x, y;
+};
+
+bool lexLess(const HullPoint& a, const HullPoint& b) {
+  return a.x < b.x || (a.x == b.x && a.y < b.y);
+}
+
+bool samePoint(const HullPoint& a, const HullPoint& b) {
+  return a.x == b.x && a.y == b.y;
+}
+
+// a + b = s + e exactly.
+inline void twoSum(double a, double b, double& s, double& e) {
+  s = a + b;
+  const double bv = s - a;
+  const double av = s - bv;
+  e = (a - av) + (b - bv);
+}
+
+// Sign of the exact sum of the products p[i] * q[i], i < 6. Each product is
+// split into two doubles without error and the twelve parts are gathered in a
+// non-overlapping expansion, whose most significant part carries the sign.
+int exactSignOfProductSum(const double* p, const double* q) {
+  double expansion[12];
+  int length = 0;
+  for (int i = 0; i < 6; ++i) {
+    const double product = p[i] * q[i];
+    const double parts[2] = {std::fma(p[i], q[i], -product), product};
+    for (double part : parts) {
+      double carry = part;
+      for (int k = 0; k < length; ++k)
+        twoSum(carry, expansion[k], carry, expansion[k]);
+      expansion[length++] = carry;
+    }
+  }
+  for (int k = length - 1; k >= 0; --k) {
+    if (expansion[k] > 0) return 1;
+    if (expansion[k] < 0) return -1;
+  }
+  return 0;
+}
+
+int orientation(const HullPoint& a, const HullPoint& b, const HullPoint& c) {
+  const double left = (b.x - a.x) * (c.y - a.y);
+  const double right = (b.y - a.y) * (c.x - a.x);
+  const double det = left - right;
+  // Forward error bound of the expression above: beyond it the rounded sign
+  // is certain, which is the case for all but nearly collinear triples.
+  const double epsilon = 1.1102230246251565e-16;  // 2^-53
+  const double bound = (3.0 + 16.0 * epsilon) * epsilon * (std::fabs(left) + std::fabs(right));
+  if (det > bound) return 1;
+  if (-det > bound) return -1;
+  // det = bx cy - bx ay - ax cy - by cx + by ax + ay cx, taken without rounding.
+  const double p[6] = {b.x, -b.x, -a.x, -b.y, b.y, a.y};
+  const double q[6] = {c.y, a.y, c.y, c.x, a.x, c.x};
+  return exactSignOfProductSum(p, q);
+}
+
+// Pops the chain while its last two vertices and p do not turn left, then
+// appends p. Popping collinear vertices keeps only corners.
+void pushCorner(const HullPoint* sorted, uint32_t* chain, int& length, int floor, uint32_t p) {
+  while (length >= floor + 2 &&
+         orientation(sorted[chain[length - 2]], sorted[chain[length - 1]], sorted[p]) <= 0)
+    --length;
+  chain[length++] = p;
+}
+
+}  // namespace
+
+int CQNGeometry::Orientation(const CQNVector2<double>& a, const CQNVector2<double>& b,
+                             const CQNVector2<double>& c) {
+  return orientation({a[0], a[1]}, {b[0], b[1]}, {c[0], c[1]});
+}
+
+template <class T>
+int CQNGeometry::BuildConvexHull(int count, const CQNVector2<T>* points, int& hullCount,
+                                 CQNVector2<T>* hull) {
+  if (count <= 0 || !points || !hull) return 0;
+  for (int i = 0; i < count; ++i)
+    if (!std::isfinite(points[i][0]) || !std::isfinite(points[i][1])) return 0;
+  try {
+    // Andrew's monotone chain: sort, then one lower and one upper pass.
+    std::unique_ptr<HullPoint[]> sorted(new HullPoint[count]);
+    for (int i = 0; i < count; ++i)
+      sorted[i] = {double(points[i][0]), double(points[i][1])};
+    std::sort(sorted.get(), sorted.get() + count, lexLess);
+    const int n = int(std::unique(sorted.get(), sorted.get() + count, samePoint) - sorted.get());
+    if (n == 1) {
+      hull[0] = CQNVector2<T>(T(sorted[0].x), T(sorted[0].y));
+      hullCount = 1;
+      return 1;
+    }
+    // The chain holds the lower hull, then the upper hull back to the
+    // first point; its length stays below 2 n.
+    std::unique_ptr<uint32_t[]> chain(new uint32_t[2 * size_t(n)]);
+    int length = 0;
+    for (int i = 0; i < n; ++i)
+      pushCorner(sorted.get(), chain.get(), length, 0, uint32_t(i));
+    const int lowerLength = length;
+    for (int i = n - 2; i >= 0; --i)
+      pushCorner(sorted.get(), chain.get(), length, lowerLength - 1, uint32_t(i));
+    // The last entry repeats the first vertex.
+    const int corners = length - 1;
+    for (int i = 0; i < corners; ++i) {
+      const HullPoint& v = sorted[chain[i]];
+      hull[i] = CQNVector2<T>(T(v.x), T(v.y));
+    }
+    hullCount = corners;
+    return 1;
+  } catch (const std::bad_alloc&) {
+    return 0;
+  }
+}
+
+template int CQNGeometry::BuildConvexHull<double>(int, const CQNVector2<double>*, int&,
+                                                  CQNVector2<double>*);
