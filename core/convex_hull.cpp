@@ -76,6 +76,46 @@ void pushCorner(const HullPoint* sorted, uint32_t* chain, int& length, int floor
   chain[length++] = p;
 }
 
+// Copies to out the points that can be corners, and returns their number. The points extreme
+// in eight directions, taken counter-clockwise, span a polygon inside the hull, and a point
+// strictly inside it is no corner; on spread-out input this leaves little for the sort. The
+// polygon need not even be convex, so rounded sums may pick the extremes: a point left of every
+// edge of a closed polygon is wound around by it, hence inside the hull of its vertices.
+template <class T>
+int copyPossibleCorners(const CQNVector2<T>* points, int count, HullPoint* out) {
+  // Directions 0, 45, ..., 315 degrees, as weights of x and y.
+  const double wx[8] = {1, 1, 0, -1, -1, -1, 0, 1}, wy[8] = {0, 1, 1, 1, 0, -1, -1, -1};
+  int extreme[8] = {0, 0, 0, 0, 0, 0, 0, 0};
+  double best[8];
+  for (int d = 0; d < 8; ++d)
+    best[d] = wx[d] * points[0][0] + wy[d] * points[0][1];
+  for (int i = 1; i < count; ++i)
+    for (int d = 0; d < 8; ++d) {
+      const double v = wx[d] * points[i][0] + wy[d] * points[i][1];
+      if (v > best[d]) {
+        best[d] = v;
+        extreme[d] = i;
+      }
+    }
+  HullPoint polygon[8];
+  int corners = 0;
+  for (int d = 0; d < 8; ++d) {
+    const HullPoint v = {double(points[extreme[d]][0]), double(points[extreme[d]][1])};
+    if (corners == 0 || !samePoint(v, polygon[corners - 1])) polygon[corners++] = v;
+  }
+  while (corners > 1 && samePoint(polygon[corners - 1], polygon[0]))
+    --corners;
+  int kept = 0;
+  for (int i = 0; i < count; ++i) {
+    const HullPoint p = {double(points[i][0]), double(points[i][1])};
+    bool inside = corners >= 3;
+    for (int e = 0; e < corners && inside; ++e)
+      inside = orientation(polygon[e], polygon[(e + 1) % corners], p) > 0;
+    if (!inside) out[kept++] = p;
+  }
+  return kept;
+}
+
 }  // namespace
 
 int CQNGeometry::Orientation(const CQNVector2<double>& a, const CQNVector2<double>& b,
@@ -92,10 +132,10 @@ int CQNGeometry::BuildConvexHull(int count, const CQNVector2<T>* points, int& hu
   try {
     // Andrew's monotone chain: sort, then one lower and one upper pass.
     std::unique_ptr<HullPoint[]> sorted(new HullPoint[count]);
-    for (int i = 0; i < count; ++i)
-      sorted[i] = {double(points[i][0]), double(points[i][1])};
-    std::sort(sorted.get(), sorted.get() + count, lexLess);
-    const int n = int(std::unique(sorted.get(), sorted.get() + count, samePoint) - sorted.get());
+    const int candidates = copyPossibleCorners(points, count, sorted.get());
+    std::sort(sorted.get(), sorted.get() + candidates, lexLess);
+    const int n =
+        int(std::unique(sorted.get(), sorted.get() + candidates, samePoint) - sorted.get());
     if (n == 1) {
       hull[0] = CQNVector2<T>(T(sorted[0].x), T(sorted[0].y));
       hullCount = 1;
