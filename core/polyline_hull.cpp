@@ -72,7 +72,7 @@ void AddArc(Outline& outline, const ZvPoint2<float>& corner, ZvPoint2<double> fr
             const ZvPoint2<double>& to, double degreesPerStep) {
   const double radians = degreesPerStep * (3.141592653589793 / 180.0);
   const double c = std::cos(radians), s = std::sin(radians);
-  for (double swept = degreesPerStep; swept < 180.0; swept += degreesPerStep) {
+  for (unsigned int k = 1; k * degreesPerStep < 180.0; ++k) {
     from = {from.x * c - from.y * s, from.x * s + from.y * c};
     if (ZvCross(from, to) <= 0.0 || Merge(from.x, from.y, to.x, to.y)) return;
     outline.Add(corner, from);

@@ -6,7 +6,7 @@
 int ZvPoint2fArraySingleComponent_EvenSubdivide(const ZvPoint2fArray& a,
                                                 const ZvDoubleArray& chords, unsigned int n,
                                                 ZvPoint2fArray& out) {
-  if (n == 0 || a.size == 0 || chords.size != a.size) return 0;
+  if (n == 0 || a.size == 0 || chords.size != a.size || &out == &a) return 0;
   const unsigned int last = a.size - 1;
   const double total = chords[last];
   if (last == 0 || std::fabs(total) <= 1e-9) {

@@ -44,7 +44,8 @@ int ZvPoint2dArray_IsStrictlyIncreasingX(const ZvPoint2dArray& a) {
 
 int ZvPoint2dArray_Filter(const ZvPoint2dArray& in, const ZvPointTagArray& tags,
                           ZvPoint2dArray& out, ZvPointTagArray& outTags) {
-  if (tags.size < in.size) return 0;
+  // out growing as in would never end.
+  if (tags.size < in.size || &out == &in || &outTags == &tags) return 0;
   for (unsigned int i = 0; i < in.size; ++i) {
     const ZvPoint2<double> p = in[i];
     const bool repeated = out.size > 0 && Coincide(p, out[out.size - 1]);

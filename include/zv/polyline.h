@@ -37,7 +37,7 @@ ZV_API int ZvPoint2dArray_IsStrictlyIncreasingX(const ZvPoint2dArray& a);
 //   tag 2 (last): when equal and the last output tag is not 0, that tag becomes 2 and nothing is
 //   added; otherwise the point is added with tag 2.
 // So a piece that loses its last vertex stays terminated, and a one-point piece keeps two entries.
-// Result 0 when tags is shorter than in.
+// Result 0 when tags is shorter than in, or an output array is its input.
 ZV_API int ZvPoint2dArray_Filter(const ZvPoint2dArray& in, const ZvPointTagArray& tags,
                                  ZvPoint2dArray& out, ZvPointTagArray& outTags);
 
@@ -92,8 +92,8 @@ ZV_API int ZvPoint3dArraySingleComponent_ComputePosition(const ZvPoint3dArray& a
 
 // Appends n + 1 points at even arc distances total / n along a, from the first point to the last.
 // Interior points are interpolated in double and narrowed to float. A polyline of no length gives
-// its first point n + 1 times. Result 0 when n is 0, a is empty or chords does not have one entry
-// per vertex.
+// its first point n + 1 times. Result 0 when n is 0, a is empty, chords does not have one entry
+// per vertex, or out is a.
 ZV_API int ZvPoint2fArraySingleComponent_EvenSubdivide(const ZvPoint2fArray& a,
                                                        const ZvDoubleArray& chords, unsigned int n,
                                                        ZvPoint2fArray& out);

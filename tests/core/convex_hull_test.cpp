@@ -70,6 +70,7 @@ void ExpectHullMatchesBruteForce(const std::vector<IPoint>& input, int scaleBits
       CQNGeometry::BuildConvexHull<double>(int(points.size()), points.data(), count, hull.data()),
       1);
   std::vector<IPoint> got;
+  got.reserve(count);
   for (int i = 0; i < count; ++i)
     got.emplace_back((long long)std::ldexp(hull[i][0], scaleBits),
                      (long long)std::ldexp(hull[i][1], scaleBits));
@@ -94,9 +95,9 @@ TEST(ConvexHull, AgreesWithBruteForceOnSmallGridsWithRepeatsAndCollinearPoints) 
     const int n = 1 + trial % 24;
     const int side = trial % 3 == 0 ? 3 : 5;
     std::uniform_int_distribution<int> coord(0, side - 1);
-    std::vector<IPoint> input;
-    for (int i = 0; i < n; ++i)
-      input.emplace_back(coord(rng), coord(rng));
+    std::vector<IPoint> input(n);
+    for (IPoint& p : input)
+      p = {coord(rng), coord(rng)};
     ExpectHullMatchesBruteForce(input, 0);
     if (HasFatalFailure()) return;
   }
@@ -116,7 +117,8 @@ std::vector<IPoint> NearlyCollinear(std::mt19937& rng, int n) {
   std::vector<IPoint> v;
   for (int i = 0; i < n; ++i) {
     const double c = along(rng);
-    v.emplace_back(nudge(c), nudge(c));
+    const long long x = nudge(c);
+    v.emplace_back(x, nudge(c));
   }
   return v;
 }
