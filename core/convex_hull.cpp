@@ -6,6 +6,10 @@
 #include <memory>
 #include <new>
 
+#if defined(__i386__) && !defined(__SSE2_MATH__)
+#include <fpu_control.h>
+#endif
+
 namespace {
 
 struct HullPoint {
@@ -20,6 +24,31 @@ bool samePoint(const HullPoint& a, const HullPoint& b) {
   return a.x == b.x && a.y == b.y;
 }
 
+// The error-free transformations below need every operation rounded to double. SSE2 arithmetic
+// does that; the x87 unit keeps 64-bit significands in its registers unless told otherwise, so
+// there it is switched to double rounding while a hull or an orientation is computed.
+#if defined(__i386__) && !defined(__SSE2_MATH__)
+class DoubleRounding {
+ public:
+  DoubleRounding() {
+    _FPU_GETCW(saved_);
+    const fpu_control_t rounding = (saved_ & ~_FPU_EXTENDED) | _FPU_DOUBLE;
+    _FPU_SETCW(rounding);
+  }
+  ~DoubleRounding() { _FPU_SETCW(saved_); }
+  DoubleRounding(const DoubleRounding&) = delete;
+  DoubleRounding& operator=(const DoubleRounding&) = delete;
+
+ private:
+  fpu_control_t saved_;
+};
+#else
+class DoubleRounding {
+ public:
+  DoubleRounding() {}
+};
+#endif
+
 // a + b = s + e exactly.
 inline void twoSum(double a, double b, double& s, double& e) {
   s = a + b;
@@ -28,15 +57,33 @@ inline void twoSum(double a, double b, double& s, double& e) {
   e = (a - av) + (b - bv);
 }
 
-// Sign of the exact sum of the products p[i] * q[i], i < 6. Each product is
-// split into two doubles without error and the twelve parts are gathered in a
-// non-overlapping expansion, whose most significant part carries the sign.
+// a = hi + lo exactly, each half with at most 26 significant bits, so that products of halves
+// are exact. Separate statements keep a compiler from fusing the scaling into the subtraction.
+inline void split(double a, double& hi, double& lo) {
+  const double scaled = 134217729.0 * a;  // 2^27 + 1
+  const double big = scaled - a;
+  hi = scaled - big;
+  lo = a - hi;
+}
+
+// a * b = p + e exactly (Dekker), without relying on a fused multiply-add of the platform.
+inline void twoProduct(double a, double b, double& p, double& e) {
+  p = a * b;
+  double ahi, alo, bhi, blo;
+  split(a, ahi, alo);
+  split(b, bhi, blo);
+  e = ((ahi * bhi - p) + ahi * blo + alo * bhi) + alo * blo;
+}
+
+// Sign of the exact sum of the products p[i] * q[i], i < 6. Each product is split into two
+// doubles without error and the twelve parts are gathered in a non-overlapping expansion, whose
+// most significant part carries the sign.
 int exactSignOfProductSum(const double* p, const double* q) {
   double expansion[12];
   int length = 0;
   for (int i = 0; i < 6; ++i) {
-    const double product = p[i] * q[i];
-    const double parts[2] = {std::fma(p[i], q[i], -product), product};
+    double parts[2];
+    twoProduct(p[i], q[i], parts[1], parts[0]);
     for (double part : parts) {
       double carry = part;
       for (int k = 0; k < length; ++k)
@@ -120,6 +167,7 @@ int copyPossibleCorners(const CQNVector2<T>* points, int count, HullPoint* out) 
 
 int CQNGeometry::Orientation(const CQNVector2<double>& a, const CQNVector2<double>& b,
                              const CQNVector2<double>& c) {
+  const DoubleRounding rounding;
   return orientation({a[0], a[1]}, {b[0], b[1]}, {c[0], c[1]});
 }
 
@@ -129,6 +177,7 @@ int CQNGeometry::BuildConvexHull(int count, const CQNVector2<T>* points, int& hu
   if (count <= 0 || !points || !hull) return 0;
   for (int i = 0; i < count; ++i)
     if (!std::isfinite(points[i][0]) || !std::isfinite(points[i][1])) return 0;
+  const DoubleRounding rounding;
   try {
     // Andrew's monotone chain: sort, then one lower and one upper pass.
     std::unique_ptr<HullPoint[]> sorted(new HullPoint[count]);

@@ -5,8 +5,8 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <chrono>
 #include <cmath>
+#include <cstdint>
 #include <limits>
 #include <random>
 #include <set>
@@ -19,9 +19,38 @@ namespace {
 // so the brute force below can decide every orientation exactly in integers.
 using IPoint = std::pair<long long, long long>;
 
-__int128 Cross(const IPoint& o, const IPoint& a, const IPoint& b) {
-  return __int128(a.first - o.first) * (b.second - o.second) -
-         __int128(a.second - o.second) * (b.first - o.first);
+// A signed product of two 64-bit integers below 2^63, as sign and 128-bit magnitude, so that
+// the orientation below stays exact on 32-bit targets too.
+struct WideProduct {
+  bool negative;
+  uint64_t hi, lo;
+};
+
+WideProduct Multiply(long long a, long long b) {
+  const uint64_t x = a < 0 ? uint64_t(-a) : uint64_t(a), y = b < 0 ? uint64_t(-b) : uint64_t(b);
+  const uint64_t x0 = x & 0xffffffffu, x1 = x >> 32, y0 = y & 0xffffffffu, y1 = y >> 32;
+  const uint64_t p00 = x0 * y0, p01 = x0 * y1, p10 = x1 * y0, p11 = x1 * y1;
+  const uint64_t mid = (p00 >> 32) + (p01 & 0xffffffffu) + (p10 & 0xffffffffu);
+  return {x != 0 && y != 0 && (a < 0) != (b < 0), p11 + (p01 >> 32) + (p10 >> 32) + (mid >> 32),
+          (mid << 32) | (p00 & 0xffffffffu)};
+}
+
+// Sign of p - q.
+int CompareProducts(const WideProduct& p, const WideProduct& q) {
+  if (p.negative != q.negative) return p.negative ? -1 : 1;
+  int magnitude = 0;
+  if (p.hi != q.hi) {
+    magnitude = p.hi < q.hi ? -1 : 1;
+  } else if (p.lo != q.lo) {
+    magnitude = p.lo < q.lo ? -1 : 1;
+  }
+  return p.negative ? -magnitude : magnitude;
+}
+
+// Exact sign of the turn o -> a -> b.
+int Cross(const IPoint& o, const IPoint& a, const IPoint& b) {
+  return CompareProducts(Multiply(a.first - o.first, b.second - o.second),
+                         Multiply(a.second - o.second, b.first - o.first));
 }
 
 bool OnSegment(const IPoint& p, const IPoint& a, const IPoint& b) {
@@ -31,7 +60,7 @@ bool OnSegment(const IPoint& p, const IPoint& a, const IPoint& b) {
 }
 
 bool InTriangle(const IPoint& p, const IPoint& a, const IPoint& b, const IPoint& c) {
-  const __int128 d1 = Cross(a, b, p), d2 = Cross(b, c, p), d3 = Cross(c, a, p);
+  const int d1 = Cross(a, b, p), d2 = Cross(b, c, p), d3 = Cross(c, a, p);
   const bool negative = d1 < 0 || d2 < 0 || d3<0, positive = d1> 0 || d2 > 0 || d3 > 0;
   return !(negative && positive);
 }
@@ -140,8 +169,7 @@ TEST(ConvexHull, OrientationIsExactWhereRoundingFails) {
     CQNVector2<double> p[3];
     for (int i = 0; i < 3; ++i)
       p[i] = CQNVector2<double>(v[i].first * scale, v[i].second * scale);
-    const __int128 exact = Cross(v[0], v[1], v[2]);
-    const int sign = exact > 0 ? 1 : exact < 0 ? -1 : 0;
+    const int sign = Cross(v[0], v[1], v[2]);
     ASSERT_EQ(CQNGeometry::Orientation(p[0], p[1], p[2]), sign);
     const double rounded =
         (p[1][0] - p[0][0]) * (p[2][1] - p[0][1]) - (p[1][1] - p[0][1]) * (p[2][0] - p[0][0]);
@@ -199,20 +227,20 @@ bool InsideConvex(const std::vector<CQNVector2<double>>& h, const CQNVector2<dou
   return CQNGeometry::Orientation(h[lo], h[hi], q) >= 0;
 }
 
-// One million random points, all of which must end up inside. The hull takes well under a second
-// in an optimised build (see bench_hull); the bound here only catches a lost n log n, and leaves
-// room for unoptimised and sanitised builds.
-TEST(ConvexHull, MillionRandomPoints) {
-  const int n = 1000000;
+// A large cloud in a disc, where the corners are many: every point must end up inside. The time
+// for a million points is measured by bench_hull, where the build is optimised.
+TEST(ConvexHull, LargeRandomCloudLiesInside) {
+  const int n = 100000;
   std::mt19937 rng(2024);
   std::uniform_real_distribution<float> coord(-1000.0f, 1000.0f);
-  std::vector<ZvPoint2<float>> pts(n);
-  for (auto& p : pts)
-    p = {coord(rng), coord(rng)};
+  std::vector<ZvPoint2<float>> pts;
+  pts.reserve(n);
+  while (int(pts.size()) < n) {
+    const ZvPoint2<float> p = {coord(rng), coord(rng)};
+    if (p.x * p.x + p.y * p.y <= 1e6f) pts.push_back(p);
+  }
   ZvPoint2fArray hull(1);
-  const auto start = std::chrono::steady_clock::now();
   ASSERT_EQ(ZvGetConvexHull2D(n, pts.data(), &hull), 1);
-  EXPECT_LT(std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count(), 10.0);
   ASSERT_GE(hull.size, 3u);
   std::vector<CQNVector2<double>> h;
   for (unsigned int i = 0; i < hull.size; ++i)
