@@ -18,15 +18,21 @@
 
 namespace {
 
-enum Cloud { Square = 0, Disc = 1 };
+enum Cloud { Square = 0, Disc = 1, Circle = 2 };
 
-// Uniform in a square (few corners) or in a disc (many more corners, about n^(1/3)).
+// Uniform in a square (few corners), in a disc (many more corners, about n^(1/3)) or on a circle
+// (rounded to float: nearly every point is a corner, and many triples are nearly collinear).
 std::vector<ZvPoint2<float>> MakeCloud(int n, int cloud) {
   std::mt19937 rng(4242);
   std::uniform_real_distribution<float> u(-1.0f, 1.0f);
   std::vector<ZvPoint2<float>> points;
   points.reserve(n);
   while (int(points.size()) < n) {
+    if (cloud == Circle) {
+      const double a = 3.141592653589793 * u(rng);
+      points.push_back({float(1000 * std::cos(a)), float(1000 * std::sin(a))});
+      continue;
+    }
     const ZvPoint2<float> p{u(rng), u(rng)};
     if (cloud == Square || p.x * p.x + p.y * p.y <= 1.0f)
       points.push_back({p.x * 1000, p.y * 1000});
@@ -63,14 +69,14 @@ void BM_2geom_ConvexHull(benchmark::State& state) {
   state.SetItemsProcessed(state.iterations() * state.range(0));
 }
 BENCHMARK(BM_2geom_ConvexHull)
-    ->ArgsProduct({{100000, 1000000}, {Square, Disc}})
+    ->ArgsProduct({{100000, 1000000}, {Square, Disc, Circle}})
     ->Unit(benchmark::kMillisecond);
 #endif
 
 }  // namespace
 
 BENCHMARK(BM_ZvGetConvexHull2D)
-    ->ArgsProduct({{100000, 1000000}, {Square, Disc}})
+    ->ArgsProduct({{100000, 1000000}, {Square, Disc, Circle}})
     ->Unit(benchmark::kMillisecond);
 
 BENCHMARK_MAIN();
