@@ -38,7 +38,7 @@ double Fraction(double v, double k0, double k1) {
 int ZvPoint3dArraySingleComponent_ComputePosition(const ZvPoint3dArray& a,
                                                   const ZvDoubleArray& chords, double s,
                                                   ZvPoint3<double>& out) {
-  if (a.size == 0 || chords.size != a.size) return 0;
+  if (a.size == 0 || chords.size != a.size || std::isnan(s)) return 0;
   const unsigned int last = a.size - 1;
   if (std::fabs(s) <= 1e-9 || last == 0) {
     out = a[0];

@@ -85,7 +85,7 @@ ZV_API double ZvPoint2fArraySingleComponent_ComputeLength(const ZvPoint2fArray& 
 // The point at arc length s, given the chords of a. s within 1e-9 of 0 gives the first point, s
 // at or beyond the total the last one; a vertex hit exactly is returned as it is, and between
 // vertices the edge is interpolated linearly. A negative s beyond 1e-9 extends the first edge
-// backwards. Result 0 when a is empty or chords does not have one entry per vertex.
+// backwards. Result 0 when a is empty, chords does not have one entry per vertex, or s is NaN.
 ZV_API int ZvPoint3dArraySingleComponent_ComputePosition(const ZvPoint3dArray& a,
                                                          const ZvDoubleArray& chords, double s,
                                                          ZvPoint3<double>& out);
