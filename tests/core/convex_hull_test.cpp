@@ -203,7 +203,7 @@ TEST(ConvexHull, FloatEntryAppendsCornersCounterClockwise) {
 // A large cloud: every point must end up inside. The time for a million points is measured by
 // bench_hull, where the build is optimised.
 TEST(ConvexHull, LargeRandomCloudLiesInside) {
-  const int n = 100000;
+  const int n = 50000;
   std::mt19937 rng(2024);
   std::uniform_real_distribution<float> coord(-1000.0f, 1000.0f);
   std::vector<ZvPoint2<float>> pts(n);
