@@ -9,6 +9,7 @@
 #include <zv/fcurve_userdata.h>
 #include <zv/matrix.h>
 #include <zv/point.h>
+#include <zv/polyline.h>
 #include <zv/spline.h>
 #include <zv/trace.h>
 #include <zv/transfo4.h>
