@@ -8,6 +8,7 @@
 #include <zv/fcurve.h>
 #include <zv/fcurve_userdata.h>
 #include <zv/point.h>
+#include <zv/std_fcurve.h>
 #include <zv/trace.h>
 
 #endif
