@@ -6,12 +6,19 @@
 
 namespace {
 
-// A parameter within the snap tolerance of a key evaluates as on the key.
+// A parameter within the snap tolerance of a key evaluates as on the key. Most parameters lie
+// well away from every key: one hinted search tells, and the exact nearest-key search runs
+// only near a key. The search also leaves the hint where the evaluation will look.
 void SnapToKey(const ZvStdFCurveImpl& s, double& t) {
+  const unsigned int n = s.keys.size;
+  if (n == 0) return;
+  int found;
+  const unsigned int at = s.LocateParameter(t, found);
+  const bool nearBelow = at > 0 && !(t - s.keys[at - 1].parameter > 2.0 * kCFCSnapTolerance);
+  const bool nearAbove = at < n && !(s.keys[at].parameter - t > 2.0 * kCFCSnapTolerance);
+  if (!nearBelow && !nearAbove) return;
   unsigned int i;
-  if (s.keys.size && s.GetClosestKeyIndexInCenteredInterval(t, kCFCSnapTolerance, i)) {
-    t = s.keys[i].parameter;
-  }
+  if (s.GetClosestKeyIndexInCenteredInterval(t, kCFCSnapTolerance, i)) t = s.keys[i].parameter;
 }
 
 }  // namespace
