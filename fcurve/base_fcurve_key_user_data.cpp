@@ -5,15 +5,30 @@
 
 #include "fcurve/fcurve_lock.h"
 
+#include <cmath>
+
+namespace {
+
+// Snaps the parameter onto the nearest key within the tolerance and leaves
+// the key's parameter in it; false, with the parameter untouched, when the
+// curve has no key there.
+bool SnapToKey(const ZvBaseFCurve& curve, double& parameter, double tolerance) {
+  if (curve.GetNumKeys() == 0) return false;
+  double key = parameter;
+  if (!curve.GetNearestKeyParameterInCenteredInterval(key, tolerance) || std::isnan(key))
+    return false;
+  parameter = key;
+  return true;
+}
+
+}  // namespace
+
 unsigned int ZvBaseFCurve::SetKeyUserData(double& parameter, const _zvUID& uid,
                                           const unsigned char* data, unsigned int size,
                                           double tolerance) {
   ZvFCurveLockGuard guard(*this);
-  if (GetNumKeys() == 0) return 0;
-  double key = parameter;
-  if (!GetNearestKeyParameterInCenteredInterval(key, tolerance)) return 0;
-  parameter = key;
-  GetOrCreateUserDataStore().GetOrCreateKeySet(key).SetUserData(uid, data, size);
+  if (!SnapToKey(*this, parameter, tolerance)) return 0;
+  GetOrCreateUserDataStore().GetOrCreateKeySet(parameter)->SetUserData(uid, data, size);
   return 1;
 }
 
@@ -21,11 +36,8 @@ unsigned int ZvBaseFCurve::GetKeyUserData(double& parameter, const _zvUID& uid,
                                           const unsigned char*& data, unsigned int& size,
                                           double tolerance) const {
   ZvFCurveLockGuard guard(*this);
-  if (GetNumKeys() == 0) return 0;
-  double key = parameter;
-  if (!GetNearestKeyParameterInCenteredInterval(key, tolerance)) return 0;
-  parameter = key;
-  const CFCUserDataSet* set = m_userData != nullptr ? m_userData->FindKeySet(key) : nullptr;
+  if (!SnapToKey(*this, parameter, tolerance)) return 0;
+  const CFCUserDataSet* set = m_userData != nullptr ? m_userData->FindKeySet(parameter) : nullptr;
   const CFCUserDataValue* value = set != nullptr ? set->FindUserData(uid) : nullptr;
   if (value == nullptr) return 0;
   data = value->GetData();
@@ -36,11 +48,8 @@ unsigned int ZvBaseFCurve::GetKeyUserData(double& parameter, const _zvUID& uid,
 unsigned int ZvBaseFCurve::RemoveKeyUserData(double& parameter, const _zvUID& uid,
                                              double tolerance) {
   ZvFCurveLockGuard guard(*this);
-  if (GetNumKeys() == 0) return 0;
-  double key = parameter;
-  if (!GetNearestKeyParameterInCenteredInterval(key, tolerance)) return 0;
-  parameter = key;
-  return m_userData != nullptr ? m_userData->RemoveKeyUserData(key, uid) : 0;
+  if (!SnapToKey(*this, parameter, tolerance)) return 0;
+  return m_userData != nullptr ? m_userData->RemoveKeyUserData(parameter, uid) : 0;
 }
 
 unsigned int ZvBaseFCurve::RemoveKeyUserData(double parameter) {
@@ -60,9 +69,8 @@ unsigned int ZvBaseFCurve::CopyKeyUserData(const ZvBaseFCurve& source, double so
   ZvFCurveLockGuard sourceGuard(source);
   const CFCUserDataSet* set =
       source.m_userData != nullptr ? source.m_userData->FindKeySet(sourceParameter) : nullptr;
-  if (set == nullptr || set->IsEmpty()) return 1;
-  CFCUserDataSet& target = GetOrCreateUserDataStore().GetOrCreateKeySet(parameter);
-  target.MergeUserData(*set);
+  if (set == nullptr || set->IsEmpty() || std::isnan(parameter)) return 1;
+  GetOrCreateUserDataStore().GetOrCreateKeySet(parameter)->MergeUserData(*set);
   return 1;
 }
 
@@ -72,6 +80,7 @@ const CFCUserDataSet* ZvBaseFCurve::GetUserDataSet(double parameter) const {
 }
 
 unsigned int ZvBaseFCurve::SetUserDataSet(const CFCUserDataSet& set, double parameter) {
+  if (std::isnan(parameter)) return 0;
   ZvFCurveLockGuard guard(*this);
   if (set.IsEmpty() && m_userData == nullptr) return 1;
   GetOrCreateUserDataStore().SetKeySet(parameter, set);
@@ -85,15 +94,15 @@ unsigned int ZvBaseFCurve::RemoveAllKeyUserData() {
 }
 
 unsigned int ZvBaseFCurve::TranslateAllKeyUserData(double delta) {
+  if (!std::isfinite(delta)) return 0;
   ZvFCurveLockGuard guard(*this);
-  if (m_userData != nullptr) m_userData->TranslateKeySets(delta);
-  return 1;
+  return m_userData != nullptr ? m_userData->TranslateKeySets(delta) : 1;
 }
 
 unsigned int ZvBaseFCurve::ScaleAllKeyUserData(double factor) {
+  if (!std::isfinite(factor)) return 0;
   ZvFCurveLockGuard guard(*this);
-  if (m_userData != nullptr) m_userData->ScaleKeySets(factor);
-  return 1;
+  return m_userData != nullptr ? m_userData->ScaleKeySets(factor) : 1;
 }
 
 unsigned int ZvBaseFCurve::MoveKeyUserDataTail(const ZvDoubleArray& oldParameters,

@@ -2,6 +2,7 @@
 
 #include "fcurve/key_params.h"
 
+#include <cmath>
 #include <memory>
 
 CFCUserDataStore::CFCUserDataStore() {}
@@ -42,19 +43,23 @@ CFCUserDataStore::key_const_iterator CFCUserDataStore::key_end() const {
 }
 
 CFCUserDataSet* CFCUserDataStore::FindKeySet(double parameter) const {
+  // A NaN is equivalent to every key under the map's order: keep it out.
+  if (std::isnan(parameter)) return nullptr;
   const KeySetMap::const_iterator it = m_keySets.find(parameter);
   return it == m_keySets.end() ? nullptr : it->second;
 }
 
-CFCUserDataSet& CFCUserDataStore::GetOrCreateKeySet(double parameter) {
+CFCUserDataSet* CFCUserDataStore::GetOrCreateKeySet(double parameter) {
+  if (std::isnan(parameter)) return nullptr;
   const KeySetMap::iterator it = m_keySets.lower_bound(parameter);
-  if (it != m_keySets.end() && !(parameter < it->first)) return *it->second;
+  if (it != m_keySets.end() && !(parameter < it->first)) return it->second;
   std::unique_ptr<CFCUserDataSet> set(new CFCUserDataSet);
   m_keySets.emplace_hint(it, parameter, set.get());
-  return *set.release();
+  return set.release();
 }
 
 void CFCUserDataStore::SetKeySet(double parameter, const CFCUserDataSet& set) {
+  if (std::isnan(parameter)) return;
   if (set.IsEmpty()) {
     // No entry is kept without items: an entry means "this key has data".
     RemoveKeySet(parameter);
@@ -74,6 +79,7 @@ void CFCUserDataStore::SetKeySet(double parameter, const CFCUserDataSet& set) {
 
 void CFCUserDataStore::AdoptKeySet(double parameter, CFCUserDataSet* set) {
   std::unique_ptr<CFCUserDataSet> owned(set);
+  if (owned == nullptr || std::isnan(parameter)) return;
   const KeySetMap::iterator it = m_keySets.lower_bound(parameter);
   if (it != m_keySets.end() && !(parameter < it->first)) {
     it->second->MergeUserData(*owned);
@@ -84,6 +90,7 @@ void CFCUserDataStore::AdoptKeySet(double parameter, CFCUserDataSet* set) {
 }
 
 unsigned int CFCUserDataStore::RemoveKeySet(double parameter) {
+  if (std::isnan(parameter)) return 0;
   const KeySetMap::iterator it = m_keySets.find(parameter);
   if (it == m_keySets.end()) return 0;
   delete it->second;
@@ -92,6 +99,7 @@ unsigned int CFCUserDataStore::RemoveKeySet(double parameter) {
 }
 
 unsigned int CFCUserDataStore::RemoveKeyUserData(double parameter, const _zvUID& uid) {
+  if (std::isnan(parameter)) return 0;
   const KeySetMap::iterator it = m_keySets.find(parameter);
   if (it == m_keySets.end() || !it->second->RemoveUserData(uid)) return 0;
   if (it->second->IsEmpty()) {
@@ -126,22 +134,30 @@ void CFCUserDataStore::RebuildKeySets(F newParameter) {
   }
 }
 
-void CFCUserDataStore::TranslateKeySets(double delta) {
+unsigned int CFCUserDataStore::TranslateKeySets(double delta) {
+  if (!std::isfinite(delta)) return 0;
   RebuildKeySets([delta](double parameter) { return parameter + delta; });
+  return 1;
 }
 
-void CFCUserDataStore::ScaleKeySets(double factor) {
+unsigned int CFCUserDataStore::ScaleKeySets(double factor) {
+  if (!std::isfinite(factor)) return 0;
   RebuildKeySets([factor](double parameter) { return parameter * factor; });
+  return 1;
 }
 
 unsigned int CFCUserDataStore::MoveKeySetTail(const double* oldParameters,
                                               const double* newParameters, unsigned int count) {
-  // 1. and 2.: take the sets from the first old parameter to the end out.
+  for (unsigned int i = 0; i < count; ++i)
+    if (std::isnan(oldParameters[i]) || std::isnan(newParameters[i])) return 0;
+
+  // Take the sets from the first old parameter to the end out of the map.
   const KeySetMap::iterator from = m_keySets.lower_bound(oldParameters[0]);
   KeySetMap moved(from, m_keySets.end());
   m_keySets.erase(from, m_keySets.end());
 
-  // The last set that stays, if any: a moved set arriving on its key merges.
+  // The last set that stays, if any: when the first moved set arrives on its
+  // key (two keys that became one), the two sets become one.
   CFCUserDataSet* lastStaying = nullptr;
   double lastStayingParameter = 0.0;
   if (!m_keySets.empty()) {
@@ -163,11 +179,9 @@ unsigned int CFCUserDataStore::MoveKeySetTail(const double* oldParameters,
         ++j;
       double target = oldParameter;
       if (j < count && zvIsSameParameter(oldParameters[j], oldParameter)) target = newParameters[j];
-      // 3.: merge into the last staying set when the keys coincide.
       if (first && lastStaying != nullptr && zvIsSameParameter(lastStayingParameter, target)) {
         lastStaying->MergeUserData(*set);
       } else {
-        // 4.: insert at the new parameter.
         AdoptKeySet(target, set.release());
       }
       first = false;

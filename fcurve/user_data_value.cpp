@@ -3,11 +3,6 @@
 #include <cstring>
 #include <new>
 
-bool operator==(const _zvUID& a, const _zvUID& b) {
-  return a.Data1 == b.Data1 && a.Data2 == b.Data2 && a.Data3 == b.Data3 &&
-         std::memcmp(a.Data4, b.Data4, sizeof a.Data4) == 0;
-}
-
 CFCUserDataKey::CFCUserDataKey() : m_uid() {}
 
 CFCUserDataKey::CFCUserDataKey(const _zvUID& uid) : m_uid(uid) {}

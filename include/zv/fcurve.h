@@ -286,17 +286,21 @@ class ZV_API ZvBaseFCurve {
   // the curve.
   const CFCUserDataSet* GetUserDataSet(double parameter) const;
   // Replaces the set at exactly this parameter by a copy (an empty set
-  // removes it).
+  // removes it); 0 for a NaN parameter.
   unsigned int SetUserDataSet(const CFCUserDataSet& set, double parameter);
   // Frees all per-key sets; the curve-level items stay.
   unsigned int RemoveAllKeyUserData();
+  // Every per-key set moves to its parameter plus delta, or times factor;
+  // sets whose parameters meet are merged. 0 for a delta or factor that is
+  // not finite.
   unsigned int TranslateAllKeyUserData(double delta);
   unsigned int ScaleAllKeyUserData(double factor);
   // Moves the sets of the keys from oldParameters[0] onward. The two arrays
   // have the same length (else 0) and ascend: the set at oldParameters[i]
   // goes to newParameters[i]; a set the lists do not name stays. The first
   // moved set, when it lands within 1e-15 of the last set that stays, is
-  // merged into it (its items win). An empty list answers 1 at once and
+  // merged into it (its items win). A NaN in the lists is refused with 0,
+  // nothing moved. An empty list answers 1 at once and
   // leaves the curve locked once more: callers never pass one, and one that
   // does must Unlock after it.
   unsigned int MoveKeyUserDataTail(const ZvDoubleArray& oldParameters,
@@ -308,7 +312,9 @@ class ZV_API ZvBaseFCurve {
   unsigned int WriteUserDataToBuffer(void* buffer) const;
   unsigned int GetUserDataBufferSize() const;
   // Given the block past its length field; returns the body bytes consumed,
-  // 0 for a refused version, 5 when the block holds nothing.
+  // 0 for a refused version, 5 when the block holds nothing. A curve that
+  // has a store already only steps over the block; otherwise it takes the
+  // block's store, created even when empty.
   unsigned int ReadUserDataFromBufferBody(const void* body);
 
  protected:

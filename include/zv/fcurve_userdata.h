@@ -5,6 +5,7 @@
 
 #include <zv/api.h>
 
+#include <cstring>
 #include <map>
 
 // 16-byte identifier of one user data item.
@@ -15,7 +16,10 @@ struct _zvUID {
   unsigned char Data4[8];
 };
 
-ZV_API bool operator==(const _zvUID& a, const _zvUID& b);
+inline bool operator==(const _zvUID& a, const _zvUID& b) {
+  return a.Data1 == b.Data1 && a.Data2 == b.Data2 && a.Data3 == b.Data3 &&
+         std::memcmp(a.Data4, b.Data4, sizeof a.Data4) == 0;
+}
 inline bool operator!=(const _zvUID& a, const _zvUID& b) {
   return !(a == b);
 }
@@ -106,7 +110,8 @@ class ZV_API CFCUserDataSet {
 
 // The user data of one curve: the curve-level items (the set it is) and one
 // owned set per key parameter. Key parameters compare exactly; they always
-// equal the parameters of the curve's keys.
+// equal the parameters of the curve's keys. A NaN is no key parameter: every
+// operation given one finds nothing and changes nothing.
 class ZV_API CFCUserDataStore : public CFCUserDataSet {
  public:
   typedef std::map<double, CFCUserDataSet*> KeySetMap;
@@ -124,7 +129,7 @@ class ZV_API CFCUserDataStore : public CFCUserDataSet {
   // The set at exactly this parameter, or null.
   CFCUserDataSet* FindKeySet(double parameter) const;
   // The set at exactly this parameter, created empty if absent.
-  CFCUserDataSet& GetOrCreateKeySet(double parameter);
+  CFCUserDataSet* GetOrCreateKeySet(double parameter);
   // Replaces the set at the parameter by a copy; an empty set removes it.
   void SetKeySet(double parameter, const CFCUserDataSet& set);
   // Takes ownership of the set; merges it into a set already at the
@@ -136,8 +141,15 @@ class ZV_API CFCUserDataStore : public CFCUserDataSet {
   unsigned int RemoveKeyUserData(double parameter, const _zvUID& uid);
   void RemoveAllKeySets();
 
-  void TranslateKeySets(double delta);
-  void ScaleKeySets(double factor);
+  // Every key parameter plus delta, or times factor; the sets change hands
+  // without a copy, and sets whose parameters meet are merged. A delta or
+  // factor that is not finite is refused with 0.
+  unsigned int TranslateKeySets(double delta);
+  unsigned int ScaleKeySets(double factor);
+  // The sets from oldParameters[0] on go from oldParameters[i] to
+  // newParameters[i] (both ascending, count > 0); a set the lists do not name
+  // stays. The first moved set, landing within 1e-15 of the last set that
+  // stays, is merged into it. 0 (and nothing moved) if a parameter is NaN.
   unsigned int MoveKeySetTail(const double* oldParameters, const double* newParameters,
                               unsigned int count);
 

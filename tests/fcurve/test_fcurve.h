@@ -19,6 +19,10 @@ class TestFCurve : public ZvBaseFCurve {
     m_keys = other.m_keys;
     other.Unlock();
   }
+  TestFCurve& operator=(const TestFCurve& other) {
+    Set(other);
+    return *this;
+  }
   TestFCurve& operator=(const ZvBaseFCurve& other) override {
     Set(other);
     return *this;
