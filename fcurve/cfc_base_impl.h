@@ -518,6 +518,48 @@ class CFCBaseImpl : public Store {
     curve.ScaleAllKeyUserData(factor);
   }
 
+  // ---- Redraw boxes -------------------------------------------------------------------------
+
+  // The box of key i with its neighbours, the steps included: what must be redrawn when the key
+  // changes.
+  int ComputeKeyExtent(unsigned int i, ZvExtent2<double>& extent) const {
+    const unsigned int n = keys.size;
+    if (i >= n) return 0;
+    extent = ZvExtent2<double>();
+    const double before =
+        i > 0 ? this->ValueAsDouble(i - 1) : static_cast<double>(this->ValueLeftOfFirstKey());
+    extent.AddPoint(ZvPoint2<double>{keys[i].parameter, before});
+    extent.AddPoint(ZvPoint2<double>{keys[i].parameter, this->ValueAsDouble(i)});
+    if (i > 0) extent.AddPoint(ZvPoint2<double>{keys[i - 1].parameter, before});
+    if (i + 1 < n) {
+      extent.AddPoint(ZvPoint2<double>{keys[i + 1].parameter, this->ValueAsDouble(i)});
+      extent.AddPoint(ZvPoint2<double>{keys[i + 1].parameter, this->ValueAsDouble(i + 1)});
+    }
+    return 1;
+  }
+
+  int ComputeNeighboringKeysExtent(double t, ZvExtent2<double>& extent) const {
+    return NeighboringKeysExtent(*this, t, extent);
+  }
+
+  // On a key that key's box; between keys the union of both; beyond the ends the end key's.
+  // Impl supplies ComputeKeyExtent, so that the standard curve adds its handles.
+  template <class Impl>
+  static int NeighboringKeysExtent(const Impl& impl, double t, ZvExtent2<double>& extent) {
+    const unsigned int n = impl.keys.size;
+    if (n == 0) return 0;
+    int found;
+    const unsigned int at = impl.LocateParameter(t, found);
+    if (found) return impl.ComputeKeyExtent(at - 1, extent);
+    if (at == 0) return impl.ComputeKeyExtent(0, extent);
+    if (at >= n) return impl.ComputeKeyExtent(n - 1, extent);
+    ZvExtent2<double> other;
+    impl.ComputeKeyExtent(at - 1, extent);
+    impl.ComputeKeyExtent(at, other);
+    extent.Union(other);
+    return 1;
+  }
+
   // The key nearest to t: the key on it, else the nearer neighbour, the earlier on a tie.
   unsigned int NearestKeyIndex(double t) const {
     int found;

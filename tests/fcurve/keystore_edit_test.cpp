@@ -193,6 +193,23 @@ TEST(KeystoreEdit, ResampleWithALongStepKeepsOnlyTheEnds) {
   EXPECT_EQ(grid.keys[2].value, 2);  // the step of the removed key at 0.3
 }
 
+TEST(KeystoreEdit, RedrawBoxesCoverTheStepsAroundAKey) {
+  IntStore s = MakeInts({{0.0, 5}, {2.0, 1}, {3.0, 8}});
+  s.valueBeforeFirstKey = -2;
+  ZvExtent2<double> box;
+  ASSERT_EQ(s.ComputeKeyExtent(1, box), 1);
+  EXPECT_EQ(box.xmin, 0.0);
+  EXPECT_EQ(box.xmax, 3.0);
+  EXPECT_EQ(box.ymin, 1.0);
+  EXPECT_EQ(box.ymax, 8.0);
+  ASSERT_EQ(s.ComputeNeighboringKeysExtent(-1.0, box), 1);
+  EXPECT_EQ(box.ymin, -2.0);  // the step into the first key
+  ASSERT_EQ(s.ComputeNeighboringKeysExtent(2.5, box), 1);
+  EXPECT_EQ(box.xmin, 0.0);
+  EXPECT_EQ(box.xmax, 3.0);
+  EXPECT_EQ(s.ComputeKeyExtent(3, box), 0);
+}
+
 TEST(KeystoreEdit, SmoothingConvolvesThroughTheOwner) {
   ZvStdFCurve curve(0.0, ZvBaseFCurve::LinearSegment);
   curve.CreateKey(0.0, 1.0);

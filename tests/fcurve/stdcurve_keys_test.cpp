@@ -293,6 +293,19 @@ TEST(StdCurveKeys, WholeCurveMoves) {
   ExpectSameShape(shape, Sample(grid, 0.0, 7.5, 60), 1e-9);
   ASSERT_EQ(grid.ResampleSequence(0.0, 7.5, 2.5, 0, 0), 1u);
   EXPECT_EQ(grid.GetNumKeys(), 4u);
+
+  // Under a cycle method the interval is folded into the keys first.
+  ZvStdFCurve cycled = Wave();
+  cycled.SetExtrapolationMethod(C::CycleExtrapolation);
+  ASSERT_EQ(cycled.ResampleSequence(9.0, 10.5, 0.5, 1, 0), 1u);
+  EXPECT_EQ(cycled.GetNumKeys(), 8u);
+  EXPECT_EQ(cycled.IsKeyParameter(2.5, 1e-12), 1u);
+  ASSERT_EQ(cycled.ResampleSequence(6.5, 8.5, 0.5, 1, 0), 1u);  // across a period boundary
+  EXPECT_EQ(cycled.GetNumKeys(), 12u);
+  EXPECT_EQ(cycled.IsKeyParameter(0.5, 1e-12), 1u);
+  EXPECT_EQ(cycled.IsKeyParameter(7.0, 1e-12), 1u);
+  cycled.SetExtrapolationMethod(C::ConstantExtrapolation);
+  ExpectSameShape(shape, Sample(cycled, 0.0, 7.5, 60), 1e-9);
 }
 
 }  // namespace
