@@ -46,10 +46,10 @@ ZvStdFCurve::ZvStdFCurve(const ZvPoint2<double>& p0, const ZvPoint2<double>& p1,
   m_impl->keys.Add(b);
 }
 
-ZvStdFCurve::ZvStdFCurve(const ZvStdFCurve& other) : ZvBaseFCurve(other), m_impl(nullptr) {
-  ZvFCurveLockGuard guard(other);
-  m_impl = new ZvStdFCurveImpl(*other.m_impl);
-}
+ZvStdFCurve::ZvStdFCurve(const ZvStdFCurve& other) : ZvStdFCurve(other, ZvFCurveLockGuard(other)) {}
+
+ZvStdFCurve::ZvStdFCurve(const ZvStdFCurve& other, const ZvFCurveLockGuard&)
+    : ZvBaseFCurve(other), m_impl(new ZvStdFCurveImpl(*other.m_impl)) {}
 
 ZvStdFCurve::~ZvStdFCurve() {
   delete m_impl;

@@ -26,6 +26,7 @@
 #include <zv/point.h>
 
 class ZvStdFCurveImpl;
+class ZvFCurveLockGuard;
 
 class ZV_API ZvStdFCurve : public ZvBaseFCurve {
  public:
@@ -189,6 +190,9 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   unsigned int IsValid() const;
 
  private:
+  // Copies under the source's lock, held from before the user data is copied until the keys are.
+  ZvStdFCurve(const ZvStdFCurve& other, const ZvFCurveLockGuard& sourceLock);
+
   ZvStdFCurveImpl* m_impl;
 };
 
