@@ -66,7 +66,7 @@ unsigned int ZvStdFCurve::ScaleParameterAxis(double factor) {
 unsigned int ZvStdFCurve::ShiftValues(double delta) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
-  if (s.readOnly || AnyKeyHas(s, CFCFlag_ValueLock)) return 0;
+  if (s.readOnly || !std::isfinite(delta) || AnyKeyHas(s, CFCFlag_ValueLock)) return 0;
   MapValues(s, 1.0, delta);
   return 1;
 }
@@ -74,7 +74,10 @@ unsigned int ZvStdFCurve::ShiftValues(double delta) {
 unsigned int ZvStdFCurve::ScaleAndShiftValues(double scale, double offset) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
-  if (s.readOnly || AnyKeyHas(s, CFCFlag_ValueLock)) return 0;
+  if (s.readOnly || !std::isfinite(scale) || !std::isfinite(offset) ||
+      AnyKeyHas(s, CFCFlag_ValueLock)) {
+    return 0;
+  }
   MapValues(s, scale, offset);
   return 1;
 }

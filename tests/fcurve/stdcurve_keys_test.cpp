@@ -204,6 +204,31 @@ TEST(StdCurveKeys, HandlesAndSegmentKinds) {
   EXPECT_EQ(line.GetFirstSegmentKind(), C::ConstantSegment);
 }
 
+TEST(StdCurveKeys, BadInputIsRefusedAndChangesNothing) {
+  ZvStdFCurve curve = Wave();
+  const std::vector<double> before = Sample(curve, -1.0, 8.5, 100);
+  const double nan = std::nan(""), inf = HUGE_VAL;
+  EXPECT_EQ(curve.CreateKey(1.0, nan), 0u);
+  EXPECT_EQ(curve.CreateKey(inf, 1.0), 0u);
+  EXPECT_EQ(curve.CreateKey(1.0, 1.0, static_cast<C::FSKind>(7), C::LinearSegment), 0u);
+  EXPECT_EQ(curve.MergeAndCreateKey(nan, 3.0, 1.0, 1.0, 0, 0, 0), 0u);
+  EXPECT_EQ(curve.RemoveKeys(nan, nan, 0, 0), 0u);
+  EXPECT_EQ(curve.SetKeyValue(1.5, C::RightSide, inf, 0.0), 0u);
+  EXPECT_EQ(curve.SetKeyTgtHandle(0.0, C::LeftSide, {nan, 1.0}, 0.0), 0u);
+  EXPECT_EQ(curve.SetValueWhenNoKeys(nan), 0u);
+  EXPECT_EQ(curve.ShiftValues(nan), 0u);
+  EXPECT_EQ(curve.ScaleAndShiftValues(1.0, inf), 0u);
+  EXPECT_EQ(curve.ShiftParameters(inf), 0u);
+  EXPECT_EQ(curve.ResampleSequence(0.0, 7.5, 0.0, 0, 0), 0u);
+  EXPECT_EQ(curve.SmoothSequence(0.0, 7.5, nullptr, 3), 0u);
+  EXPECT_EQ(curve.SetClampingValues(nan, 1.0), 0u);
+  double found;
+  EXPECT_EQ(curve.EvalInverse(nan, found, 0), 0u);
+  EXPECT_EQ(curve.GetNumKeys(), 6u);
+  EXPECT_EQ(curve.IsValid(), 1u);
+  ExpectSameShape(before, Sample(curve, -1.0, 8.5, 100), 0.0);
+}
+
 TEST(StdCurveKeys, CopiesAreIndependent) {
   ZvStdFCurve curve = Wave();
   ZvBaseFCurve* clone = curve.Clone();
