@@ -201,20 +201,48 @@ class CFCBaseImpl : public CFCKeySearch<T, Key, Store> {
     return curve.MoveKeyUserDataTail(oldParameters, newParameters);
   }
 
-  // Keys whose value repeats the previous key's are dropped, unless value- or parameter-locked.
-  // Returns the number of keys dropped.
-  unsigned int ReduceNumKeys(unsigned int first, unsigned int last, double, ZvBaseFCurve& curve) {
+  // Drops the keys strictly inside first..last that add nothing, with their user data, and
+  // returns how many went. What adds nothing is a store difference. The integer store drops a
+  // key that repeats the previous key's value (the tolerance plays no part). The raw and
+  // standard stores thin along lines: a line runs from a kept key through the next one, and the
+  // key before each following key j goes while j lies on the line within the tolerance, on
+  // both of its sides; otherwise that key stays and the line restarts from it to j. The
+  // standard store keeps keys that touch a cubic segment and value- or parameter-locked keys.
+  unsigned int ReduceNumKeys(unsigned int first, unsigned int last, double tolerance,
+                             ZvBaseFCurve& curve) {
     if (last < first + 2 || last >= keys.size) return 0;
     const double firstParameter = keys[first].parameter, lastParameter = keys[last].parameter;
+    // Kept keys are moved down in place; a key is read before anything is written over it.
     unsigned int write = first + 1;
-    for (unsigned int i = first + 1; i < last; ++i) {
-      const bool drop = zvIsSameParameter(this->ValueAsDouble(i), this->ValueAsDouble(i - 1)) &&
-                        (this->GetKeyFlags(i) & (CFCFlag_ValueLock | CFCFlag_ParameterLock)) == 0;
-      if (drop) {
-        curve.RemoveKeyUserData(keys[i].parameter);
-      } else {
-        if (write != i) this->MoveKey(write, i);
+    if constexpr (Store::kThinsAlongLines) {
+      double anchorX = keys[first].parameter, anchorY = this->ThinOutValue(first);
+      double slope =
+          (this->ThinInValue(first + 1) - anchorY) / (keys[first + 1].parameter - anchorX);
+      for (unsigned int j = first + 2; j <= last; ++j) {
+        const double x = keys[j].parameter;
+        const double y = anchorY + slope * (x - anchorX);
+        const unsigned int candidate = j - 1;
+        if (std::fabs(y - this->ThinInValue(j)) <= tolerance &&
+            std::fabs(y - this->ThinOutValue(j)) <= tolerance && this->ThinMayDrop(candidate)) {
+          curve.RemoveKeyUserData(keys[candidate].parameter);
+          continue;
+        }
+        anchorX = keys[candidate].parameter;
+        anchorY = this->ThinOutValue(candidate);
+        slope = (this->ThinInValue(j) - anchorY) / (x - anchorX);
+        if (write != candidate) this->MoveKey(write, candidate);
         ++write;
+      }
+    } else {
+      for (unsigned int i = first + 1; i < last; ++i) {
+        const bool drop = zvIsSameParameter(this->ValueAsDouble(i), this->ValueAsDouble(i - 1)) &&
+                          (this->GetKeyFlags(i) & (CFCFlag_ValueLock | CFCFlag_ParameterLock)) == 0;
+        if (drop) {
+          curve.RemoveKeyUserData(keys[i].parameter);
+        } else {
+          if (write != i) this->MoveKey(write, i);
+          ++write;
+        }
       }
     }
     if (write == last) return 0;
