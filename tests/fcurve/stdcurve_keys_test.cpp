@@ -7,6 +7,7 @@
 #include "test_fcurve.h"
 
 #include <cmath>
+#include <random>
 #include <vector>
 
 namespace {
@@ -227,6 +228,53 @@ TEST(StdCurveKeys, BadInputIsRefusedAndChangesNothing) {
   EXPECT_EQ(curve.GetNumKeys(), 6u);
   EXPECT_EQ(curve.IsValid(), 1u);
   ExpectSameShape(before, Sample(curve, -1.0, 8.5, 100), 0.0);
+}
+
+TEST(StdCurveKeys, RandomEditsKeepTheCurveValid) {
+  std::mt19937 rng(5);
+  std::uniform_real_distribution<double> where(-2.0, 12.0), value(-5.0, 5.0), unit(-1.0, 1.0);
+  ZvStdFCurve curve;
+  unsigned int mostKeys = 0;
+  for (int step = 0; step < 3000; ++step) {
+    const double t = std::round(where(rng) * 8.0) / 8.0 + (rng() % 4 == 0 ? 1e-13 : 0.0);
+    const C::FSKind kind = static_cast<C::FSKind>(rng() % 4);
+    switch (rng() % 8) {
+      case 0:
+      case 1:
+        curve.CreateKey(t, value(rng), kind, static_cast<C::FSKind>(rng() % 4));
+        break;
+      case 2:
+        curve.CreateNonModifyingKey(t, 1);
+        break;
+      case 3:
+        curve.RemoveKey(t, 0.3);
+        break;
+      case 4:
+        curve.MergeAndCreateKey(t - 1.0, t + 1.0, t, value(rng), rng() % 2, rng() % 2, rng() % 2);
+        break;
+      case 5:
+        curve.SetKeyTgtHandle(t, rng() % 2 ? C::LeftSide : C::RightSide,
+                              {unit(rng), 3.0 * unit(rng)}, 0.2);
+        break;
+      case 6:
+        curve.SetSegmentKind(t, C::RightSide, kind, 0.2);
+        break;
+      default: {
+        double at = t;
+        curve.SetConstraint(at, static_cast<C::KeyConstraint>(64u << (rng() % 6)), rng() % 2, 0.2);
+        break;
+      }
+    }
+    ASSERT_EQ(curve.IsValid(), 1u) << "after step " << step;
+    ZvDoubleArray params;
+    curve.GetAllKeyParameters(params);
+    for (unsigned int i = 1; i < params.size; ++i)
+      ASSERT_LT(params[i - 1], params[i]);
+    if (params.size > mostKeys) mostKeys = params.size;
+    const double v = curve.Eval(where(rng), 0);
+    ASSERT_TRUE(std::isfinite(v)) << "after step " << step;
+  }
+  EXPECT_GT(mostKeys, 20u);  // the edits did build a curve
 }
 
 TEST(StdCurveKeys, CopiesAreIndependent) {
