@@ -69,6 +69,8 @@ class CFCBaseImpl : public CFCKeySearch<T, Key, Store> {
     return 1;
   }
 
+  // Removes the closest key in the tolerance (the integer curves snap the parameter themselves
+  // and pass 0). The first key's value passes to the step in front of the new first key.
   int RemoveKey(double parameter, double tolerance, ZvBaseFCurve& curve) {
     unsigned int i;
     if (!GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
