@@ -11,6 +11,7 @@
 #include <zv/point.h>
 #include <zv/polyline.h>
 #include <zv/spline.h>
+#include <zv/std_fcurve.h>
 #include <zv/trace.h>
 #include <zv/transfo4.h>
 
