@@ -9,6 +9,8 @@
 #include <zv/point.h>
 
 #include <cmath>
+#include <cstdint>
+#include <cstring>
 
 #include "core/vec.h"
 
@@ -19,11 +21,12 @@ struct ZvCubicGeom2 {
 
   static double ThirdDifferenceLength(const Point& d) { return zvGuardedLength(d); }
 
-  // Distance of the second differences from the chord line, by the 2-D cross product.
+  // Distance of the second differences from the chord line, by the 2-D cross product. Rounded
+  // division by the same chord is monotone, so dividing the larger one alone gives the same e.
   static double Deviation(const Point& a1, const Point& a2, const Point& k, double chord) {
-    const double e1 = std::fabs(a1.x * k.y - a1.y * k.x) / chord;
-    const double e2 = std::fabs(a2.x * k.y - a2.y * k.x) / chord;
-    return e1 > e2 ? e1 : e2;
+    const double c1 = std::fabs(a1.x * k.y - a1.y * k.x);
+    const double c2 = std::fabs(a2.x * k.y - a2.y * k.x);
+    return (c1 > c2 ? c1 : c2) / chord;
   }
 
   static bool IsOutsideGrownControlBox(const Point* p, const Point& q, double grow) {
@@ -35,8 +38,6 @@ struct ZvCubicGeom2 {
                                            double maxDistance2, double& d2, double& t) {
     return ZvPoint2_FindClosestPointOnLineSegment<double>(q, a, b, maxDistance2, d2, t);
   }
-
-  static Point Ldexp(const Point& v, int e) { return {std::ldexp(v.x, e), std::ldexp(v.y, e)}; }
 
   static bool IsOutside(double c0, double c1, double c2, double c3, double q, double grow) {
     const double lo = std::fmin(std::fmin(c0, c1), std::fmin(c2, c3));
@@ -56,9 +57,8 @@ struct ZvCubicGeom3 {
     const double chord2 = chord * chord;
     const Point r1 = k * (ZvDot(a1, k) / chord2) - a1;
     const Point r2 = k * (ZvDot(a2, k) / chord2) - a2;
-    const double e1 = std::sqrt(ZvDot(r1, r1));
-    const double e2 = std::sqrt(ZvDot(r2, r2));
-    return e1 > e2 ? e1 : e2;
+    const double l1 = ZvDot(r1, r1), l2 = ZvDot(r2, r2);
+    return std::sqrt(l1 > l2 ? l1 : l2);  // sqrt is monotone: one root serves
   }
 
   static bool IsOutsideGrownControlBox(const Point* p, const Point& q, double grow) {
@@ -71,10 +71,6 @@ struct ZvCubicGeom3 {
                                            double maxDistance2, double& d2, double& t) {
     return ZvPoint3_FindClosestPointOnLineSegment<double>(q, a, b, maxDistance2, d2, t);
   }
-
-  static Point Ldexp(const Point& v, int e) {
-    return {std::ldexp(v.x, e), std::ldexp(v.y, e), std::ldexp(v.z, e)};
-  }
 };
 
 // Truncation to an unsigned 32-bit count. Out of range (a zero tolerance, an overflowing
@@ -84,12 +80,14 @@ inline unsigned int zvTruncateToCount(double v) {
   return v >= 4294967296.0 ? 0xFFFFFFFFu : 0u;
 }
 
+// Number of significant bits of n, 0 for n = 0.
+inline unsigned int zvBitLength(unsigned int n) {
+  return n ? 32u - __builtin_clz(n) : 0u;
+}
+
 // floor(log8(n)): the number of base-8 digits of n minus one, 0 for n = 0. At most 10.
 inline unsigned int zvSubdivisionDepth(unsigned int n) {
-  unsigned int depth = 0;
-  for (n >>= 3; n != 0; n >>= 3)
-    ++depth;
-  return depth;
+  return n ? (zvBitLength(n) - 1) / 3 : 0;
 }
 
 // The number of times a piece is halved by forward differencing, from its deviation e. Each
@@ -100,8 +98,8 @@ inline unsigned int zvForwardDifferencingLevels(double e, double factor) {
   double v = e * factor;
   unsigned int levels = 0;
   if (v < 2147483647.0) {
-    for (unsigned int m = zvTruncateToCount(v + 0.5); m != 0; m >>= 2)
-      ++levels;
+    // Base-4 digits of m: half its bit length, rounded up.
+    levels = (zvBitLength(zvTruncateToCount(v + 0.5)) + 1) / 2;
   } else if (!std::isinf(v)) {
     // An infinite v (zero tolerance) would never fall to 1; it gets no interior points.
     for (; v > 1.0; v *= 0.25)
@@ -110,42 +108,46 @@ inline unsigned int zvForwardDifferencingLevels(double e, double factor) {
   return levels;
 }
 
-// The differences of a cubic that drive both the step count and the stepping itself.
+// Forward-differencing levels of one piece, before any cap; factor is 0.75 / tolerance.
 template <class G>
-struct ZvCubicDifferences {
+inline unsigned int zvCubicLevels(const typename G::Point* p, double factor) {
   using Point = typename G::Point;
-
-  Point d0;  // P1 - P0
-  Point a1;  // second differences
-  Point a3;  // third difference
-  unsigned int levels;
-
-  // levels before any cap; factor is 0.75 / tolerance.
-  ZvCubicDifferences(const Point* p, double factor) {
-    d0 = p[1] - p[0];
-    const Point d1 = p[2] - p[1];
-    const Point d2 = p[3] - p[2];
-    a1 = d1 - d0;
-    const Point a2 = d2 - d1;
-    a3 = a2 - a1;
-    const Point k = p[3] - p[0];
-    const double chord = zvGuardedLength(k);
-    double e;
-    if (std::fabs(chord) <= 1e-15) {
-      // Closed or nearly closed piece: the chord gives no direction, so the spread of the
-      // controls around P0 stands in for the deviation.
-      const double l1 = zvGuardedLength(d0);
-      const double l2 = zvGuardedLength(p[2] - p[0]);
-      e = l1 > l2 ? l1 : l2;
-    } else {
-      e = G::Deviation(a1, a2, k, chord);
-    }
-    levels = zvForwardDifferencingLevels(e, factor);
+  const Point d0 = p[1] - p[0], d1 = p[2] - p[1], d2 = p[3] - p[2];
+  const Point k = p[3] - p[0];
+  const double chord = zvGuardedLength(k);
+  double e;
+  if (std::fabs(chord) <= 1e-15) {
+    // Closed or nearly closed piece: the chord gives no direction, so the spread of the
+    // controls around P0 stands in for the deviation.
+    const double l1 = zvGuardedLength(d0);
+    const double l2 = zvGuardedLength(p[2] - p[0]);
+    e = l1 > l2 ? l1 : l2;
+  } else {
+    e = G::Deviation(d1 - d0, d2 - d1, k, chord);
   }
-};
+  return zvForwardDifferencingLevels(e, factor);
+}
 
-// Forward differences of a cubic sampled at 2^levels equal steps. Scaling by ldexp keeps every
-// difference exact, so the walk only accumulates the rounding of its additions.
+inline ZvPoint2<double> zvLdexp(const ZvPoint2<double>& v, int e) {
+  return {std::ldexp(v.x, e), std::ldexp(v.y, e)};
+}
+inline ZvPoint3<double> zvLdexp(const ZvPoint3<double>& v, int e) {
+  return {std::ldexp(v.x, e), std::ldexp(v.y, e), std::ldexp(v.z, e)};
+}
+
+// v * 2^e, rounded exactly as ldexp rounds it: while 2^e is a normal double the product is the
+// same correctly rounded value, and it costs a multiplication instead of a library call.
+template <class P>
+inline P zvScaleByPowerOfTwo(const P& v, int e) {
+  if (e < -1022 || e > 1023) return zvLdexp(v, e);
+  const std::uint64_t bits = static_cast<std::uint64_t>(e + 1023) << 52;
+  double scale;
+  std::memcpy(&scale, &bits, sizeof scale);
+  return v * scale;
+}
+
+// Forward differences of a cubic sampled at 2^levels equal steps. Scaling by powers of two
+// keeps every difference exact, so the walk only accumulates the rounding of its additions.
 template <class G>
 struct ZvForwardStepper {
   using Point = typename G::Point;
@@ -155,17 +157,19 @@ struct ZvForwardStepper {
   Point t;  // second difference
   Point b;  // third difference (constant)
 
-  ZvForwardStepper(const Point& p0, const ZvCubicDifferences<G>& diff, unsigned int levels) {
+  ZvForwardStepper(const Point* p, unsigned int levels) {
+    const Point d0 = p[1] - p[0], d1 = p[2] - p[1], d2 = p[3] - p[2];
+    const Point a1 = d1 - d0, a2 = d2 - d1;
     const int l = static_cast<int>(levels);
-    const Point a = G::Ldexp(diff.a1 * 3.0, -2 * l);
-    b = G::Ldexp(diff.a3 * 6.0, -3 * l);
-    const Point f = G::Ldexp(diff.d0 * 3.0, -l);
+    const Point a = zvScaleByPowerOfTwo(a1 * 3.0, -2 * l);
+    b = zvScaleByPowerOfTwo((a2 - a1) * 6.0, -3 * l);
+    const Point f = zvScaleByPowerOfTwo(d0 * 3.0, -l);
     s = b * 0.16666666666666666 + f + a;
     t = a * 2.0;
-    q = p0;
+    q = p[0];
   }
 
-  const Point& Step() {
+  Point Step() {
     q += s;
     t += b;
     s += t;
@@ -173,25 +177,27 @@ struct ZvForwardStepper {
   }
 };
 
-// De Casteljau at t = 1/2 with factors of 0.5; the halves share left[3] == right[0].
+// De Casteljau at t = 1/2 with factors of 0.5; the halves share left[3] == right[0]. Everything
+// is read before anything is written, so left may be p itself.
 template <class P>
 inline void zvSplitCubicAtHalf(const P* p, P* left, P* right) {
   using T = decltype(p->x + p->x);
   const T h = static_cast<T>(0.5);
-  const P p01 = (p[0] + p[1]) * h;
+  const P p0 = p[0], p3 = p[3];
+  const P p01 = (p0 + p[1]) * h;
   const P p12 = (p[1] + p[2]) * h;
-  const P p23 = (p[2] + p[3]) * h;
+  const P p23 = (p[2] + p3) * h;
   const P p012 = (p01 + p12) * h;
   const P p123 = (p12 + p23) * h;
   const P m = (p012 + p123) * h;
-  left[0] = p[0];
+  left[0] = p0;
   left[1] = p01;
   left[2] = p012;
   left[3] = m;
   right[0] = m;
   right[1] = p123;
   right[2] = p23;
-  right[3] = p[3];
+  right[3] = p3;
 }
 
 // Depth of the up-front midpoint subdivision, from the whole curve. Returns the depth and

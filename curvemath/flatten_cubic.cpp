@@ -1,5 +1,6 @@
 // Flattening of one cubic into a polyline: the 2d, 2f and 3d forms share one algorithm and
-// differ only in the policies below.
+// differ only in the policies below: the point type they compute in, the array they fill, and
+// the cap on forward-differencing levels.
 #include <zv/bezier_tool.h>
 
 #include "curvemath/cubic_steps.h"
@@ -14,7 +15,7 @@ struct Flat2d {
   using Array = ZvPoint2dArray;
   static constexpr unsigned int kMaxLevels = 10;
   static ZvPoint2<double> Widen(const Source& s) { return s; }
-  static void Emit(Array& out, const ZvPoint2<double>& q) { out.Add(q); }
+  static void Emit(Array& out, const ZvPoint2<double>& q) { out.Add(q.x, q.y); }
 };
 
 // Plane curves stored in float: computed in double, each point rounded as it is added.
@@ -33,38 +34,66 @@ struct Flat3d {
   using Array = ZvPoint3dArray;
   static constexpr unsigned int kMaxLevels = ~0u;
   static ZvPoint3<double> Widen(const Source& s) { return s; }
-  static void Emit(Array& out, const ZvPoint3<double>& q) { out.Add(q); }
+  static void Emit(Array& out, const ZvPoint3<double>& q) { out.Add(q.x, q.y, q.z); }
 };
 
-// Emits the interior points of one piece in 2^levels equal parameter steps.
+// Emits the interior points of one piece in 2^levels equal parameter steps; levels comes
+// uncapped from zvCubicLevels.
 template <class F>
-void CubicForwardDifferencing(const typename F::Geom::Point* p, double factor,
-                              typename F::Array& out) {
-  const ZvCubicDifferences<typename F::Geom> diff(p, factor);
-  const unsigned int levels = diff.levels < F::kMaxLevels ? diff.levels : F::kMaxLevels;
+void WalkPiece(const typename F::Geom::Point* p, unsigned int levels, typename F::Array& out) {
+  if (levels > F::kMaxLevels) levels = F::kMaxLevels;
   // A 32-bit shift: huge level counts wrap, as the step count is a 32-bit quantity.
   const unsigned int n = 1u << (levels & 31u);
   if (n <= 1) return;
-  ZvForwardStepper<typename F::Geom> walk(p[0], diff, levels);
+  ZvForwardStepper<typename F::Geom> walk(p, levels);
   for (unsigned int i = 1; i < n; ++i)
     F::Emit(out, walk.Step());
 }
 
-// Halves the piece depth times without any flatness test (the depth was fixed from the whole
-// curve), emitting the shared midpoints between the walks of the two halves, in increasing t.
+template <class F>
+void CubicForwardDifferencing(const typename F::Geom::Point* p, double factor,
+                              typename F::Array& out) {
+  WalkPiece<F>(p, zvCubicLevels<typename F::Geom>(p, factor), out);
+}
+
+// Up to this depth the pieces are cut all at once into a stack buffer (2 KB for plane curves).
+constexpr unsigned int kBatchDepth = 5;
+
+// Halves the curve depth times without any flatness test (the depth was fixed from the whole
+// curve) and walks every piece, emitting the shared midpoints between the walks, in increasing
+// t. The last kBatchDepth halvings are done breadth first into a buffer, so that the step
+// counts of all pieces are computed in one pass without branches to mispredict, which keeps
+// the square roots and divisions of consecutive pieces overlapping. The values are exactly
+// those of halving each piece recursively.
 template <class F>
 void CubicMidpointSubdivision(const typename F::Geom::Point* p, unsigned int depth, double factor,
                               typename F::Array& out) {
-  typename F::Geom::Point left[4], right[4];
-  zvSplitCubicAtHalf(p, left, right);
-  if (depth != 1) {
+  using Point = typename F::Geom::Point;
+  if (depth > kBatchDepth) {
+    Point left[4], right[4];
+    zvSplitCubicAtHalf(p, left, right);
     CubicMidpointSubdivision<F>(left, depth - 1, factor, out);
     F::Emit(out, left[3]);
     CubicMidpointSubdivision<F>(right, depth - 1, factor, out);
-  } else {
-    CubicForwardDifferencing<F>(left, factor, out);
-    F::Emit(out, left[3]);
-    CubicForwardDifferencing<F>(right, factor, out);
+    return;
+  }
+  Point pieces[4 << kBatchDepth];
+  for (int i = 0; i < 4; ++i)
+    pieces[i] = p[i];
+  // Piece i splits into 2i and 2i + 1; going downwards never overwrites a piece not yet split.
+  for (unsigned int count = 1; count < (1u << depth); count <<= 1) {
+    for (unsigned int i = count; i-- > 0;) {
+      zvSplitCubicAtHalf(pieces + 4 * i, pieces + 8 * i, pieces + 8 * i + 4);
+    }
+  }
+  const unsigned int count = 1u << depth;
+  unsigned int levels[1u << kBatchDepth];
+  for (unsigned int i = 0; i < count; ++i) {
+    levels[i] = zvCubicLevels<typename F::Geom>(pieces + 4 * i, factor);
+  }
+  for (unsigned int i = 0; i < count; ++i) {
+    if (i > 0) F::Emit(out, pieces[4 * i]);
+    WalkPiece<F>(pieces + 4 * i, levels[i], out);
   }
 }
 

@@ -13,13 +13,13 @@ template <class G>
 bool CubicForwardDifferencingForPointLocation(const typename G::Point* p, double factor,
                                               const typename G::Point& point, double limit,
                                               double& best, double& bestT, double t0, double t1) {
-  const ZvCubicDifferences<G> diff(p, factor);
-  const unsigned int n = 1u << (diff.levels & 31u);
-  ZvForwardStepper<G> walk(p[0], diff, diff.levels);
+  const unsigned int levels = zvCubicLevels<G>(p, factor);
+  const unsigned int n = 1u << (levels & 31u);
+  ZvForwardStepper<G> walk(p, levels);
   bool improved = false;
   for (unsigned int i = 0; i < n; ++i) {
     const typename G::Point start = walk.q;
-    const typename G::Point& end = walk.Step();
+    const typename G::Point end = walk.Step();
     double d2, s;
     if (G::FindClosestPointOnLineSegment(point, start, end, limit, d2, s) && d2 < best) {
       best = d2;

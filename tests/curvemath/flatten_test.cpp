@@ -65,7 +65,8 @@ TEST(FlattenCubic2d, DepthIsBase8DigitsOfThirdDifference) {
   struct Case {
     double d;
     unsigned int pieces;
-  } cases[] = {{7.0, 1}, {7.5, 2}, {63.4, 2}, {64.0, 4}, {511.4, 4}, {512.0, 8}};
+  } cases[] = {{7.0, 1},   {7.5, 2},   {63.4, 2},      {64.0, 4},
+               {511.4, 4}, {512.0, 8}, {262144.0, 64}, {2097152.0, 128}};
   for (const Case& c : cases) {
     // D = P3 - 3 P2 + 3 P1 - P0 = (c.d, 0).
     const P2 p[4] = {{0, 0}, {0, 0}, {0, 0}, {c.d, 0}};
