@@ -33,8 +33,8 @@ bool BitEqual(const P2& a, const P2& b) {
 // Largest distance from densely sampled points of the curve to the polyline.
 double MaxDeviation(const P2* p, const ZvPoint2dArray& line) {
   double worst = 0;
-  for (int i = 0; i <= 4000; ++i) {
-    const P2 c = EvalCubic(p, i / 4000.0);
+  for (int i = 0; i <= 1000; ++i) {
+    const P2 c = EvalCubic(p, i / 1000.0);
     double best = 1e300;
     for (unsigned int j = 1; j < line.size; ++j) {
       double d2, t;
@@ -92,6 +92,23 @@ TEST(FlattenCubic2d, LevelsAreBase4DigitsOfScaledDeviation) {
     SCOPED_TRACE(c.h);
     EXPECT_EQ(Flatten(p, 3.0, out), c.steps + 1);
     ExpectUniformSamples(out, p, c.steps, 100);
+  }
+}
+
+// Deep subdivision of a curved cubic: every point must be the curve at a parameter on the
+// grid of 2^-(depth + levels), in increasing order. Depth 6 here, so the pieces come from
+// several rounds of halving before each is walked at its own level.
+TEST(FlattenCubic2d, DeepSubdivisionLandsOnTheCurveInOrder) {
+  const P2 p[4] = {{0, 0}, {0, 30000}, {30000, 30000}, {30000, 0}};  // |D| = 60000
+  ZvPoint2dArray out(1);
+  const unsigned int n = Flatten(p, 0.1, out);  // n = 600000: depth 6
+  ASSERT_GT(n, 64u);
+  const unsigned int grid = 1u << 16;  // depth 6 plus at most 10 levels
+  unsigned int j = 0;
+  for (unsigned int i = 0; i < out.size; ++i) {
+    while (j <= grid && Dist(EvalCubic(p, static_cast<double>(j) / grid), out[i]) > 1e-6)
+      ++j;
+    ASSERT_LE(j, grid) << "point " << i << " is not on the curve after the previous one";
   }
 }
 
