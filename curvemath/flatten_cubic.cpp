@@ -1,6 +1,6 @@
 // Flattening of one cubic into a polyline: the 2d, 2f and 3d forms share one algorithm and
-// differ only in the policies below: the point type they compute in, the array they fill, and
-// the cap on forward-differencing levels.
+// differ only in the policies below: the point type they compute in, the array they fill and
+// how a point is stored in it, and the cap on forward-differencing levels.
 #include <zv/bezier_tool.h>
 
 #include "curvemath/cubic_steps.h"
@@ -16,6 +16,7 @@ struct Flat2d {
   static constexpr unsigned int kMaxLevels = 10;
   static ZvPoint2<double> Widen(const Source& s) { return s; }
   static void Emit(Array& out, const ZvPoint2<double>& q) { out.Add(q.x, q.y); }
+  static void Put(ZvPoint2<double>& d, const ZvPoint2<double>& q) { d.x = q.x, d.y = q.y; }
 };
 
 // Plane curves stored in float: computed in double, each point rounded as it is added.
@@ -26,6 +27,9 @@ struct Flat2f {
   static constexpr unsigned int kMaxLevels = ~0u;
   static ZvPoint2<double> Widen(const Source& s) { return {s.x, s.y}; }
   static void Emit(Array& out, const ZvPoint2<double>& q) { out.Add(q.x, q.y); }
+  static void Put(ZvPoint2<float>& d, const ZvPoint2<double>& q) {
+    d.x = static_cast<float>(q.x), d.y = static_cast<float>(q.y);
+  }
 };
 
 struct Flat3d {
@@ -35,6 +39,9 @@ struct Flat3d {
   static constexpr unsigned int kMaxLevels = ~0u;
   static ZvPoint3<double> Widen(const Source& s) { return s; }
   static void Emit(Array& out, const ZvPoint3<double>& q) { out.Add(q.x, q.y, q.z); }
+  static void Put(ZvPoint3<double>& d, const ZvPoint3<double>& q) {
+    d.x = q.x, d.y = q.y, d.z = q.z;
+  }
 };
 
 // Emits the interior points of one piece in 2^levels equal parameter steps; levels comes
@@ -42,6 +49,18 @@ struct Flat3d {
 template <class F>
 void WalkPiece(const typename F::Geom::Point* p, unsigned int levels, typename F::Array& out) {
   if (levels > F::kMaxLevels) levels = F::kMaxLevels;
+  // Nearly every piece takes one or three steps. Three are written unconditionally into the
+  // array's spare room (slots past size are free storage) and only the real ones are counted:
+  // that spares a loop exit the branch predictor cannot guess, and as no Add runs, the
+  // capacity is what one Add per point would have left.
+  if (levels <= 2 && out.capacity - out.size >= 3) {
+    ZvForwardStepper<typename F::Geom> walk(p, levels);
+    auto* dst = out.data + out.size;
+    for (int i = 0; i < 3; ++i)
+      F::Put(dst[i], walk.Step());
+    out.size += (1u << levels) - 1;
+    return;
+  }
   // A 32-bit shift: huge level counts wrap, as the step count is a 32-bit quantity.
   const unsigned int n = 1u << (levels & 31u);
   if (n <= 1) return;

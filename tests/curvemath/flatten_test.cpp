@@ -210,6 +210,29 @@ TEST(FlattenCubic2d, ControlPointsMayLiveInTheOutputArray) {
     EXPECT_TRUE(BitEqual(out[4 + i], expected[i])) << i;
 }
 
+// The array must end up exactly as if every point had been appended by its own Add.
+TEST(FlattenCubic2d, ArrayGrowsAsByOneAddPerPoint) {
+  const P2 p[4] = {{0, 0}, {100, 300}, {300, -100}, {400, 200}};
+  ZvPoint2dArray points(1);
+  Flatten(p, 0.5, points);
+  for (unsigned int capacity = 1; capacity <= 9; ++capacity) {
+    for (unsigned int filled = 0; filled <= capacity; ++filled) {
+      ZvPoint2dArray out(capacity), reference(capacity);
+      for (unsigned int i = 0; i < filled; ++i) {
+        out.Add(P2{-1, -1});
+        reference.Add(P2{-1, -1});
+      }
+      Flatten(p, 0.5, out);
+      for (unsigned int i = 0; i < points.size; ++i)
+        reference.Add(points[i]);
+      ASSERT_EQ(out.size, reference.size);
+      EXPECT_EQ(out.capacity, reference.capacity) << capacity << " " << filled;
+      for (unsigned int i = 0; i < out.size; ++i)
+        EXPECT_TRUE(BitEqual(out[i], reference[i]));
+    }
+  }
+}
+
 // Gamma pieces: P0 = (0, 1) and P3 = (1, 0) make x = u and y = 1 - u^gamma.
 struct GammaCase {
   double gamma, u1, u2;
