@@ -14,6 +14,14 @@
 
 #include "core/vec.h"
 
+// Is q outside the range of four control coordinates grown by grow on both sides?
+inline bool zvIsOutsideGrownRange(double c0, double c1, double c2, double c3, double q,
+                                  double grow) {
+  const double lo = std::fmin(std::fmin(c0, c1), std::fmin(c2, c3));
+  const double hi = std::fmax(std::fmax(c0, c1), std::fmax(c2, c3));
+  return q < lo - grow || q > hi + grow;
+}
+
 // What differs between plane and space curves: how the third difference is measured, how far
 // the second differences stray from the chord, and the search primitives of point location.
 struct ZvCubicGeom2 {
@@ -30,19 +38,13 @@ struct ZvCubicGeom2 {
   }
 
   static bool IsOutsideGrownControlBox(const Point* p, const Point& q, double grow) {
-    return IsOutside(p[0].x, p[1].x, p[2].x, p[3].x, q.x, grow) ||
-           IsOutside(p[0].y, p[1].y, p[2].y, p[3].y, q.y, grow);
+    return zvIsOutsideGrownRange(p[0].x, p[1].x, p[2].x, p[3].x, q.x, grow) ||
+           zvIsOutsideGrownRange(p[0].y, p[1].y, p[2].y, p[3].y, q.y, grow);
   }
 
   static int FindClosestPointOnLineSegment(const Point& q, const Point& a, const Point& b,
                                            double maxDistance2, double& d2, double& t) {
     return ZvPoint2_FindClosestPointOnLineSegment<double>(q, a, b, maxDistance2, d2, t);
-  }
-
-  static bool IsOutside(double c0, double c1, double c2, double c3, double q, double grow) {
-    const double lo = std::fmin(std::fmin(c0, c1), std::fmin(c2, c3));
-    const double hi = std::fmax(std::fmax(c0, c1), std::fmax(c2, c3));
-    return q < lo - grow || q > hi + grow;
   }
 };
 
@@ -62,9 +64,9 @@ struct ZvCubicGeom3 {
   }
 
   static bool IsOutsideGrownControlBox(const Point* p, const Point& q, double grow) {
-    return ZvCubicGeom2::IsOutside(p[0].x, p[1].x, p[2].x, p[3].x, q.x, grow) ||
-           ZvCubicGeom2::IsOutside(p[0].y, p[1].y, p[2].y, p[3].y, q.y, grow) ||
-           ZvCubicGeom2::IsOutside(p[0].z, p[1].z, p[2].z, p[3].z, q.z, grow);
+    return zvIsOutsideGrownRange(p[0].x, p[1].x, p[2].x, p[3].x, q.x, grow) ||
+           zvIsOutsideGrownRange(p[0].y, p[1].y, p[2].y, p[3].y, q.y, grow) ||
+           zvIsOutsideGrownRange(p[0].z, p[1].z, p[2].z, p[3].z, q.z, grow);
   }
 
   static int FindClosestPointOnLineSegment(const Point& q, const Point& a, const Point& b,
