@@ -98,11 +98,12 @@ inline unsigned int zvSubdivisionDepth(unsigned int n) {
 inline unsigned int zvForwardDifferencingLevels(double e, double factor) {
   if (!(e > 0.0)) return 0;
   double v = e * factor;
-  unsigned int levels = 0;
   if (v < 2147483647.0) {
-    // Base-4 digits of m: half its bit length, rounded up.
-    levels = (zvBitLength(zvTruncateToCount(v + 0.5)) + 1) / 2;
-  } else if (!std::isinf(v)) {
+    // Base-4 digits of m = trunc(v + 0.5): half its bit length, rounded up; m is 0 below 0.5.
+    return v >= 0.5 ? (zvBitLength(static_cast<unsigned int>(v + 0.5)) + 1) / 2 : 0;
+  }
+  unsigned int levels = 0;
+  if (!std::isinf(v)) {
     // An infinite v (zero tolerance) would never fall to 1; it gets no interior points.
     for (; v > 1.0; v *= 0.25)
       ++levels;

@@ -233,6 +233,19 @@ TEST(FlattenCubic2d, ArrayGrowsAsByOneAddPerPoint) {
   }
 }
 
+TEST(FlattenCubic, BadInputEndsWithABoundedPolylineOrNothing) {
+  const P2 p[4] = {{0, 0}, {100, 300}, {300, -100}, {400, 200}};
+  ZvPoint2dArray out(1);
+  // A zero tolerance saturates the subdivision (2^10 pieces) and adds no walk of its own.
+  EXPECT_EQ(Flatten(p, 0.0, out), 1025u);
+  EXPECT_EQ(Flatten(p, -1.0, out), 2u);
+  EXPECT_EQ(ZvBezierTool_FlattenCubic2d(nullptr, 1.0, &out, 0), 0u);
+  EXPECT_EQ(ZvBezierTool_FlattenCubic2d(p, 1.0, nullptr, 0), 0u);
+  // A corrupt gamma piece with an almost empty x range walks at most one unit of u.
+  const P2 g[4] = {{0, 1}, {1e-300, -0.5}, {1e-290, 0.5}, {1e-305, 0}};
+  EXPECT_LE(ZvBezierTool_FlattenGamma(g, 0.1, &out, 0), 154u);
+}
+
 // Gamma pieces: P0 = (0, 1) and P3 = (1, 0) make x = u and y = 1 - u^gamma.
 struct GammaCase {
   double gamma, u1, u2;
