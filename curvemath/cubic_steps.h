@@ -149,6 +149,21 @@ inline P zvScaleByPowerOfTwo(const P& v, int e) {
   return v * scale;
 }
 
+// 2^-k for the level counts that occur in practice (up to the plane cap of 10), so that the
+// common scalings are a table load rather than a constructed power.
+constexpr unsigned int kZvTabledLevels = 10;
+struct ZvNegativePowersOfTwo {
+  double v[3 * kZvTabledLevels + 1];
+  constexpr ZvNegativePowersOfTwo() : v() {
+    double p = 1.0;
+    for (double& x : v) {
+      x = p;
+      p *= 0.5;
+    }
+  }
+};
+inline constexpr ZvNegativePowersOfTwo kZvNegativePowersOfTwo{};
+
 // Forward differences of a cubic sampled at 2^levels equal steps. Scaling by powers of two
 // keeps every difference exact, so the walk only accumulates the rounding of its additions.
 template <class G>
@@ -164,9 +179,16 @@ struct ZvForwardStepper {
     const Point d0 = p[1] - p[0], d1 = p[2] - p[1], d2 = p[3] - p[2];
     const Point a1 = d1 - d0, a2 = d2 - d1;
     const int l = static_cast<int>(levels);
-    const Point a = zvScaleByPowerOfTwo(a1 * 3.0, -2 * l);
-    b = zvScaleByPowerOfTwo((a2 - a1) * 6.0, -3 * l);
-    const Point f = zvScaleByPowerOfTwo(d0 * 3.0, -l);
+    Point a, f;
+    if (levels <= kZvTabledLevels) {
+      a = a1 * 3.0 * kZvNegativePowersOfTwo.v[2 * l];
+      b = (a2 - a1) * 6.0 * kZvNegativePowersOfTwo.v[3 * l];
+      f = d0 * 3.0 * kZvNegativePowersOfTwo.v[l];
+    } else {
+      a = zvScaleByPowerOfTwo(a1 * 3.0, -2 * l);
+      b = zvScaleByPowerOfTwo((a2 - a1) * 6.0, -3 * l);
+      f = zvScaleByPowerOfTwo(d0 * 3.0, -l);
+    }
     s = b * 0.16666666666666666 + f + a;
     t = a * 2.0;
     q = p[0];
