@@ -26,8 +26,8 @@
 //
 // The 2d form never produces more than 1023 interior points per piece; the 2f and 3d forms have
 // no such cap. The 2f form computes in double and rounds each point to float as it is added.
-// The tolerance must be positive. A negative one yields P0 and P3 only; zero yields the deepest
-// subdivision (1023 midpoints) with no walk inside the pieces.
+// The tolerance must be positive. A negative one yields P0 and P3 only; zero yields at most the
+// deepest subdivision (1023 midpoints) with no walk inside the pieces.
 // ---------------------------------------------------------------------------------------------
 
 ZV_API unsigned int ZvBezierTool_FlattenCubic2d(const ZvPoint2<double>* p, double tolerance,
