@@ -5,7 +5,9 @@
 #include <zv/api.h>
 #include <zv/arrays.h>
 #include <zv/critical_section.h>
+#include <zv/matrix.h>
 #include <zv/point.h>
 #include <zv/trace.h>
+#include <zv/transfo4.h>
 
 #endif
