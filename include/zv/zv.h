@@ -7,6 +7,7 @@
 #include <zv/critical_section.h>
 #include <zv/matrix.h>
 #include <zv/point.h>
+#include <zv/raster.h>
 #include <zv/trace.h>
 #include <zv/transfo4.h>
 
