@@ -6,8 +6,10 @@
 #include <zv/arrays.h>
 #include <zv/critical_section.h>
 #include <zv/matrix.h>
+#include <zv/path2f.h>
 #include <zv/point.h>
 #include <zv/raster.h>
+#include <zv/shape.h>
 #include <zv/trace.h>
 #include <zv/transfo4.h>
 
