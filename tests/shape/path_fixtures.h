@@ -15,6 +15,7 @@ inline ZvPoint2<float> P(float x, float y) {
 struct PathArrays : ZvPath2f {
   static const ZvPoint2fArray& Points(const ZvPath2f& p) { return p.*(&PathArrays::points); }
   static const ZvUByteArray& RawCodes(const ZvPath2f& p) { return p.*(&PathArrays::codes); }
+  static unsigned int Open(const ZvPath2f& p) { return p.*(&PathArrays::currentSubpathOpen); }
 };
 
 // Segment codes of every point (bits 0..5), or the whole bytes with the lock bit.
