@@ -5,11 +5,14 @@
 #include <zv/api.h>
 #include <zv/arrays.h>
 #include <zv/critical_section.h>
+#include <zv/fcurve.h>
+#include <zv/fcurve_userdata.h>
 #include <zv/matrix.h>
 #include <zv/path2f.h>
 #include <zv/point.h>
 #include <zv/raster.h>
 #include <zv/shape.h>
+#include <zv/std_fcurve.h>
 #include <zv/trace.h>
 #include <zv/transfo4.h>
 

@@ -1,0 +1,252 @@
+// Point evaluation of the standard curve: segments, the linear extensions beyond the keys and
+// the four extrapolation methods. This is the hot path: it allocates nothing and finds its
+// segment through the store's hinted search.
+#include "fcurve/std_fcurve_impl.h"
+
+#include <cmath>
+
+double ZvStdFCurveImpl::EvalJustAfterIndex(double t, unsigned int i) const {
+  const CFCStdKey& k = keys[i];
+  switch (k.segmentKind) {
+    case ZvBaseFCurve::ConstantSegment:
+      return k.rightValue;
+    case ZvBaseFCurve::LinearSegment: {
+      const CFCStdKey& next = keys[i + 1];
+      return k.rightValue +
+             (next.leftValue - k.rightValue) * (t - k.parameter) / (next.parameter - k.parameter);
+    }
+    case ZvBaseFCurve::CubicSegment: {
+      ZvPoint2<double> p[4];
+      GetSegmentControls(i, p);
+      const double u = InvertParamCubic(t, p[0].x, p[1].x, p[2].x, p[3].x);
+      const double y0 = p[0].y, y1 = p[1].y, y2 = p[2].y, y3 = p[3].y;
+      return (((y3 - y0 - 3.0 * (y2 - y1)) * u + 3.0 * (y2 - y1) - 3.0 * (y1 - y0)) * u +
+              3.0 * (y1 - y0)) *
+                 u +
+             y0;
+    }
+    default:
+      return 0.0;  // unknown kind: a hole in the data, not an error
+  }
+}
+
+namespace {
+
+constexpr double kDegenerateHandle = 1e-7;  // squared length of a handle too short to steer
+constexpr double kHandleNudge = 1e-7;       // keeps a vertical handle's slope finite
+
+double Chord(const CFCStdKey& a, const CFCStdKey& b, double t) {
+  return a.rightValue +
+         (t - a.parameter) * (b.leftValue - a.rightValue) / (b.parameter - a.parameter);
+}
+
+}  // namespace
+
+// Beyond the last key the curve follows its last tangent: the right handle if it has a
+// length, else the left handle, else the chord from the previous key. The line is anchored at
+// the key's left value.
+double ZvStdFCurveImpl::GetValueAfterLastKeyWhenLinear(double t) const {
+  const unsigned int n = keys.size;
+  const CFCStdKey& last = keys[n - 1];
+  if (n == 1) return last.rightValue;
+  const CFCStdKey& prev = keys[n - 2];
+  switch (prev.segmentKind) {
+    case ZvBaseFCurve::ConstantSegment:
+      return last.rightValue;
+    case ZvBaseFCurve::LinearSegment:
+      return Chord(prev, last, t);
+    case ZvBaseFCurve::CubicSegment: {
+      if ((last.flags & CFCFlag_FlatTangent) ||
+          ((last.flags & CFCFlag_FlatAtExtremum) && IsKeyAnExtremum(n - 1))) {
+        return last.rightValue;
+      }
+      double dx = last.rightTangent.x - last.parameter;
+      const double dy = last.rightTangent.y - last.rightValue;
+      if (dx * dx + dy * dy >= kDegenerateHandle) {
+        if (std::fabs(dx) < kHandleNudge) dx += kHandleNudge;
+        return last.leftValue + (t - last.parameter) * (last.rightTangent.y - last.leftValue) / dx;
+      }
+      double lx = last.leftTangent.x;
+      const double ldx = lx - last.parameter, ldy = last.leftTangent.y - last.leftValue;
+      if (ldx * ldx + ldy * ldy < kDegenerateHandle) return Chord(prev, last, t);
+      if (last.parameter - lx < kHandleNudge) lx -= kHandleNudge;
+      return last.leftValue +
+             (t - last.parameter) * (last.leftValue - last.leftTangent.y) / (last.parameter - lx);
+    }
+    default:
+      return 0.0;
+  }
+}
+
+// The mirror on the first key, anchored at its right value; FlatAtExtremum counts without an
+// extremum test, an end key always being one.
+double ZvStdFCurveImpl::GetValueBeforeFirstKeyWhenLinear(double t) const {
+  const unsigned int n = keys.size;
+  const CFCStdKey& first = keys[0];
+  if (n == 1) return first.leftValue;
+  const CFCStdKey& second = keys[1];
+  switch (first.segmentKind) {
+    case ZvBaseFCurve::ConstantSegment:
+      return first.leftValue;
+    case ZvBaseFCurve::LinearSegment:
+      return Chord(first, second, t);
+    case ZvBaseFCurve::CubicSegment: {
+      if (first.flags & (CFCFlag_FlatTangent | CFCFlag_FlatAtExtremum)) return first.leftValue;
+      double lx = first.leftTangent.x;
+      const double ldx = lx - first.parameter, ldy = first.leftTangent.y - first.leftValue;
+      if (ldx * ldx + ldy * ldy >= kDegenerateHandle) {
+        if (first.parameter - lx < kHandleNudge) lx -= kHandleNudge;
+        return first.rightValue + (t - first.parameter) * (first.rightValue - first.leftTangent.y) /
+                                      (first.parameter - lx);
+      }
+      double rx = first.rightTangent.x;
+      const double rdx = rx - first.parameter, rdy = first.rightTangent.y - first.rightValue;
+      if (rdx * rdx + rdy * rdy < kDegenerateHandle) return Chord(first, second, t);
+      if (rx - first.parameter < kHandleNudge) rx += kHandleNudge;
+      return first.rightValue + (t - first.parameter) * (first.rightTangent.y - first.rightValue) /
+                                    (rx - first.parameter);
+    }
+    default:
+      return 0.0;
+  }
+}
+
+double ZvStdFCurveImpl::EvalRight(double t) const {
+  const unsigned int n = keys.size;
+  if (n == 0) return valueWhenNoKeys;
+  int found;
+  const unsigned int at = LocateParameter(t, found);
+  if (found) return keys[at - 1].rightValue;
+  if (at >= n) return keys[n - 1].rightValue;
+  if (at == 0) return keys[0].leftValue;
+  return EvalJustAfterIndex(t, at - 1);
+}
+
+double ZvStdFCurveImpl::EvalLeft(double t) const {
+  const unsigned int n = keys.size;
+  if (n == 0) return valueWhenNoKeys;
+  int found;
+  const unsigned int at = LocateParameter(t, found);
+  if (found) return EffectiveLeftValue(at - 1);
+  if (at >= n) return keys[n - 1].rightValue;
+  if (at == 0) return keys[0].leftValue;
+  return EvalJustAfterIndex(t, at - 1);
+}
+
+// Brings t into the keyed range for the cycle with offset and counts the periods. The right
+// version sends a whole number of periods to the last key, the left version to the first.
+double ZvStdFCurveImpl::CycleOffsetFold(double t, int& cycles, bool left) const {
+  const unsigned int n = keys.size;
+  const double first = keys[0].parameter, last = keys[n - 1].parameter;
+  const double period = last - first;
+  const double r = (t - first) / period;
+  double folded;
+  if (left) {
+    cycles = static_cast<int>(std::floor(r));
+    if (first - t <= 1e-9) {
+      const double w = period * (r - std::floor(r));
+      folded = std::fabs(w) <= 1e-9 ? first : first + w;
+    } else {
+      const double w = period * (std::ceil(r) - r);
+      folded = std::fabs(w) <= 1e-9 ? first : last - w;
+    }
+  } else {
+    cycles = static_cast<int>(std::ceil(r) - 1.0);
+    if (t > first) {
+      const double w = period * (r - std::floor(r));
+      folded = std::fabs(w) <= 1e-9 ? last : first + w;
+    } else {
+      const double w = period * (std::ceil(r) - r);
+      folded = std::fabs(w) <= 1e-9 ? last : last - w;
+    }
+  }
+  if (folded < first) folded = first;
+  if (folded > last) folded = last;
+  return folded;
+}
+
+double ZvStdFCurveImpl::EvalRightUsingExtrapolationMethod(double t) const {
+  const unsigned int n = keys.size;
+  if (n == 0) return valueWhenNoKeys;
+  int found;
+  switch (extrapolation) {
+    case ZvBaseFCurve::LinearExtrapolation: {
+      const unsigned int at = LocateParameter(t, found);
+      if (found) return keys[at - 1].rightValue;
+      if (at >= n) return GetValueAfterLastKeyWhenLinear(t);
+      if (at == 0) return GetValueBeforeFirstKeyWhenLinear(t);
+      return EvalJustAfterIndex(t, at - 1);
+    }
+    case ZvBaseFCurve::CycleExtrapolation: {
+      FoldParameter(t);
+      const unsigned int at = LocateParameter(t, found);
+      if (found) {
+        // The right limit at the end of a period is the start of the next one.
+        if (n >= 2 && at == n) return keys[0].rightValue;
+        return keys[at - 1].rightValue;
+      }
+      if (at >= n) return keys[n - 1].rightValue;
+      if (at == 0) return keys[0].leftValue;
+      return EvalJustAfterIndex(t, at - 1);
+    }
+    case ZvBaseFCurve::CycleWithOffsetExtrapolation: {
+      const double delta = keys[n - 1].rightValue - keys[0].rightValue;
+      int cycles = 0;
+      if (n >= 2) t = CycleOffsetFold(t, cycles, false);
+      const unsigned int at = LocateParameter(t, found);
+      if (found) {
+        if (n >= 2 && at == n) return cycles * delta + (keys[0].rightValue + delta);
+        return delta * cycles + keys[at - 1].rightValue;
+      }
+      if (at >= n) return keys[n - 1].rightValue;
+      if (at == 0) return keys[0].leftValue;
+      return delta * cycles + EvalJustAfterIndex(t, at - 1);
+    }
+    default:
+      return EvalRight(t);
+  }
+}
+
+double ZvStdFCurveImpl::EvalLeftUsingExtrapolationMethod(double t) const {
+  const unsigned int n = keys.size;
+  if (n == 0) return valueWhenNoKeys;
+  int found;
+  switch (extrapolation) {
+    case ZvBaseFCurve::LinearExtrapolation: {
+      const unsigned int at = LocateParameter(t, found);
+      if (found) return EffectiveLeftValue(at - 1);
+      if (at >= n) return GetValueAfterLastKeyWhenLinear(t);
+      if (at == 0) return GetValueBeforeFirstKeyWhenLinear(t);
+      return EvalJustAfterIndex(t, at - 1);
+    }
+    case ZvBaseFCurve::CycleExtrapolation: {
+      FoldParameter(t);
+      const unsigned int at = LocateParameter(t, found);
+      if (found) {
+        // The left limit at the start of a period is the end of the previous one.
+        if (n >= 2 && at == 1) return EffectiveLeftValue(n - 1);
+        return EffectiveLeftValue(at - 1);
+      }
+      if (at >= n) return keys[n - 1].rightValue;
+      if (at == 0) return keys[0].leftValue;
+      return EvalJustAfterIndex(t, at - 1);
+    }
+    case ZvBaseFCurve::CycleWithOffsetExtrapolation: {
+      // The offset runs from the first left value here, not from the first right value.
+      const double delta = keys[n - 1].rightValue - keys[0].leftValue;
+      int cycles = 0;
+      if (n >= 2) t = CycleOffsetFold(t, cycles, true);
+      const unsigned int at = LocateParameter(t, found);
+      if (found) {
+        if (n >= 2 && at == 1) return cycles * delta + keys[n - 1].rightValue - delta;
+        if (n == 1) return cycles * delta + keys[0].leftValue;
+        return delta * cycles + EffectiveLeftValue(at - 1);
+      }
+      if (at >= n) return keys[n - 1].rightValue;
+      if (at == 0) return keys[0].leftValue;
+      return delta * cycles + EvalJustAfterIndex(t, at - 1);
+    }
+    default:
+      return EvalLeft(t);
+  }
+}

@@ -1,0 +1,114 @@
+// ZvStdFCurve: evaluation and the questions answered from evaluated values.
+#include <zv/std_fcurve.h>
+
+#include "fcurve/fcurve_lock.h"
+#include "fcurve/std_fcurve_impl.h"
+
+namespace {
+
+// A parameter within the snap tolerance of a key evaluates as on the key. Most parameters lie
+// well away from every key: one hinted search tells, and the exact nearest-key search runs
+// only near a key. The search also leaves the hint where the evaluation will look.
+void SnapToKey(const ZvStdFCurveImpl& s, double& t) {
+  const unsigned int n = s.keys.size;
+  if (n == 0) return;
+  int found;
+  const unsigned int at = s.LocateParameter(t, found);
+  const bool nearBelow = at > 0 && !(t - s.keys[at - 1].parameter > 2.0 * kCFCSnapTolerance);
+  const bool nearAbove = at < n && !(s.keys[at].parameter - t > 2.0 * kCFCSnapTolerance);
+  if (!nearBelow && !nearAbove) return;
+  unsigned int i;
+  if (s.GetClosestKeyIndexInCenteredInterval(t, kCFCSnapTolerance, i)) t = s.keys[i].parameter;
+}
+
+}  // namespace
+
+double ZvStdFCurve::Eval(double parameter, int clamped) const {
+  ZvFCurveLockGuard guard(*this);
+  SnapToKey(*m_impl, parameter);
+  const double v = m_impl->EvalRightUsingExtrapolationMethod(parameter);
+  return clamped ? m_impl->Clamp(v) : v;
+}
+
+double ZvStdFCurve::EvalLeft(double parameter, int clamped) const {
+  ZvFCurveLockGuard guard(*this);
+  SnapToKey(*m_impl, parameter);
+  const double v = m_impl->EvalLeftUsingExtrapolationMethod(parameter);
+  return clamped ? m_impl->Clamp(v) : v;
+}
+
+unsigned int ZvStdFCurve::GetKeys(ZvDoubleArray& parameters, ZvDoubleArray& leftValues,
+                                  ZvDoubleArray& rightValues, int clamped) const {
+  ZvFCurveLockGuard guard(*this);
+  const ZvStdFCurveImpl& s = *m_impl;
+  for (unsigned int i = 0; i < s.keys.size; ++i) {
+    const double l = s.EffectiveLeftValue(i), r = s.keys[i].rightValue;
+    parameters.Add(s.keys[i].parameter);
+    leftValues.Add(clamped ? s.Clamp(l) : l);
+    rightValues.Add(clamped ? s.Clamp(r) : r);
+  }
+  return s.keys.size;
+}
+
+double ZvStdFCurve::GetValueUpperBound(int clamped) const {
+  ZvFCurveLockGuard guard(*this);
+  const double v = m_impl->GetValueUpperBound();
+  return clamped ? m_impl->Clamp(v) : v;
+}
+
+double ZvStdFCurve::GetValueLowerBound(int clamped) const {
+  ZvFCurveLockGuard guard(*this);
+  const double v = m_impl->GetValueLowerBound();
+  return clamped ? m_impl->Clamp(v) : v;
+}
+
+unsigned int ZvStdFCurve::EvalInverse(double value, double& parameter, int clamped) const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->EvalInverse(value, parameter, clamped);
+}
+
+unsigned int ZvStdFCurve::IsBijective() const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->IsBijective();
+}
+
+double ZvStdFCurve::EvalIntegral(double a, double b) const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->EvalIntegral(a, b);
+}
+
+unsigned int ZvStdFCurve::GetValueRange(double parameter, KeySide side, double& low, double& high,
+                                        double tolerance, int clamped) const {
+  if (side != LeftSide && side != RightSide) return 0;
+  ZvFCurveLockGuard guard(*this);
+  const ZvStdFCurveImpl& s = *m_impl;
+  unsigned int i;
+  if (!s.GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
+  const unsigned int n = s.keys.size;
+  if (side == LeftSide) {
+    if (i == 0) {
+      low = high = s.keys[0].leftValue;
+    } else {
+      s.ComputeEvaluatedValueRange(i - 1, low, high);
+    }
+  } else if (i + 1 == n) {
+    low = high = s.keys[i].rightValue;
+  } else {
+    s.ComputeEvaluatedValueRange(i, low, high);
+  }
+  if (clamped) {
+    low = s.Clamp(low);
+    high = s.Clamp(high);
+  }
+  return 1;
+}
+
+unsigned int ZvStdFCurve::HasConstantValue() const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->HasConstantValue();
+}
+
+unsigned int ZvStdFCurve::IsValid() const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->IsValid();
+}

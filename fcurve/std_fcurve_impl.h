@@ -1,0 +1,119 @@
+// The implementation object of ZvStdFCurve: the key engine on store C, plus everything that
+// needs tangents - evaluated handles, segment evaluation, extrapolation, inversion, integrals,
+// bounds, validity - and the key creation that keeps the shape of Bezier segments.
+//
+// Like the engine it takes no lock; the curve calls it under its own.
+#ifndef ZV_FCURVE_STD_FCURVE_IMPL_H
+#define ZV_FCURVE_STD_FCURVE_IMPL_H
+
+#include <zv/std_fcurve.h>
+
+#include "fcurve/cfc_base_impl.h"
+
+class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<double, CFCStdKey>> {
+ public:
+  using Engine = CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<double, CFCStdKey>>;
+
+  ZvStdFCurveImpl(double valueWhenNoKeys, unsigned int firstSegmentKind);
+
+  // ---- Evaluated handles (std_fcurve_tangents.cpp) ----
+
+  ZvPoint2<double> GetEvaluatedLeftTgt(unsigned int i) const;
+  ZvPoint2<double> GetEvaluatedRightTgt(unsigned int i) const;
+  double GetEvaluatedLeftTgtY(unsigned int i) const;
+  double GetEvaluatedRightTgtY(unsigned int i) const;
+  int IsKeyAnExtremum(unsigned int i) const;
+  // The value arriving at key i from the left: the previous right value across a constant
+  // segment, else the key's left value.
+  double EffectiveLeftValue(unsigned int i) const;
+  // The four control points with which a cubic segment from key i is evaluated.
+  void GetSegmentControls(unsigned int i, ZvPoint2<double>* p) const;
+
+  // ---- Point evaluation (std_fcurve_eval.cpp) ----
+
+  // The segment that starts at key i, for t strictly inside it.
+  double EvalJustAfterIndex(double t, unsigned int i) const;
+  double GetValueBeforeFirstKeyWhenLinear(double t) const;
+  double GetValueAfterLastKeyWhenLinear(double t) const;
+  // Plain evaluation, constant beyond the keys: right-continuous and left limit.
+  double EvalRight(double t) const;
+  double EvalLeft(double t) const;
+  double EvalRightUsingExtrapolationMethod(double t) const;
+  double EvalLeftUsingExtrapolationMethod(double t) const;
+  double Clamp(double v) const {
+    if (v <= minClamp) return minClamp;
+    if (v >= maxClamp) return maxClamp;
+    return v;
+  }
+
+  // ---- Inversion, integrals, bounds, validity (std_fcurve_analysis.cpp) ----
+
+  int IsBijective() const;
+  int EvalInverse(double value, double& parameter, int clamped) const;
+  double EvalIntegral(double a, double b) const;
+  double PartialSegmentIntegral(unsigned int i, double a, double b) const;
+  double LeftPieceIntegral(unsigned int i, double b) const;
+  double RightPieceIntegral(unsigned int i, double a) const;
+  double WholeSegmentsIntegral(unsigned int first, unsigned int last) const;
+  double GetValueUpperBound() const;
+  double GetValueLowerBound() const;
+  int ComputeEvaluatedValueRange(unsigned int i, double& low, double& high) const;
+  int ComputeBestMatchTangents(unsigned int i, ZvPoint2<double>& right, ZvPoint2<double>& left,
+                               unsigned int mode) const;
+  int IsValid() const;
+  int HasConstantValue() const;
+  int ComputeKeyExtent(unsigned int i, ZvExtent2<double>& extent) const;
+  int ComputeNeighboringKeysExtent(double t, ZvExtent2<double>& extent) const;
+
+  // ---- Key creation (std_fcurve_keys.cpp) ----
+
+  int CreateKey(double parameter, double value, unsigned int left, unsigned int right,
+                ZvBaseFCurve& curve);
+  void SetValOnExistingKey(unsigned int i, double value);
+  int RemoveTailAndCreateKeyAfterExistingKey(double parameter, double value, unsigned int left,
+                                             unsigned int right, unsigned int k,
+                                             ZvBaseFCurve& curve);
+  int RemoveHeadAndCreateKeyBeforeExistingKey(double parameter, double value, unsigned int left,
+                                              unsigned int right, unsigned int k,
+                                              ZvBaseFCurve& curve);
+  int RemoveBodyAndCreateKeyBetweenExistingKeys(double parameter, double value, unsigned int left,
+                                                unsigned int right, unsigned int a, unsigned int b,
+                                                ZvBaseFCurve& curve);
+  int RemoveAllKeysAndCreateNewKey(double parameter, double value, unsigned int left,
+                                   unsigned int right, ZvBaseFCurve& curve);
+  int CreateNonModifyingKey(double parameter, unsigned int& index, ZvBaseFCurve& curve);
+  // The evaluated handles of key i become its actual ones, and AutoTangent goes.
+  void ResolveAutoTangent(unsigned int i);
+  void SetupBezierCubicWhenRemoving(unsigned int a, unsigned int b);
+  // Removes the closest key in the tolerance; the segment left in its place takes `kind`, or
+  // with 0 the kind of the segment before it.
+  int RemoveKey(double parameter, unsigned int kind, double tolerance, ZvBaseFCurve& curve);
+  int RemoveHeadBeforeExistingKey(unsigned int kind, unsigned int k, ZvBaseFCurve& curve);
+  int RemoveTailAfterExistingKey(unsigned int kind, unsigned int k, ZvBaseFCurve& curve);
+  // Joins keys a and b into one cubic of the same shape and removes the keys between.
+  int RemoveBodyBetweenExistingKeys(unsigned int kind, unsigned int a, unsigned int b,
+                                    ZvBaseFCurve& curve);
+  void RemoveKeysBetween(unsigned int a, unsigned int b, ZvBaseFCurve& curve) {
+    RemoveBodyBetweenExistingKeys(keys[a].segmentKind, a, b, curve);
+  }
+
+  // ---- Actual handles (std_fcurve_handles.cpp) ----
+
+  void SetActualLeftTgt(unsigned int i, const ZvPoint2<double>& handle);
+  void SetActualRightTgt(unsigned int i, const ZvPoint2<double>& handle);
+  void RegularizeLeftTgt(unsigned int i, const ZvPoint2<double>& from);
+  void RegularizeRightTgt(unsigned int i, const ZvPoint2<double>& to);
+  // side: ZvBaseFCurve::LeftSide or anything else for the right handle.
+  int SetActualKeyTgtHandle(unsigned int i, int side, const ZvPoint2<double>& relative);
+  int ActualTangentsAreUnified(unsigned int i) const;
+  int LockTangentContinuity(unsigned int i);
+  int UnifyActualRightTangentWithActualLeftTangent(unsigned int i);
+  int UnifyActualLeftTangentWithActualRightTangent(unsigned int i);
+  void ModifyFSK(unsigned int i, unsigned int kind);
+
+ private:
+  double EvaluatedRightX(unsigned int i) const;
+  double CycleOffsetFold(double t, int& cycles, bool left) const;
+};
+
+#endif

@@ -1,0 +1,447 @@
+// ZvStdFCurve: questions about keys, and the flags, clamps and methods of the curve.
+#include <zv/std_fcurve.h>
+
+#include "fcurve/fcurve_lock.h"
+#include "fcurve/std_fcurve_impl.h"
+
+#include <cmath>
+
+unsigned int ZvStdFCurve::GetFCurveInfo(FCurveInfo* info) const {
+  if (info == nullptr) return 0;
+  ZvFCurveLockGuard guard(*this);
+  const ZvStdFCurveImpl& s = *m_impl;
+  const unsigned int mask = info->mask;
+  if (mask & FCurveInfo::KindMask) info->kind = StdKind;
+  if (mask & FCurveInfo::NumKeysMask) info->numKeys = s.keys.size;
+  if (mask & FCurveInfo::ValueWhenNoKeysMask) info->valueWhenNoKeys = s.valueWhenNoKeys;
+  if (mask & FCurveInfo::FirstSegmentKindMask) info->firstSegmentKind = s.firstSegmentKind;
+  if (mask & FCurveInfo::MinClampMask) info->minClamp = s.minClamp;
+  if (mask & FCurveInfo::MaxClampMask) info->maxClamp = s.maxClamp;
+  if (mask & FCurveInfo::ExtrapolationMask) info->extrapolation = s.extrapolation;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::GetKeyInfoFromIndex(unsigned int index, KeyInfo* info) const {
+  if (info == nullptr) return 0;
+  ZvFCurveLockGuard guard(*this);
+  const ZvStdFCurveImpl& s = *m_impl;
+  if (index >= s.keys.size) {
+    info->mask = 0;
+    return 0;
+  }
+  const CFCStdKey& k = s.keys[index];
+  const unsigned int mask = info->mask;
+  if (mask & KeyInfo::IndexMask) info->index = index;
+  if (mask & KeyInfo::ParameterMask) info->parameter = k.parameter;
+  if (mask & KeyInfo::LeftValueMask) info->leftValue = s.EffectiveLeftValue(index);
+  if (mask & KeyInfo::RightValueMask) info->rightValue = k.rightValue;
+  if (mask & (KeyInfo::LeftTangentXMask | KeyInfo::LeftTangentYMask)) {
+    const ZvPoint2<double> h = s.GetEvaluatedLeftTgt(index);
+    if (mask & KeyInfo::LeftTangentXMask) info->leftTangentX = h.x - k.parameter;
+    if (mask & KeyInfo::LeftTangentYMask) info->leftTangentY = h.y - k.leftValue;
+  }
+  if (mask & (KeyInfo::RightTangentXMask | KeyInfo::RightTangentYMask)) {
+    const ZvPoint2<double> h = s.GetEvaluatedRightTgt(index);
+    if (mask & KeyInfo::RightTangentXMask) info->rightTangentX = h.x - k.parameter;
+    if (mask & KeyInfo::RightTangentYMask) info->rightTangentY = h.y - k.rightValue;
+  }
+  if (mask & KeyInfo::SegmentKindMask) info->segmentKind = k.segmentKind;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::GetKeyInfoFromParameter(double parameter, KeyInfo* info) const {
+  if (info == nullptr) return 0;
+  ZvFCurveLockGuard guard(*this);
+  unsigned int i;
+  if (!m_impl->GetClosestKeyIndexInCenteredInterval(parameter, 0.0, i)) {
+    info->mask = 0;
+    return 0;
+  }
+  return GetKeyInfoFromIndex(i, info);
+}
+
+unsigned int ZvStdFCurve::GetKeyParameter(unsigned int index, double& parameter) const {
+  ZvFCurveLockGuard guard(*this);
+  if (index >= m_impl->keys.size) return 0;
+  parameter = m_impl->keys[index].parameter;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::GetKeyIndex(double parameter, unsigned int& index) const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->GetClosestKeyIndexInCenteredInterval(parameter, 0.0, index);
+}
+
+unsigned int ZvStdFCurve::GetNumKeys() const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->keys.size;
+}
+
+unsigned int ZvStdFCurve::GetKeyParameters(double start, double end, ZvDoubleArray& parameters,
+                                           int excludeStart, int excludeEnd) const {
+  ZvFCurveLockGuard guard(*this);
+  if (zvIsSameParameter(start, end) && (excludeStart != 0) != (excludeEnd != 0)) {
+    excludeStart = excludeEnd = 0;
+  }
+  unsigned int first, last;
+  if (!m_impl->GetKeyIndicesInInterval(start, end, first, last, excludeStart, excludeEnd)) {
+    return 0;
+  }
+  for (unsigned int i = first; i <= last; ++i)
+    parameters.Add(m_impl->keys[i].parameter);
+  return last - first + 1;
+}
+
+unsigned int ZvStdFCurve::IsKeyParameter(double parameter, double tolerance) const {
+  ZvFCurveLockGuard guard(*this);
+  unsigned int i;
+  return m_impl->GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i);
+}
+
+unsigned int ZvStdFCurve::GetAllKeyParameters(ZvDoubleArray& parameters) const {
+  ZvFCurveLockGuard guard(*this);
+  for (unsigned int i = 0; i < m_impl->keys.size; ++i)
+    parameters.Add(m_impl->keys[i].parameter);
+  return m_impl->keys.size;
+}
+
+unsigned int ZvStdFCurve::GetNextKeyParameter(double parameter, double& next, int inclusive) const {
+  ZvFCurveLockGuard guard(*this);
+  const ZvStdFCurveImpl& s = *m_impl;
+  if (s.keys.size == 0) return 0;
+  int found;
+  unsigned int at = s.LocateParameter(parameter, found);
+  if (found && inclusive) --at;
+  if (at >= s.keys.size) return 0;
+  next = s.keys[at].parameter;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::GetPrevKeyParameter(double parameter, double& prev, int inclusive) const {
+  ZvFCurveLockGuard guard(*this);
+  const ZvStdFCurveImpl& s = *m_impl;
+  if (s.keys.size == 0) return 0;
+  int found;
+  unsigned int at = s.LocateParameter(parameter, found);
+  if (found && !inclusive) --at;
+  if (at == 0) return 0;
+  prev = s.keys[at - 1].parameter;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::GetNearestKeyParameter(double parameter, double& nearest) const {
+  ZvFCurveLockGuard guard(*this);
+  const ZvStdFCurveImpl& s = *m_impl;
+  const unsigned int n = s.keys.size;
+  if (n == 0) return 0;
+  int found;
+  const unsigned int at = s.LocateParameter(parameter, found);
+  unsigned int i;
+  if (found) {
+    i = at - 1;
+  } else if (at == 0) {
+    i = 0;
+  } else if (at >= n) {
+    i = n - 1;
+  } else {
+    // Of two equally near keys, the later.
+    i = s.keys[at].parameter - parameter <= parameter - s.keys[at - 1].parameter ? at : at - 1;
+  }
+  nearest = s.keys[i].parameter;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::GetNearestKeyParameterInCenteredInterval(double& parameter,
+                                                                   double tolerance) const {
+  ZvFCurveLockGuard guard(*this);
+  unsigned int i;
+  if (!m_impl->GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
+  parameter = m_impl->keys[i].parameter;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::SetClampingValues(double minValue, double maxValue) {
+  ZvFCurveLockGuard guard(*this);
+  if (m_impl->readOnly || !(minValue <= maxValue)) return 0;
+  m_impl->minClamp = minValue;
+  m_impl->maxClamp = maxValue;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::GetClampingValues(double& minValue, double& maxValue) const {
+  ZvFCurveLockGuard guard(*this);
+  minValue = m_impl->minClamp;
+  maxValue = m_impl->maxClamp;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::GetSmallestKeyParameter(double& parameter) const {
+  ZvFCurveLockGuard guard(*this);
+  if (m_impl->keys.size == 0) return 0;
+  parameter = m_impl->keys[0].parameter;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::IsSmallestKeyParameter(double parameter) const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->keys.size && zvIsSameParameter(parameter, m_impl->keys[0].parameter);
+}
+
+unsigned int ZvStdFCurve::GetLargestKeyParameter(double& parameter) const {
+  ZvFCurveLockGuard guard(*this);
+  if (m_impl->keys.size == 0) return 0;
+  parameter = m_impl->keys[m_impl->keys.size - 1].parameter;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::IsLargestKeyParameter(double parameter) const {
+  ZvFCurveLockGuard guard(*this);
+  const unsigned int n = m_impl->keys.size;
+  return n && zvIsSameParameter(parameter, m_impl->keys[n - 1].parameter);
+}
+
+double ZvStdFCurve::GetMinusInfinityVal() const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->keys.size ? m_impl->keys[0].leftValue : m_impl->valueWhenNoKeys;
+}
+
+double ZvStdFCurve::GetPlusInfinityVal() const {
+  ZvFCurveLockGuard guard(*this);
+  const unsigned int n = m_impl->keys.size;
+  return n ? m_impl->keys[n - 1].rightValue : m_impl->valueWhenNoKeys;
+}
+
+unsigned int ZvStdFCurve::SetReadOnlyConstraint(int on) {
+  ZvFCurveLockGuard guard(*this);
+  m_impl->readOnly = on ? 1 : 0;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::IsReadOnly() const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->readOnly;
+}
+
+unsigned int ZvStdFCurve::SetConstraint(double& parameter, KeyConstraint constraints, int on,
+                                        double tolerance) {
+  ZvFCurveLockGuard guard(*this);
+  unsigned int i;
+  if (m_impl->readOnly || !m_impl->GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) {
+    return 0;
+  }
+  parameter = m_impl->keys[i].parameter;
+  return m_impl->SetConstraint(i, constraints, on);
+}
+
+unsigned int ZvStdFCurve::GetConstraint(double& parameter, KeyConstraint constraint, int& on,
+                                        double tolerance) const {
+  ZvFCurveLockGuard guard(*this);
+  unsigned int i;
+  if (!m_impl->GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
+  parameter = m_impl->keys[i].parameter;
+  on = m_impl->GetConstraint(i, constraint);
+  return 1;
+}
+
+unsigned int ZvStdFCurve::IsConstraintSupported(KeyConstraint) const {
+  return 1;
+}
+
+// These may run without the lock as far as the flags go, but the search behind them moves the
+// hint, so they take it like every other query.
+unsigned int ZvStdFCurve::AreAnyValuesLockedInInterval(double start, double end, int excludeStart,
+                                                       int excludeEnd) const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->AnyKeyHasFlagsInInterval(start, end, excludeStart, excludeEnd, CFCFlag_ValueLock);
+}
+
+unsigned int ZvStdFCurve::AreAnyParametersLockedInInterval(double start, double end,
+                                                           int excludeStart, int excludeEnd) const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->AnyKeyHasFlagsInInterval(start, end, excludeStart, excludeEnd,
+                                          CFCFlag_ParameterLock);
+}
+
+unsigned int ZvStdFCurve::AreAnyKeysLockedInInterval(double start, double end, int excludeStart,
+                                                     int excludeEnd) const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->AnyKeyHasFlagsInInterval(start, end, excludeStart, excludeEnd,
+                                          CFCFlag_WholeKeyLock);
+}
+
+unsigned int ZvStdFCurve::SetExtrapolationMethod(ExtrapolationMethod method) {
+  ZvFCurveLockGuard guard(*this);
+  if (m_impl->readOnly || method < ConstantExtrapolation || method > CycleWithOffsetExtrapolation) {
+    return 0;
+  }
+  m_impl->extrapolation = static_cast<unsigned char>(method);
+  return 1;
+}
+
+ZvBaseFCurve::ExtrapolationMethod ZvStdFCurve::GetExtrapolationMethod() const {
+  ZvFCurveLockGuard guard(*this);
+  return static_cast<ExtrapolationMethod>(m_impl->extrapolation);
+}
+
+double ZvStdFCurve::FoldParameter(double parameter) const {
+  ZvFCurveLockGuard guard(*this);
+  m_impl->FoldParameter(parameter);
+  return parameter;
+}
+
+// Not stopped by the read-only flag. Re-setting every handle lets the constraint take hold at
+// once.
+unsigned int ZvStdFCurve::SetDefaultBezierTangentConstraint(int on) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  s.defaultBezierTangentConstraint = on ? 1 : 0;
+  for (unsigned int i = 0; i < s.keys.size; ++i) {
+    const ZvPoint2<double> l = s.keys[i].leftTangent, r = s.keys[i].rightTangent;
+    s.SetActualLeftTgt(i, l);
+    s.SetActualRightTgt(i, r);
+  }
+  return 1;
+}
+
+unsigned int ZvStdFCurve::IsDefautlBezierTangentConstraintOn() const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->defaultBezierTangentConstraint;
+}
+
+unsigned int ZvStdFCurve::SetAsTimeFCurve(int on) {
+  ZvFCurveLockGuard guard(*this);
+  const unsigned int flag = on ? 1 : 0;
+  if (m_impl->readOnly || m_impl->timeCurve == flag) return 0;
+  m_impl->timeCurve = flag;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::IsTimeFCurve() const {
+  ZvFCurveLockGuard guard(*this);
+  return m_impl->timeCurve;
+}
+
+ZvBaseFCurve::FSKind ZvStdFCurve::GetFirstSegmentKind() const {
+  ZvFCurveLockGuard guard(*this);
+  return static_cast<FSKind>(m_impl->firstSegmentKind);
+}
+
+unsigned int ZvStdFCurve::SetFirstSegmentKind(FSKind kind) {
+  ZvFCurveLockGuard guard(*this);
+  if (m_impl->readOnly || kind < ConstantSegment || kind > CubicSegment) return 0;
+  m_impl->firstSegmentKind = kind;
+  return 1;
+}
+
+unsigned int ZvStdFCurve::GetSegmentKind(double parameter, KeySide side, FSKind& kind,
+                                         double tolerance) const {
+  ZvFCurveLockGuard guard(*this);
+  const ZvStdFCurveImpl& s = *m_impl;
+  if (s.keys.size == 0) {
+    kind = static_cast<FSKind>(s.firstSegmentKind);
+    return 1;
+  }
+  unsigned int i;
+  if (!s.GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
+  if (side == LeftSide) {
+    kind = static_cast<FSKind>(i == 0 ? s.firstSegmentKind : s.keys[i - 1].segmentKind);
+  } else {
+    kind = static_cast<FSKind>(s.keys[i].segmentKind);
+  }
+  return 1;
+}
+
+unsigned int ZvStdFCurve::SetSegmentKind(double parameter, KeySide side, FSKind kind,
+                                         double tolerance) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  if (s.readOnly || kind < ConstantSegment || kind > CubicSegment) return 0;
+  const unsigned int n = s.keys.size;
+  if (n == 0) {
+    s.firstSegmentKind = kind;
+    return 1;
+  }
+  unsigned int i;
+  if (!s.GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
+  if (side == LeftSide) {
+    if (i == 0) {
+      s.firstSegmentKind = kind;
+    } else {
+      s.ModifyFSK(i - 1, kind);
+    }
+  } else if (i + 1 == n) {
+    s.keys[i].segmentKind = static_cast<unsigned char>(kind);  // carried, evaluates nothing
+  } else {
+    s.ModifyFSK(i, kind);
+  }
+  return 1;
+}
+
+unsigned int ZvStdFCurve::GetActualKeyTgtHandles(double parameter, ZvPoint2<double>& left,
+                                                 ZvPoint2<double>& right, double tolerance) const {
+  ZvFCurveLockGuard guard(*this);
+  unsigned int i;
+  if (!m_impl->GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
+  const CFCStdKey& k = m_impl->keys[i];
+  left = {k.leftTangent.x - k.parameter, k.leftTangent.y - k.leftValue};
+  right = {k.rightTangent.x - k.parameter, k.rightTangent.y - k.rightValue};
+  return 1;
+}
+
+unsigned int ZvStdFCurve::GetEvaluatedKeyTgtHandles(double parameter, ZvPoint2<double>& left,
+                                                    ZvPoint2<double>& right,
+                                                    double tolerance) const {
+  ZvFCurveLockGuard guard(*this);
+  unsigned int i;
+  if (!m_impl->GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
+  const CFCStdKey& k = m_impl->keys[i];
+  const ZvPoint2<double> l = m_impl->GetEvaluatedLeftTgt(i), r = m_impl->GetEvaluatedRightTgt(i);
+  left = {l.x - k.parameter, l.y - k.leftValue};
+  right = {r.x - k.parameter, r.y - k.rightValue};
+  return 1;
+}
+
+namespace {
+
+// A key exactly at the parameter whose tangents are locked refuses new handles.
+bool TangentsLockedAt(const ZvStdFCurveImpl& s, double parameter) {
+  unsigned int i;
+  if (!s.GetClosestKeyIndexInCenteredInterval(parameter, 0.0, i)) return false;
+  return (s.keys[i].flags & (CFCFlag_TangentLengthLock | CFCFlag_TangentDirectionLock)) != 0;
+}
+
+}  // namespace
+
+unsigned int ZvStdFCurve::SetKeyTgtHandle(double parameter, KeySide side,
+                                          const ZvPoint2<double>& handle, double tolerance) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  if (s.readOnly) return 0;
+  if (s.keys.size == 0) return 1;
+  if (TangentsLockedAt(s, parameter)) return 0;
+  unsigned int i;
+  if (!s.GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
+  return s.SetActualKeyTgtHandle(i, side, handle);
+}
+
+// Both handles or neither. A key whose handles no longer line up loses its continuity flag.
+unsigned int ZvStdFCurve::SetKeyTgtHandles(double parameter, const ZvPoint2<double>& left,
+                                           const ZvPoint2<double>& right, double tolerance) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  if (s.readOnly) return 0;
+  if (s.keys.size == 0) return 1;
+  if (TangentsLockedAt(s, parameter)) return 0;
+  unsigned int i;
+  if (!s.GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
+  const CFCStdKey saved = s.keys[i];
+  if (!s.SetActualKeyTgtHandle(i, LeftSide, left) ||
+      !s.SetActualKeyTgtHandle(i, RightSide, right)) {
+    s.keys[i] = saved;
+    return 0;
+  }
+  if (!s.ActualTangentsAreUnified(i)) {
+    s.keys[i].flags = static_cast<unsigned short>(s.keys[i].flags & ~CFCFlag_TangentContinuity);
+  }
+  return 1;
+}

@@ -1,0 +1,105 @@
+// ZvStdFCurve: operations on all keys at once - moving and scaling along either axis,
+// resampling and smoothing.
+#include <zv/std_fcurve.h>
+
+#include "fcurve/fcurve_lock.h"
+#include "fcurve/std_fcurve_impl.h"
+
+#include <cfloat>
+#include <cmath>
+
+namespace {
+
+bool AnyKeyHas(const ZvStdFCurveImpl& s, unsigned short bits) {
+  for (unsigned int i = 0; i < s.keys.size; ++i) {
+    if (s.keys[i].flags & bits) return true;
+  }
+  return false;
+}
+
+// With the default Bezier tangent constraint, handles sit at the thirds toward the neighbours.
+void ReapplyHandleConstraint(ZvStdFCurveImpl& s) {
+  if (!s.defaultBezierTangentConstraint) return;
+  for (unsigned int i = 0; i < s.keys.size; ++i) {
+    const ZvPoint2<double> l = s.keys[i].leftTangent, r = s.keys[i].rightTangent;
+    s.SetActualLeftTgt(i, l);
+    s.SetActualRightTgt(i, r);
+  }
+}
+
+// v -> v * scale + offset on every value of the curve and on the handles' Y.
+void MapValues(ZvStdFCurveImpl& s, double scale, double offset) {
+  for (unsigned int i = 0; i < s.keys.size; ++i) {
+    CFCStdKey& k = s.keys[i];
+    k.leftValue = k.leftValue * scale + offset;
+    k.rightValue = k.rightValue * scale + offset;
+    k.leftTangent.y = k.leftTangent.y * scale + offset;
+    k.rightTangent.y = k.rightTangent.y * scale + offset;
+  }
+  s.valueWhenNoKeys = s.valueWhenNoKeys * scale + offset;
+}
+
+}  // namespace
+
+unsigned int ZvStdFCurve::ShiftParameters(double delta) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  if (s.readOnly || !std::isfinite(delta) || AnyKeyHas(s, CFCFlag_ParameterLock)) return 0;
+  s.ShiftKeyParameters(delta, *this);
+  ReapplyHandleConstraint(s);
+  return 1;
+}
+
+unsigned int ZvStdFCurve::ScaleParameterAxis(double factor) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  // A factor of zero or below would merge or reverse the keys.
+  if (s.readOnly || !(factor > 0.0) || !std::isfinite(factor) ||
+      AnyKeyHas(s, CFCFlag_ParameterLock)) {
+    return 0;
+  }
+  s.ScaleKeyParameters(factor, *this);
+  ReapplyHandleConstraint(s);
+  return 1;
+}
+
+unsigned int ZvStdFCurve::ShiftValues(double delta) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  if (s.readOnly || AnyKeyHas(s, CFCFlag_ValueLock)) return 0;
+  MapValues(s, 1.0, delta);
+  return 1;
+}
+
+unsigned int ZvStdFCurve::ScaleAndShiftValues(double scale, double offset) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  if (s.readOnly || AnyKeyHas(s, CFCFlag_ValueLock)) return 0;
+  MapValues(s, scale, offset);
+  return 1;
+}
+
+unsigned int ZvStdFCurve::MirrorValues() {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  if (s.readOnly || AnyKeyHas(s, CFCFlag_ValueLock)) return 0;
+  MapValues(s, -1.0, 0.0);
+  return 1;
+}
+
+unsigned int ZvStdFCurve::ResampleSequence(double start, double end, double step,
+                                           int keepExistingKeys, int) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  if (s.readOnly || !std::isfinite(start) || !std::isfinite(end)) return 0;
+  return ZvStdFCurveImpl::Engine::ResampleKeys(s, start, end, step, keepExistingKeys, *this);
+}
+
+unsigned int ZvStdFCurve::SmoothSequence(double start, double end, const double* kernel,
+                                         unsigned int kernelSize) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  unsigned int first, last;
+  if (s.readOnly || !s.GetKeyIndicesInInterval(start, end, first, last, 0, 0)) return 0;
+  return s.SmoothSequence(first, last, kernel, kernelSize, *this);
+}

@@ -1,0 +1,205 @@
+// The standard function curve: Bezier keys, each with a parameter, a left and a right value (they
+// differ at a discontinuity), two tangent handles and the kind of the segment to the next key.
+//
+// Evaluation. Eval(t) is right-continuous and EvalLeft(t) gives the left limit; both first snap
+// t to a key within 1e-12, extend the curve beyond its keys by the extrapolation method
+// (constant, linear along the end tangents, cycle, cycle with a value offset per period) and
+// clamp to the clamping values on request. A cubic segment from key i to key i + 1 has the
+// control points (parameter(i), rightValue(i)), the evaluated right handle of i, the evaluated
+// left handle of i + 1 and (parameter(i + 1), leftValue(i + 1)); its X must be monotone, which
+// ZvStdFCurve_IsCubicSegmentValid tests, so that the segment is a function.
+//
+// Evaluated handles. What a key stores are its actual handles; the curve uses handles computed
+// from them and the key's flags: FlatTangent makes them horizontal, FlatAtExtremum too on an
+// extremum, AutoTangent follows the chord between the neighbours with handles a third of the way
+// toward them (flat on an end key), CollapsedTangent puts them on the key, ChordTangent points
+// them along the chord to the adjacent key.
+//
+// Sequential evaluation, parameter after parameter, costs constant time per call: the search for
+// the segment starts from where the last one ended. Every public operation takes the curve's
+// lock, queries included.
+#ifndef ZV_STD_FCURVE_H
+#define ZV_STD_FCURVE_H
+
+#include <zv/api.h>
+#include <zv/fcurve.h>
+#include <zv/point.h>
+
+class ZvStdFCurveImpl;
+
+class ZV_API ZvStdFCurve : public ZvBaseFCurve {
+ public:
+  // Ways of building a curve through a list of points.
+  enum DPMethod { DPCatmullRom = 1, DPCubicC2 = 2, DPLinearFitC0 = 3, DPCubicFitG1 = 4 };
+
+  // A curve without keys.
+  explicit ZvStdFCurve(double valueWhenNoKeys = 0.0, FSKind firstSegmentKind = CubicSegment);
+  // One key with its handles on the key.
+  ZvStdFCurve(double parameter, double leftValue, double rightValue, FSKind firstSegmentKind,
+              FSKind segmentKind);
+  // One cubic segment through four control points; the handles are repaired into a function
+  // segment if they fold back. The first point must lie left of the last.
+  ZvStdFCurve(const ZvPoint2<double>& p0, const ZvPoint2<double>& p1, const ZvPoint2<double>& p2,
+              const ZvPoint2<double>& p3);
+  ZvStdFCurve(const ZvStdFCurve& other);
+  ~ZvStdFCurve() override;
+  ZvStdFCurve& operator=(const ZvStdFCurve& other);
+
+  // ---- The contract of ZvBaseFCurve ----
+  ZvBaseFCurve& operator=(const ZvBaseFCurve& other) override;
+  ZvBaseFCurve* QueryFCurveKind(Kind kind) const override;
+  Kind GetKind() const override;
+  ZvBaseFCurve* Clone() const override;
+  ZvBaseFCurve* SnapShot(double start, double end, ExtrapolationMethod method) const override;
+  unsigned int CreateKey(double parameter, double value) override;
+  unsigned int MergeAndCreateKey(double start, double end, double parameter, double value,
+                                 int excludeStart, int excludeEnd, int keepAttributes) override;
+  unsigned int CreateNonModifyingKey(double parameter, int noFold) override;
+  unsigned int MergeAndCreateNonModifyingKey(double start, double end, double parameter,
+                                             int excludeStart, int excludeEnd, int keepAttributes,
+                                             int noFold) override;
+  unsigned int RemoveKey(double parameter, double tolerance) override;
+  unsigned int RemoveKeys(double start, double end, int excludeStart, int excludeEnd) override;
+  unsigned int SetValueWhenNoKeys(double value) override;
+  unsigned int GetKeyValue(double parameter, KeySide side, double& value,
+                           double tolerance) const override;
+  unsigned int GetKeyValues(double parameter, double& left, double& right,
+                            double tolerance) const override;
+  unsigned int SetKeyValue(double parameter, KeySide side, double value, double tolerance) override;
+  unsigned int Cut(double start, double end, ZvBaseFCurve& cutOut) override;
+  unsigned int RemoveTail(double parameter) override;
+  unsigned int RemoveHead(double parameter) override;
+  unsigned int Append(const ZvBaseFCurve& curve) override;
+  unsigned int Paste(const ZvBaseFCurve& curve, double start, double end) override;
+  unsigned int ShiftParameters(double delta) override;
+  unsigned int ScaleParameterAxis(double factor) override;
+  unsigned int ShiftValues(double delta) override;
+  unsigned int ReduceNumKeys(double start, double end, double tolerance) override;
+  unsigned int GetFCurveInfo(FCurveInfo* info) const override;
+  unsigned int GetKeyInfoFromIndex(unsigned int index, KeyInfo* info) const override;
+  unsigned int GetKeyInfoFromParameter(double parameter, KeyInfo* info) const override;
+  unsigned int GetKeyParameter(unsigned int index, double& parameter) const override;
+  unsigned int GetKeyIndex(double parameter, unsigned int& index) const override;
+  unsigned int GetNumKeys() const override;
+  unsigned int GetKeyParameters(double start, double end, ZvDoubleArray& parameters,
+                                int excludeStart, int excludeEnd) const override;
+  unsigned int IsKeyParameter(double parameter, double tolerance) const override;
+  unsigned int GetAllKeyParameters(ZvDoubleArray& parameters) const override;
+  unsigned int GetNextKeyParameter(double parameter, double& next, int inclusive) const override;
+  unsigned int GetPrevKeyParameter(double parameter, double& prev, int inclusive) const override;
+  unsigned int GetNearestKeyParameter(double parameter, double& nearest) const override;
+  unsigned int GetNearestKeyParameterInCenteredInterval(double& parameter,
+                                                        double tolerance) const override;
+  unsigned int SetClampingValues(double minValue, double maxValue) override;
+  unsigned int GetClampingValues(double& minValue, double& maxValue) const override;
+  unsigned int GetSmallestKeyParameter(double& parameter) const override;
+  unsigned int IsSmallestKeyParameter(double parameter) const override;
+  double GetMinusInfinityVal() const override;
+  unsigned int GetLargestKeyParameter(double& parameter) const override;
+  unsigned int IsLargestKeyParameter(double parameter) const override;
+  double GetPlusInfinityVal() const override;
+  // Bounds of the control polygons, not the exact extremes.
+  double GetValueUpperBound(int clamped) const override;
+  double GetValueLowerBound(int clamped) const override;
+  double Eval(double parameter, int clamped) const override;
+  // Samples from start to end by step (positive), read off the flattened curve.
+  unsigned int EvalSequence(double start, double end, double step, double tolerance,
+                            ZvDoubleArray& parameters, ZvDoubleArray& values,
+                            int clamped) const override;
+  unsigned int Flatten(const ZvTransfo4& transfo, double tolerance, ZvPoint2dArray& points,
+                       ZvPointTagArray& tags, int clamped) const override;
+  unsigned int FlattenFromTo(const ZvExtent2<double>& box, const ZvTransfo4& transfo,
+                             double tolerance, ZvPoint2dArray& points, ZvPointTagArray& tags,
+                             ZvBoolArray& extrapolated, int clamped) const override;
+  unsigned int GetKeys(ZvDoubleArray& parameters, ZvDoubleArray& leftValues,
+                       ZvDoubleArray& rightValues, int clamped) const override;
+  unsigned int ResampleSequence(double start, double end, double step, int keepExistingKeys,
+                                int ignoredFlag) override;
+  unsigned int SmoothSequence(double start, double end, const double* kernel,
+                              unsigned int kernelSize) override;
+  unsigned int MirrorValues() override;
+  unsigned int MirrorParameters() override;
+  unsigned int ScaleAndOffsetParameters(double start, double end, double pivot, double scale,
+                                        double offset, int moveHead, int moveTail,
+                                        RegionHandle handle) override;
+  unsigned int SetReadOnlyConstraint(int on) override;
+  unsigned int IsReadOnly() const override;
+  unsigned int SetConstraint(double& parameter, KeyConstraint constraints, int on,
+                             double tolerance) override;
+  unsigned int GetConstraint(double& parameter, KeyConstraint constraint, int& on,
+                             double tolerance) const override;
+  unsigned int IsConstraintSupported(KeyConstraint constraint) const override;
+  unsigned int AreAnyValuesLockedInInterval(double start, double end, int excludeStart,
+                                            int excludeEnd) const override;
+  unsigned int AreAnyParametersLockedInInterval(double start, double end, int excludeStart,
+                                                int excludeEnd) const override;
+  unsigned int AreAnyKeysLockedInInterval(double start, double end, int excludeStart,
+                                          int excludeEnd) const override;
+  unsigned int SetExtrapolationMethod(ExtrapolationMethod method) override;
+  ExtrapolationMethod GetExtrapolationMethod() const override;
+  double FoldParameter(double parameter) const override;
+  unsigned int GetBufferSize() const override;
+  unsigned int WriteToBuffer(void* buffer) const override;
+  unsigned int ReadFromBufferBody(const void* body) override;
+  unsigned int ScaleAndShiftValues(double scale, double offset) override;
+  // The parameter at which a bijective curve takes the value; the last argument is ignored.
+  unsigned int EvalInverse(double value, double& parameter, int clamped) const override;
+  // 1 for a continuous, strictly monotone curve of at least two keys.
+  unsigned int IsBijective() const override;
+  unsigned int SetDefaultBezierTangentConstraint(int on) override;
+  unsigned int IsDefautlBezierTangentConstraintOn() const override;
+  unsigned int SetAsTimeFCurve(int on) override;
+  unsigned int IsTimeFCurve() const override;
+  unsigned int Set(const ZvBaseFCurve& curve) override;
+
+  // ---- Beyond the contract ----
+
+  // Creates a key, or sets the value of the key at the parameter. The kinds are those of the
+  // segments left and right of the new key; 0 inherits the kind in force there.
+  unsigned int CreateKey(double parameter, double value, FSKind left, FSKind right);
+  // The left limit at the parameter, with extrapolation.
+  double EvalLeft(double parameter, int clamped) const;
+  // The integral of the plain values from a to b (a <= b); the extrapolation does not enter.
+  double EvalIntegral(double a, double b) const;
+  // The control-polygon range of the segment on one side of a key.
+  unsigned int GetValueRange(double parameter, KeySide side, double& low, double& high,
+                             double tolerance, int clamped) const;
+  unsigned int HasConstantValue() const;
+
+  unsigned int GetSegmentKind(double parameter, KeySide side, FSKind& kind, double tolerance) const;
+  unsigned int SetSegmentKind(double parameter, KeySide side, FSKind kind, double tolerance);
+  FSKind GetFirstSegmentKind() const;
+  unsigned int SetFirstSegmentKind(FSKind kind);
+
+  // Handles relative to the key: X minus the parameter, Y minus the left value (left handle)
+  // or the right value (right handle). Actual: as stored; evaluated: as used.
+  unsigned int GetActualKeyTgtHandles(double parameter, ZvPoint2<double>& left,
+                                      ZvPoint2<double>& right, double tolerance) const;
+  unsigned int GetEvaluatedKeyTgtHandles(double parameter, ZvPoint2<double>& left,
+                                         ZvPoint2<double>& right, double tolerance) const;
+  // Sets a handle, relative to the key. Refused when it would fold the adjacent segment, or
+  // when the key's tangent direction or length is locked.
+  unsigned int SetKeyTgtHandle(double parameter, KeySide side, const ZvPoint2<double>& handle,
+                               double tolerance);
+  unsigned int SetKeyTgtHandles(double parameter, const ZvPoint2<double>& left,
+                                const ZvPoint2<double>& right, double tolerance);
+
+  // Is the curve's data consistent: ascending keys, known segment kinds, function segments,
+  // ordered clamps, no NaN.
+  unsigned int IsValid() const;
+
+ private:
+  ZvStdFCurveImpl* m_impl;
+};
+
+// The u in [0, 1] at which a monotone cubic X with controls x0..x3 takes the value x.
+ZV_API double InvertParamCubic(double x, double x0, double x1, double x2, double x3);
+// Shortens the handles of the cubic p[0..3] along their directions until its X is monotone.
+ZV_API void BezierCubicRegularize(ZvPoint2<double>* p);
+// The integral of the function segment p[0..3] from parameter a to parameter b.
+ZV_API double IntegrateBezierSegment(const ZvPoint2<double>* p, double a, double b);
+// 1 when X of the cubic is monotone, so that the segment is a function of the parameter.
+ZV_API int ZvStdFCurve_IsCubicSegmentValid(const ZvPoint2<double>& p0, const ZvPoint2<double>& p1,
+                                           const ZvPoint2<double>& p2, const ZvPoint2<double>& p3);
+
+#endif

@@ -1,0 +1,298 @@
+// Building and editing standard curves: key creation that keeps the shape, removal, handles,
+// segment kinds, copies, and the key queries of the contract.
+#include <gtest/gtest.h>
+
+#include <zv/std_fcurve.h>
+
+#include "test_fcurve.h"
+
+#include <cmath>
+#include <vector>
+
+namespace {
+
+using C = ZvBaseFCurve;
+
+std::vector<double> Sample(const ZvStdFCurve& curve, double a, double b, int count) {
+  std::vector<double> values;
+  for (int i = 0; i <= count; ++i)
+    values.push_back(curve.Eval(a + (b - a) * i / count, 0));
+  return values;
+}
+
+void ExpectSameShape(const std::vector<double>& a, const std::vector<double>& b, double tol) {
+  ASSERT_EQ(a.size(), b.size());
+  for (size_t i = 0; i < a.size(); ++i)
+    EXPECT_NEAR(a[i], b[i], tol) << "sample " << i;
+}
+
+// Keys appended left to right: cubic segments with continued tangents.
+ZvStdFCurve Wave() {
+  ZvStdFCurve curve;
+  const double values[] = {0.0, 2.0, -1.0, 3.0, 1.0, 1.5};
+  for (int i = 0; i < 6; ++i)
+    curve.CreateKey(i * 1.5, values[i]);
+  return curve;
+}
+
+TEST(StdCurveKeys, AppendedKeysMakeContinuousFunctionSegments) {
+  ZvStdFCurve curve = Wave();
+  ASSERT_EQ(curve.GetNumKeys(), 6u);
+  EXPECT_EQ(curve.IsValid(), 1u);
+  ZvPoint2<double> left, right;
+  ASSERT_EQ(curve.GetActualKeyTgtHandles(3.0, left, right, 0.0), 1u);
+  EXPECT_NEAR(left.x, -0.5, 1e-12);  // a third of the way back
+  EXPECT_NEAR(left.x * right.y - left.y * right.x, 0.0, 1e-12);
+  EXPECT_NEAR(curve.Eval(1.5, 0), 2.0, 0.0);
+  // Continuous across keys.
+  EXPECT_NEAR(curve.Eval(3.0 - 1e-7, 0), curve.Eval(3.0 + 1e-7, 0), 1e-5);
+}
+
+TEST(StdCurveKeys, KeysInsideSegmentsKeepTheShape) {
+  ZvStdFCurve curve = Wave();
+  const std::vector<double> before = Sample(curve, -1.0, 8.5, 400);
+  for (double t : {0.4, 2.2, 2.9, 5.05, 7.0}) {
+    ASSERT_EQ(curve.CreateNonModifyingKey(t, 1), 1u);
+  }
+  EXPECT_EQ(curve.GetNumKeys(), 11u);
+  EXPECT_EQ(curve.IsValid(), 1u);
+  ExpectSameShape(before, Sample(curve, -1.0, 8.5, 400), 1e-9);
+  // Removing them again joins the halves back into the original cubics.
+  for (double t : {0.4, 2.2, 2.9, 5.05, 7.0})
+    ASSERT_EQ(curve.RemoveKey(t, 1e-9), 1u);
+  EXPECT_EQ(curve.GetNumKeys(), 6u);
+  ExpectSameShape(before, Sample(curve, -1.0, 8.5, 400), 1e-9);
+}
+
+TEST(StdCurveKeys, NonModifyingKeysFreezeAutomaticNeighbours) {
+  ZvStdFCurve curve = Wave();
+  for (double t : {1.5, 3.0, 4.5}) {
+    double at = t;
+    curve.SetConstraint(at, C::AutoTangent, 1, 0.0);
+  }
+  const std::vector<double> before = Sample(curve, 0.0, 7.5, 300);
+  ASSERT_EQ(curve.CreateNonModifyingKey(3.7, 1), 1u);
+  ExpectSameShape(before, Sample(curve, 0.0, 7.5, 300), 1e-9);
+  double at = 3.0;
+  int on = 1;
+  curve.GetConstraint(at, C::AutoTangent, on, 0.0);
+  EXPECT_EQ(on, 0);
+}
+
+TEST(StdCurveKeys, CreateKeyRules) {
+  ZvStdFCurve curve(3.0);
+  EXPECT_EQ(curve.CreateKey(1.0, 5.0), 1u);
+  C::FCurveInfo info{};
+  info.mask = C::FCurveInfo::ValueWhenNoKeysMask | C::FCurveInfo::NumKeysMask;
+  EXPECT_EQ(curve.GetFCurveInfo(&info), 1u);
+  EXPECT_EQ(info.valueWhenNoKeys, 5.0);
+  EXPECT_EQ(info.numKeys, 1u);
+  EXPECT_EQ(curve.GetFCurveInfo(nullptr), 0u);
+
+  double at = 1.0;
+  curve.SetConstraint(at, C::ValueLock, 1, 0.0);
+  EXPECT_EQ(curve.CreateKey(1.0, 6.0), 0u);
+  EXPECT_EQ(curve.Eval(1.0, 0), 5.0);
+  EXPECT_EQ(curve.CreateKey(std::nan(""), 1.0), 0u);
+  curve.SetReadOnlyConstraint(1);
+  EXPECT_EQ(curve.CreateKey(2.0, 6.0), 0u);
+  EXPECT_EQ(curve.GetNumKeys(), 1u);
+
+  // Keys before the first key take over the value left of the curve.
+  ZvStdFCurve head(0.0, C::LinearSegment);
+  head.CreateKey(2.0, 4.0);
+  head.CreateKey(0.0, 1.0, C::ConstantSegment, C::LinearSegment);
+  EXPECT_EQ(head.GetFirstSegmentKind(), C::ConstantSegment);
+  EXPECT_DOUBLE_EQ(head.Eval(1.0, 0), 2.5);
+  EXPECT_EQ(head.Eval(-1.0, 0), 1.0);
+}
+
+TEST(StdCurveKeys, RemovalKeepsKindsAndValues) {
+  ZvStdFCurve curve(0.0, C::LinearSegment);
+  for (int i = 0; i < 4; ++i)
+    curve.CreateKey(i, i * i);
+  EXPECT_EQ(curve.RemoveKey(1.0, 0.0), 1u);
+  EXPECT_DOUBLE_EQ(curve.Eval(1.0, 0), 2.0);  // the line from 0 to 4 at 1
+  EXPECT_EQ(curve.RemoveKey(0.2, 0.1), 0u);
+  double at = 2.0;
+  curve.SetConstraint(at, C::ParameterLock, 1, 0.0);
+  EXPECT_EQ(curve.RemoveKey(2.0, 0.0), 0u);
+  EXPECT_EQ(curve.RemoveKeys(0.0, 3.0, 0, 0), 0u);
+  EXPECT_EQ(curve.RemoveKeys(2.5, 3.5, 0, 0), 1u);
+  EXPECT_EQ(curve.GetNumKeys(), 2u);
+  curve.SetConstraint(at, C::ParameterLock, 0, 0.0);
+  EXPECT_EQ(curve.RemoveKeys(-1.0, 5.0, 0, 0), 1u);
+  EXPECT_EQ(curve.GetNumKeys(), 0u);
+  EXPECT_EQ(curve.GetFirstSegmentKind(), C::LinearSegment);
+  EXPECT_EQ(curve.RemoveKey(0.0, 1.0), 1u);  // nothing to remove is no failure
+
+  ZvStdFCurve jump(0.0, C::LinearSegment);
+  jump.CreateKey(0.0, 0.0);
+  jump.CreateKey(1.0, 1.0);
+  jump.CreateKey(2.0, 5.0);
+  jump.SetKeyValue(1.0, C::RightSide, 3.0, 0.0);
+  EXPECT_EQ(jump.RemoveHead(1.0), 1u);  // the head goes; the jump closes on the right value
+  EXPECT_EQ(jump.GetNumKeys(), 2u);
+  EXPECT_EQ(jump.EvalLeft(1.0, 0), 3.0);
+  EXPECT_EQ(jump.RemoveTail(1.5), 1u);
+  EXPECT_EQ(jump.GetNumKeys(), 2u);
+  EXPECT_DOUBLE_EQ(jump.Eval(1.5, 0), 4.0);
+}
+
+TEST(StdCurveKeys, MergeReplacesAnInterval) {
+  ZvStdFCurve curve(0.0, C::LinearSegment);
+  for (int i = 0; i < 5; ++i)
+    curve.CreateKey(i, i);
+  double at = 2.0;
+  curve.SetConstraint(at, C::FlatTangent, 1, 0.0);
+  const unsigned char byte = 9;
+  const _zvUID uid = {7, 0, 0, {0}};
+  ASSERT_EQ(curve.SetKeyUserData(at, uid, &byte, 1, 0.0), 1u);
+  EXPECT_EQ(curve.MergeAndCreateKey(1.5, 3.5, 2.2, 10.0, 0, 0, 1), 1u);
+  EXPECT_EQ(curve.GetNumKeys(), 4u);
+  EXPECT_EQ(curve.Eval(2.2, 0), 10.0);
+  at = 2.2;
+  int on = 0;
+  curve.GetConstraint(at, C::FlatTangent, on, 0.0);
+  EXPECT_EQ(on, 1);
+  const unsigned char* data = nullptr;
+  unsigned int size = 0;
+  EXPECT_EQ(curve.GetKeyUserData(at, uid, data, size, 0.0), 1u);
+  ASSERT_EQ(size, 1u);
+  EXPECT_EQ(data[0], 9);
+  at = 1.0;
+  curve.SetConstraint(at, C::ValueLock, 1, 0.0);
+  EXPECT_EQ(curve.MergeAndCreateKey(0.5, 1.5, 1.0, 3.0, 0, 0, 0), 0u);
+}
+
+TEST(StdCurveKeys, HandlesAndSegmentKinds) {
+  ZvStdFCurve curve = Wave();
+  EXPECT_EQ(curve.SetKeyTgtHandle(3.0, C::RightSide, {0.4, 1.0}, 0.0), 1u);
+  ZvPoint2<double> left, right;
+  curve.GetActualKeyTgtHandles(3.0, left, right, 0.0);
+  EXPECT_DOUBLE_EQ(right.x, 0.4);
+  EXPECT_DOUBLE_EQ(right.y, 1.0);
+  // A handle folding the segment back is refused and changes nothing.
+  EXPECT_EQ(curve.SetKeyTgtHandle(3.0, C::RightSide, {-0.5, 0.0}, 0.0), 0u);
+  EXPECT_EQ(curve.SetKeyTgtHandle(3.0, C::RightSide, {4.0, 0.0}, 0.0), 0u);
+  curve.GetActualKeyTgtHandles(3.0, left, right, 0.0);
+  EXPECT_DOUBLE_EQ(right.x, 0.4);
+  double at = 3.0;
+  curve.SetConstraint(at, C::TangentDirectionLock, 1, 0.0);
+  EXPECT_EQ(curve.SetKeyTgtHandle(3.0, C::RightSide, {0.3, 1.0}, 0.0), 0u);
+  curve.SetConstraint(at, C::TangentDirectionLock, 0, 0.0);
+  // Handles set together that no longer line up drop the continuity flag.
+  EXPECT_EQ(curve.SetKeyTgtHandles(3.0, {-0.5, 1.0}, {0.5, 1.0}, 0.0), 1u);
+  int on = 1;
+  curve.GetConstraint(at, C::TangentContinuity, on, 0.0);
+  EXPECT_EQ(on, 0);
+  EXPECT_EQ(curve.IsValid(), 1u);
+
+  // A linear segment turned cubic keeps stored handles that make a function: here flat ones
+  // a third of the way in, as appending the keys left them.
+  ZvStdFCurve line(0.0, C::LinearSegment);
+  line.CreateKey(0.0, 0.0);
+  line.CreateKey(3.0, 3.0);
+  EXPECT_EQ(line.SetSegmentKind(0.0, C::RightSide, C::CubicSegment, 0.0), 1u);
+  EXPECT_EQ(line.IsValid(), 1u);
+  C::FSKind kind;
+  EXPECT_EQ(line.GetSegmentKind(3.0, C::LeftSide, kind, 0.0), 1u);
+  EXPECT_EQ(kind, C::CubicSegment);
+  EXPECT_NEAR(line.Eval(1.0, 0), 7.0 / 9.0, 1e-12);
+  EXPECT_EQ(line.SetSegmentKind(0.0, C::RightSide, static_cast<C::FSKind>(0), 0.0), 0u);
+  EXPECT_EQ(line.SetSegmentKind(0.0, C::LeftSide, C::ConstantSegment, 0.0), 1u);
+  EXPECT_EQ(line.GetFirstSegmentKind(), C::ConstantSegment);
+}
+
+TEST(StdCurveKeys, CopiesAreIndependent) {
+  ZvStdFCurve curve = Wave();
+  ZvBaseFCurve* clone = curve.Clone();
+  ASSERT_NE(clone, nullptr);
+  ASSERT_EQ(clone->QueryFCurveKind(C::StdKind), clone);
+  EXPECT_EQ(clone->QueryFCurveKind(C::RawKind), nullptr);
+  curve.CreateKey(2.0, 50.0);
+  EXPECT_NE(clone->Eval(2.0, 0), 50.0);
+  ZvStdFCurve assigned;
+  EXPECT_EQ(assigned.Set(*clone), 1u);
+  EXPECT_EQ(assigned.GetNumKeys(), 6u);
+  delete clone;
+
+  // Another class, even one claiming the same kind, is refused.
+  TestFCurve other({1.0, 2.0});
+  EXPECT_EQ(assigned.Set(other), 0u);
+  EXPECT_EQ(assigned.GetNumKeys(), 6u);
+}
+
+TEST(StdCurveKeys, KeyQueries) {
+  ZvStdFCurve curve(0.0, C::LinearSegment);
+  for (int i = 0; i < 4; ++i)
+    curve.CreateKey(i, 10 * i);
+  double p = -1;
+  EXPECT_EQ(curve.GetNearestKeyParameter(1.5, p), 1u);
+  EXPECT_EQ(p, 2.0);  // midway: the later key
+  EXPECT_EQ(curve.GetNextKeyParameter(1.0, p, 0), 1u);
+  EXPECT_EQ(p, 2.0);
+  EXPECT_EQ(curve.GetNextKeyParameter(1.0, p, 1), 1u);
+  EXPECT_EQ(p, 1.0);
+  EXPECT_EQ(curve.GetPrevKeyParameter(1.0, p, 0), 1u);
+  EXPECT_EQ(p, 0.0);
+  EXPECT_EQ(curve.GetPrevKeyParameter(0.0, p, 0), 0u);
+  EXPECT_EQ(curve.GetNextKeyParameter(3.0, p, 0), 0u);
+  p = 2.05;
+  EXPECT_EQ(curve.GetNearestKeyParameterInCenteredInterval(p, 0.1), 1u);
+  EXPECT_EQ(p, 2.0);
+
+  ZvDoubleArray params;
+  EXPECT_EQ(curve.GetKeyParameters(1.0, 1.0, params, 1, 1), 0u);
+  EXPECT_EQ(curve.GetKeyParameters(1.0, 1.0, params, 1, 0), 1u);  // one flag: both ignored
+  EXPECT_EQ(curve.GetKeyParameters(0.5, 3.0, params, 0, 1), 2u);
+  EXPECT_EQ(params.size, 3u);
+
+  C::KeyInfo info{};
+  info.mask = 0x1ff;
+  EXPECT_EQ(curve.GetKeyInfoFromIndex(4, &info), 0u);
+  EXPECT_EQ(info.mask, 0u);
+  info.mask = 0x1ff;
+  EXPECT_EQ(curve.GetKeyInfoFromParameter(2.0, &info), 1u);
+  EXPECT_EQ(info.index, 2u);
+  EXPECT_EQ(info.leftValue, 20.0);
+  EXPECT_EQ(info.segmentKind, C::LinearSegment);
+
+  ZvDoubleArray ps, ls, rs;
+  curve.SetClampingValues(5.0, 25.0);
+  EXPECT_EQ(curve.GetKeys(ps, ls, rs, 1), 4u);
+  EXPECT_EQ(ls[0], 5.0);
+  EXPECT_EQ(rs[3], 25.0);
+  EXPECT_EQ(curve.GetMinusInfinityVal(), 0.0);
+  EXPECT_EQ(curve.GetPlusInfinityVal(), 30.0);
+  EXPECT_EQ(curve.IsLargestKeyParameter(3.0), 1u);
+  EXPECT_EQ(curve.SetAsTimeFCurve(1), 0u);
+  EXPECT_EQ(curve.SetAsTimeFCurve(0), 1u);
+}
+
+TEST(StdCurveKeys, WholeCurveMoves) {
+  ZvStdFCurve curve = Wave();
+  const std::vector<double> before = Sample(curve, 0.0, 7.5, 100);
+  ASSERT_EQ(curve.ShiftParameters(2.0), 1u);
+  ExpectSameShape(before, Sample(curve, 2.0, 9.5, 100), 1e-12);
+  ASSERT_EQ(curve.ScaleParameterAxis(2.0), 1u);
+  ExpectSameShape(before, Sample(curve, 4.0, 19.0, 100), 1e-9);
+  ASSERT_EQ(curve.ScaleAndShiftValues(2.0, 1.0), 1u);
+  EXPECT_NEAR(curve.Eval(7.0, 0), 2.0 * 2.0 + 1.0, 1e-12);
+  ASSERT_EQ(curve.MirrorValues(), 1u);
+  EXPECT_NEAR(curve.Eval(7.0, 0), -5.0, 1e-12);
+  EXPECT_EQ(curve.ScaleParameterAxis(0.0), 0u);
+  double at = 7.0;
+  curve.SetConstraint(at, C::ParameterLock, 1, 0.0);
+  EXPECT_EQ(curve.ShiftParameters(1.0), 0u);
+
+  ZvStdFCurve grid = Wave();
+  const std::vector<double> shape = Sample(grid, 0.0, 7.5, 60);
+  ASSERT_EQ(grid.ResampleSequence(0.0, 7.5, 0.5, 1, 0), 1u);
+  EXPECT_EQ(grid.GetNumKeys(), 16u);
+  ExpectSameShape(shape, Sample(grid, 0.0, 7.5, 60), 1e-9);
+  ASSERT_EQ(grid.ResampleSequence(0.0, 7.5, 2.5, 0, 0), 1u);
+  EXPECT_EQ(grid.GetNumKeys(), 4u);
+}
+
+}  // namespace
