@@ -1,5 +1,6 @@
 // Drawing, structure queries, closing, tangent locks, copying, transforms and the dump of
 // ZvPath2f.
+#include <zv/gc.h>
 #include <zv/path2f.h>
 
 #include <gtest/gtest.h>
@@ -380,4 +381,19 @@ TEST(Path2f, TextDump) {
             "Index: 0 X: 0 Y: 0 First: 0 Last: 2\n"
             "Index: 1 X: 1.5 Y: 2 First: 0 Last: 2\n"
             "Index: 2 X: -3 Y: 0.25 First: 0 Last: 2\n");
+}
+
+TEST(Path2f, RasterExtentQuickTest) {
+  ZvPath2f path;
+  path.Moveto(P(0, 0));
+  path.Lineto(P(10, 10));
+  ZvGC gc;
+  gc.transform.Translate(5.0, 0.0, 0.0);  // the path spans 5..15 by 0..10 on the raster
+  EXPECT_EQ(path.IsRasterExtentIntersecting(gc, ZvExtent2<float>(15, 10, 20, 20)), 1);  // touch
+  EXPECT_EQ(path.IsRasterExtentIntersecting(gc, ZvExtent2<float>(15.5f, 0, 20, 20)), 0);
+  EXPECT_EQ(path.IsRasterExtentIntersecting(gc, ZvExtent2<float>(0, -5, 5, 0)), 1);
+  ZvExtent2<float> infinite(0, 0, 0, 0, ZvExtent2<float>::Infinite);
+  EXPECT_EQ(path.IsRasterExtentIntersecting(gc, infinite), 1);
+  EXPECT_EQ(path.IsRasterExtentIntersecting(gc, ZvExtent2<float>()), 0);
+  EXPECT_EQ(ZvPath2f().IsRasterExtentIntersecting(gc, infinite), 0);  // nothing to draw
 }
