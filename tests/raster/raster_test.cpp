@@ -70,7 +70,8 @@ TEST(Raster, WrappedMemoryIsOverwrittenAndSharedByCopies) {
   ZvRaster<int> deep(owner);
   EXPECT_NE(deep.GetRaster(), owner.GetRaster());
   EXPECT_EQ(deep.GetOrientationFlag(), 1);
-  deep = deep;  // self-assignment keeps the pixels
+  const ZvRaster<int>& self = deep;
+  deep = self;  // self-assignment keeps the pixels
   EXPECT_EQ(deep.AllPixelValuesAre(3), 1);
 
   // An owning wrapper hands its block over.

@@ -266,7 +266,8 @@ TEST(Path2f, CopiesAreIndependentAndSiblingsShareTopology) {
   ZvPath2f assigned;
   assigned = path;
   EXPECT_EQ(Codes(assigned, 255), Codes(path, 255));
-  assigned = assigned;
+  const ZvPath2f& self = assigned;
+  assigned = self;
   EXPECT_EQ(assigned.NumPoints(), 11u);
   ZvShape2f& asShape = assigned;
   asShape = static_cast<const ZvShape2f&>(copy);  // through the slot
