@@ -2,14 +2,21 @@
 #include <zv/matrix.h>
 
 #include <cstddef>
+#include <limits>
+#include <new>
 #include <ostream>
 
 namespace {
 
-// Element count of an inclusive range; a reversed range counts as empty.
+const std::size_t kMaxCount = std::numeric_limits<std::size_t>::max() / sizeof(double) - 1;
+
+// Element count of an inclusive range; a reversed range counts as empty. A count that no block
+// could hold (possible in 32-bit builds) fails like any other impossible allocation.
 std::size_t Extent(int low, int high) {
   const long long n = static_cast<long long>(high) - low + 1;
-  return n > 0 ? static_cast<std::size_t>(n) : 0;
+  if (n <= 0) return 0;
+  if (static_cast<unsigned long long>(n) > kMaxCount) throw std::bad_array_new_length();
+  return static_cast<std::size_t>(n);
 }
 
 bool Covers(int low, int high, int innerLow, int innerHigh) {
@@ -21,6 +28,7 @@ bool Covers(int low, int high, int innerLow, int innerHigh) {
 ZvMatrix::ZvMatrix(int rLow, int rHigh, int cLow, int cHigh)
     : rowLow(rLow), rowHigh(rHigh), colLow(cLow), colHigh(cHigh), rows(nullptr) {
   const std::size_t nr = Extent(rowLow, rowHigh), nc = Extent(colLow, colHigh);
+  if (nc != 0 && nr > kMaxCount / nc) throw std::bad_array_new_length();
   // The extra element and row pointer keep both blocks non-empty for empty ranges.
   double** rowBlock = new double*[nr + 1];
   double* elements;

@@ -7,6 +7,8 @@
 
 namespace {
 
+static_assert(sizeof(ZvTransfo4) == 16 * sizeof(double), "a transform is its 16 doubles");
+
 const double kIdentity[16] = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
 
 void Copy16(const double* from, double* to) {

@@ -50,7 +50,7 @@ class ZV_API ZvTransfo4 {
   void Map(const ZvPoint2<T>& p, ZvPoint2<T>& result) const;
   template <class T>
   void Map(const ZvPoint3<T>& p, ZvPoint3<T>& result) const;
-  // Element by element; `out` may be `in`.
+  // Element by element; `out` may be `in` but must not otherwise overlap it.
   template <class T>
   void Map(const ZvPoint2<T>* in, unsigned int count, ZvPoint2<T>* out) const;
   template <class T>
