@@ -1,209 +1,25 @@
 // The shared key engine of the keyed function curves: a sorted key array with a search hint,
 // and the insertion, removal, merging, cutting, resampling and smoothing that work on it.
 //
-// CFCBaseImpl<T, Key, Store> sits on one of the stores of cfc_key_store.h and reaches the
-// store's differences only through the accessors every store offers. The owning curve is
-// passed to the editing operations so that the per-key user data follows the keys.
+// CFCBaseImpl<T, Key, Store> sits on one of the stores of cfc_key_store.h, through the search
+// layer of cfc_key_search.h, and reaches the store's differences only through the accessors
+// every store offers. The owning curve is passed to the editing operations so that the per-key
+// user data follows the keys.
 //
-// Nothing here locks: the engine runs under the owning curve's lock. Even the const searches
-// write the hint, so they too need that lock.
+// Nothing here locks: the engine runs under the owning curve's lock.
 #ifndef ZV_FCURVE_CFC_BASE_IMPL_H
 #define ZV_FCURVE_CFC_BASE_IMPL_H
 
-#include <zv/fcurve.h>
-
-#include "fcurve/cfc_key_store.h"
-#include "fcurve/key_params.h"
-
-#include <cmath>
-
-// Identity of stored parameters.
-constexpr double kCFCParameterEpsilon = 1e-15;
-// An evaluation parameter within this of a key is taken as the key.
-constexpr double kCFCSnapTolerance = 1e-12;
+#include "fcurve/cfc_key_search.h"
 
 template <class T, class Key, class Store>
-class CFCBaseImpl : public Store {
+class CFCBaseImpl : public CFCKeySearch<T, Key, Store> {
  public:
-  using Store::keys;
-
-  // ---- Search -------------------------------------------------------------------------------
-
-  // The number of keys at or below t, i.e. the index of the first key above t; `found` tells
-  // whether t lies on a key (then the result minus 1). Never on an empty store.
-  //
-  // The ends and the two-key neighbourhood of the hint compare with the parameter epsilon; the
-  // bisection compares exactly, deliberately, so a t a hair above a key far from the hint
-  // counts as after the key. Below 12 keys the neighbourhood is skipped.
-  unsigned int LocateParameter(double t, int& found) const {
-    const unsigned int n = keys.size;
-    const Key* k = keys.data;
-    if (k[0].parameter >= t) {
-      this->searchHint = 0;
-      found = zvIsSameParameter(t, k[0].parameter);
-      return found ? 1 : 0;
-    }
-    if (t >= k[n - 1].parameter) {
-      this->searchHint = n - 1;
-      found = t - k[n - 1].parameter <= kCFCParameterEpsilon;
-      return n;
-    }
-    const unsigned int c = this->searchHint < n - 1 ? this->searchHint : n - 1;
-    const unsigned int back = c < 2 ? c : 2;
-    const unsigned int forward = n - 1 - c < 2 ? n - 1 - c : 2;
-    this->searchHint = c;
-    const double lowEnd = k[c - back].parameter, highEnd = k[c + forward].parameter;
-    if (n - 1 >= 11 && t >= lowEnd && highEnd >= t) {
-      unsigned int hit;
-      if (forward > 0 && (InPair(t, c, hit) || InPair(t, c + forward - 1, hit))) {
-        return Hit(t, hit, found);
-      }
-      if (back > 0 && (InPair(t, c - back, hit) || InPair(t, c - 1, hit))) {
-        return Hit(t, hit, found);
-      }
-      if (zvIsSameParameter(t, highEnd)) {
-        found = 1;
-        this->searchHint = c + forward;
-        return c + forward + 1;
-      }
-    }
-    unsigned int low = 0, high = n - 1;
-    if (lowEnd > t) {
-      high = c - back;
-    } else if (t > highEnd) {
-      low = c + forward;
-    }
-    while (high - low > 1) {
-      const unsigned int mid = (low + high) / 2;
-      if (t > k[mid].parameter) {
-        low = mid;
-      } else {
-        high = mid;
-        if (t >= k[mid].parameter) {  // exact equality, on purpose
-          this->searchHint = mid;
-          found = 1;
-          return mid + 1;
-        }
-      }
-    }
-    this->searchHint = low;
-    found = 0;
-    return low + 1;
-  }
-
-  // The key nearest to t among those in [t - tolerance, t + tolerance]; of equal distances the
-  // earlier. 0 when there is none.
-  int GetClosestKeyIndexInCenteredInterval(double t, double tolerance, unsigned int& index) const {
-    const unsigned int n = keys.size;
-    if (n == 0) return 0;
-    const double lo = t - tolerance, hi = t + tolerance;
-    int found;
-    unsigned int start = LocateParameter(lo, found);
-    if (found) --start;
-    if (start >= n) return 0;
-    if (!(hi >= keys[start].parameter)) return 0;
-    unsigned int last = start;
-    while (!zvIsSameParameter(keys[last].parameter, hi) && last + 1 < n &&
-           keys[last + 1].parameter - hi <= kCFCParameterEpsilon) {
-      ++last;
-    }
-    unsigned int best = start;
-    double bestDistance = std::fabs(t - keys[start].parameter);
-    for (unsigned int i = start + 1; i <= last; ++i) {
-      const double d = std::fabs(t - keys[i].parameter);
-      if (d < bestDistance) {
-        bestDistance = d;
-        best = i;
-      }
-    }
-    index = best;
-    return 1;
-  }
-
-  // The first and last index of the keys in the interval. 0, with `first` and `last` left
-  // alone, when it holds none.
-  int GetKeyIndicesInInterval(double start, double end, unsigned int& first, unsigned int& last,
-                              int excludeStart, int excludeEnd) const {
-    const unsigned int n = keys.size;
-    if (n == 0) return 0;
-    if (excludeStart && excludeEnd && zvIsSameParameter(start, end)) return 0;
-    int found;
-    long f = static_cast<long>(LocateParameter(start, found));
-    if (found && !excludeStart) --f;
-    long l = static_cast<long>(LocateParameter(end, found)) - 1;
-    if (found && excludeEnd) --l;
-    if (f > l || f >= static_cast<long>(n) || l < 0) return 0;
-    first = static_cast<unsigned int>(f);
-    last = static_cast<unsigned int>(l);
-    return 1;
-  }
-
-  // Under the cycle methods, brings t into the keyed range and onto a key within the snap
-  // tolerance. Nothing happens with fewer than two keys or another method.
-  void FoldParameter(double& t) const {
-    const unsigned int n = keys.size;
-    if ((this->extrapolation != 3 && this->extrapolation != 4) || n < 2) return;
-    const double first = keys[0].parameter, last = keys[n - 1].parameter;
-    const double period = last - first;
-    if (t > last) {
-      t = first + std::fmod(t - first, period);
-    } else if (t < first) {
-      t = last - std::fmod(first - t, period);
-    }
-    if (t < first) t = first;
-    if (t > last) t = last;
-    unsigned int i;
-    if (GetClosestKeyIndexInCenteredInterval(t, kCFCSnapTolerance, i)) t = keys[i].parameter;
-  }
-
-  // Folds t and moves both bounds by the same displacement, then orders the bounds and clamps
-  // t into them.
-  void FoldBoundsAndParameter(double& start, double& end, double& t) const {
-    const double before = t;
-    FoldParameter(t);
-    const double shift = t - before;
-    start += shift;
-    end += shift;
-    if (start > end) {
-      const double s = start;
-      start = end;
-      end = s;
-    }
-    if (t < start) t = start;
-    if (t > end) t = end;
-  }
-
-  // ---- Constraints --------------------------------------------------------------------------
-
-  // `code` may combine several codes; each sets or clears the bits its store knows for it.
-  int SetConstraint(unsigned int index, unsigned int code, int on) {
-    unsigned short bits = 0;
-    for (unsigned int c = 1; c != 0 && c <= code; c <<= 1) {
-      if (code & c) bits |= Store::ConstraintBits(c);
-    }
-    const unsigned short f = this->GetKeyFlags(index);
-    this->SetKeyFlags(index, static_cast<unsigned short>(on ? (f | bits) : (f & ~bits)));
-    return 1;
-  }
-
-  // Exactly one code. A code of several bits (the whole-key lock) reads true only when all are
-  // set; an unknown code reads 0.
-  int GetConstraint(unsigned int index, unsigned int code) const {
-    const unsigned short bits = Store::ConstraintBits(code);
-    if (bits == 0) return 0;
-    return (this->GetKeyFlags(index) & bits) == bits ? 1 : 0;
-  }
-
-  // 1 when a key of the interval has all of `bits` in its KeyFlags.
-  int AnyKeyHasFlagsInInterval(double start, double end, int excludeStart, int excludeEnd,
-                               unsigned short bits) const {
-    unsigned int first, last;
-    if (!GetKeyIndicesInInterval(start, end, first, last, excludeStart, excludeEnd)) return 0;
-    for (unsigned int i = first; i <= last; ++i) {
-      if ((this->GetKeyFlags(i) & bits) == bits) return 1;
-    }
-    return 0;
-  }
+  using CFCKeySearch<T, Key, Store>::keys;
+  using CFCKeySearch<T, Key, Store>::LocateParameter;
+  using CFCKeySearch<T, Key, Store>::GetClosestKeyIndexInCenteredInterval;
+  using CFCKeySearch<T, Key, Store>::NearestKeyIndex;
+  using CFCKeySearch<T, Key, Store>::MergeBounds;
 
   // ---- Editing of single-value stores -------------------------------------------------------
 
@@ -385,20 +201,48 @@ class CFCBaseImpl : public Store {
     return curve.MoveKeyUserDataTail(oldParameters, newParameters);
   }
 
-  // Keys whose value repeats the previous key's are dropped, unless value- or parameter-locked.
-  // Returns the number of keys dropped.
-  unsigned int ReduceNumKeys(unsigned int first, unsigned int last, double, ZvBaseFCurve& curve) {
+  // Drops the keys strictly inside first..last that add nothing, with their user data, and
+  // returns how many went. What adds nothing is a store difference. The integer store drops a
+  // key that repeats the previous key's value (the tolerance plays no part). The raw and
+  // standard stores thin along lines: a line runs from a kept key through the next one, and the
+  // key before each following key j goes while j lies on the line within the tolerance, on
+  // both of its sides; otherwise that key stays and the line restarts from it to j. The
+  // standard store keeps keys that touch a cubic segment and value- or parameter-locked keys.
+  unsigned int ReduceNumKeys(unsigned int first, unsigned int last, double tolerance,
+                             ZvBaseFCurve& curve) {
     if (last < first + 2 || last >= keys.size) return 0;
     const double firstParameter = keys[first].parameter, lastParameter = keys[last].parameter;
+    // Kept keys are moved down in place; a key is read before anything is written over it.
     unsigned int write = first + 1;
-    for (unsigned int i = first + 1; i < last; ++i) {
-      const bool drop = zvIsSameParameter(this->ValueAsDouble(i), this->ValueAsDouble(i - 1)) &&
-                        (this->GetKeyFlags(i) & (CFCFlag_ValueLock | CFCFlag_ParameterLock)) == 0;
-      if (drop) {
-        curve.RemoveKeyUserData(keys[i].parameter);
-      } else {
-        if (write != i) this->MoveKey(write, i);
+    if constexpr (Store::kThinsAlongLines) {
+      double anchorX = keys[first].parameter, anchorY = this->ThinOutValue(first);
+      double slope =
+          (this->ThinInValue(first + 1) - anchorY) / (keys[first + 1].parameter - anchorX);
+      for (unsigned int j = first + 2; j <= last; ++j) {
+        const double x = keys[j].parameter;
+        const double y = anchorY + slope * (x - anchorX);
+        const unsigned int candidate = j - 1;
+        if (std::fabs(y - this->ThinInValue(j)) <= tolerance &&
+            std::fabs(y - this->ThinOutValue(j)) <= tolerance && this->ThinMayDrop(candidate)) {
+          curve.RemoveKeyUserData(keys[candidate].parameter);
+          continue;
+        }
+        anchorX = keys[candidate].parameter;
+        anchorY = this->ThinOutValue(candidate);
+        slope = (this->ThinInValue(j) - anchorY) / (x - anchorX);
+        if (write != candidate) this->MoveKey(write, candidate);
         ++write;
+      }
+    } else {
+      for (unsigned int i = first + 1; i < last; ++i) {
+        const bool drop = zvIsSameParameter(this->ValueAsDouble(i), this->ValueAsDouble(i - 1)) &&
+                          (this->GetKeyFlags(i) & (CFCFlag_ValueLock | CFCFlag_ParameterLock)) == 0;
+        if (drop) {
+          curve.RemoveKeyUserData(keys[i].parameter);
+        } else {
+          if (write != i) this->MoveKey(write, i);
+          ++write;
+        }
       }
     }
     if (write == last) return 0;
@@ -518,42 +362,49 @@ class CFCBaseImpl : public Store {
     curve.ScaleAllKeyUserData(factor);
   }
 
-  // The key nearest to t: the key on it, else the nearer neighbour, the earlier on a tie.
-  unsigned int NearestKeyIndex(double t) const {
-    int found;
-    const unsigned int at = LocateParameter(t, found);
-    if (found) return at - 1;
-    if (at == 0) return 0;
-    if (at >= keys.size) return keys.size - 1;
-    const double before = t - keys[at - 1].parameter, after = keys[at].parameter - t;
-    return after < before ? at : at - 1;
-  }
+  // ---- Redraw boxes -------------------------------------------------------------------------
 
-  // The last key that stays left of a merged interval and the first that stays right of it;
-  // -1 and the key count stand for "none".
-  void MergeBounds(double start, double end, int excludeStart, int excludeEnd, long& left,
-                   long& right) const {
-    int found;
-    left = static_cast<long>(LocateParameter(start, found)) - 1;
-    if (found && !excludeStart) --left;
-    right = static_cast<long>(LocateParameter(end, found));
-    if (found && excludeEnd) --right;
-  }
-
- private:
-  // Does t lie in [key[lo], key[lo + 1])? `hit` receives lo.
-  bool InPair(double t, unsigned int lo, unsigned int& hit) const {
-    if (t >= keys[lo].parameter && keys[lo + 1].parameter > t) {
-      hit = lo;
-      return true;
+  // The box of key i with its neighbours, the steps included: what must be redrawn when the key
+  // changes.
+  int ComputeKeyExtent(unsigned int i, ZvExtent2<double>& extent) const {
+    const unsigned int n = keys.size;
+    if (i >= n) return 0;
+    extent = ZvExtent2<double>();
+    const double before =
+        i > 0 ? this->ValueAsDouble(i - 1) : static_cast<double>(this->ValueLeftOfFirstKey());
+    extent.AddPoint(ZvPoint2<double>{keys[i].parameter, before});
+    extent.AddPoint(ZvPoint2<double>{keys[i].parameter, this->ValueAsDouble(i)});
+    if (i > 0) extent.AddPoint(ZvPoint2<double>{keys[i - 1].parameter, before});
+    if (i + 1 < n) {
+      extent.AddPoint(ZvPoint2<double>{keys[i + 1].parameter, this->ValueAsDouble(i)});
+      extent.AddPoint(ZvPoint2<double>{keys[i + 1].parameter, this->ValueAsDouble(i + 1)});
     }
-    return false;
+    return 1;
   }
-  unsigned int Hit(double t, unsigned int lo, int& found) const {
-    found = t - keys[lo].parameter <= kCFCParameterEpsilon;
-    this->searchHint = lo;
-    return lo + 1;
+
+  int ComputeNeighboringKeysExtent(double t, ZvExtent2<double>& extent) const {
+    return NeighboringKeysExtent(*this, t, extent);
   }
+
+  // On a key that key's box; between keys the union of both; beyond the ends the end key's.
+  // Impl supplies ComputeKeyExtent, so that the standard curve adds its handles.
+  template <class Impl>
+  static int NeighboringKeysExtent(const Impl& impl, double t, ZvExtent2<double>& extent) {
+    const unsigned int n = impl.keys.size;
+    if (n == 0) return 0;
+    int found;
+    const unsigned int at = impl.LocateParameter(t, found);
+    if (found) return impl.ComputeKeyExtent(at - 1, extent);
+    if (at == 0) return impl.ComputeKeyExtent(0, extent);
+    if (at >= n) return impl.ComputeKeyExtent(n - 1, extent);
+    ZvExtent2<double> other;
+    impl.ComputeKeyExtent(at - 1, extent);
+    impl.ComputeKeyExtent(at, other);
+    extent.Union(other);
+    return 1;
+  }
+
+  // The key nearest to t: the key on it, else the nearer neighbour, the earlier on a tie.
 };
 
 #endif

@@ -87,6 +87,9 @@ class CFCKeyStoreA {
   }
   void MoveKeyParameter(unsigned int i, double p) { keys[i].parameter = p; }
   void ScaleKeyParameter(unsigned int i, double f) { keys[i].parameter *= f; }
+  // Key reduction drops repeated values.
+  static constexpr bool kThinsAlongLines = false;
+
   // The value in force just after the key at `before`, up to the next key: a step.
   T ValueAfterKey(unsigned int before, double) const { return keys[before].value; }
 
@@ -166,6 +169,12 @@ class CFCKeyStoreB {
   void MoveKey(unsigned int to, unsigned int from) { keys[to] = keys[from]; }
   void MoveKeyParameter(unsigned int i, double p) { keys[i].parameter = p; }
   void ScaleKeyParameter(unsigned int i, double f) { keys[i].parameter *= f; }
+  // Key reduction thins along lines, through the single values, locks unknown.
+  static constexpr bool kThinsAlongLines = true;
+  double ThinInValue(unsigned int i) const { return keys[i].value; }
+  double ThinOutValue(unsigned int i) const { return keys[i].value; }
+  bool ThinMayDrop(unsigned int) const { return true; }
+
   // The polyline between the key at `before` and the next one.
   T ValueAfterKey(unsigned int before, double t) const {
     const Key& a = keys[before];
@@ -252,6 +261,22 @@ class CFCKeyStoreC {
 
   T ValueLeftOfFirstKey() const { return keys.size ? keys[0].leftValue : valueWhenNoKeys; }
   void KeepValueLeftOfFirstKey(T) {}
+
+  // Key reduction thins runs of constant and linear segments along lines. A key arrives with
+  // its effective left value (the step's value across a constant segment) and leaves with its
+  // right value; a key touching a cubic segment, or holding a value or parameter lock, stays.
+  static constexpr bool kThinsAlongLines = true;
+  double ThinInValue(unsigned int i) const {
+    return i > 0 && keys[i - 1].segmentKind == ZvBaseFCurve::ConstantSegment
+               ? keys[i - 1].rightValue
+               : keys[i].leftValue;
+  }
+  double ThinOutValue(unsigned int i) const { return keys[i].rightValue; }
+  bool ThinMayDrop(unsigned int i) const {
+    return (keys[i].flags & (CFCFlag_ValueLock | CFCFlag_ParameterLock)) == 0 &&
+           keys[i].segmentKind != ZvBaseFCurve::CubicSegment && i > 0 &&
+           keys[i - 1].segmentKind != ZvBaseFCurve::CubicSegment;
+  }
 };
 
 #endif

@@ -46,10 +46,10 @@ ZvStdFCurve::ZvStdFCurve(const ZvPoint2<double>& p0, const ZvPoint2<double>& p1,
   m_impl->keys.Add(b);
 }
 
-ZvStdFCurve::ZvStdFCurve(const ZvStdFCurve& other) : ZvBaseFCurve(other), m_impl(nullptr) {
-  ZvFCurveLockGuard guard(other);
-  m_impl = new ZvStdFCurveImpl(*other.m_impl);
-}
+ZvStdFCurve::ZvStdFCurve(const ZvStdFCurve& other) : ZvStdFCurve(other, ZvFCurveLockGuard(other)) {}
+
+ZvStdFCurve::ZvStdFCurve(const ZvStdFCurve& other, const ZvFCurveLockGuard&)
+    : ZvBaseFCurve(other), m_impl(new ZvStdFCurveImpl(*other.m_impl)) {}
 
 ZvStdFCurve::~ZvStdFCurve() {
   delete m_impl;
@@ -98,8 +98,8 @@ unsigned int ZvStdFCurve::CreateKey(double parameter, double value) {
 
 unsigned int ZvStdFCurve::CreateKey(double parameter, double value, FSKind left, FSKind right) {
   ZvFCurveLockGuard guard(*this);
-  if (m_impl->readOnly || !std::isfinite(parameter) || left > CubicSegment ||
-      right > CubicSegment) {
+  if (m_impl->readOnly || !std::isfinite(parameter) || !std::isfinite(value) ||
+      left > CubicSegment || right > CubicSegment) {
     return 0;
   }
   return m_impl->CreateKey(parameter, value, left, right, *this);
@@ -110,7 +110,10 @@ unsigned int ZvStdFCurve::MergeAndCreateKey(double start, double end, double par
                                             int keepAttributes) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
-  if (s.readOnly || !std::isfinite(parameter)) return 0;
+  if (s.readOnly || !std::isfinite(parameter) || !std::isfinite(value) || !std::isfinite(start) ||
+      !std::isfinite(end)) {
+    return 0;
+  }
   if (AreAnyParametersLockedInInterval(start, end, excludeStart, excludeEnd) ||
       AreAnyValuesLockedInInterval(start, end, excludeStart, excludeEnd)) {
     return 0;
@@ -197,7 +200,7 @@ unsigned int ZvStdFCurve::RemoveKey(double parameter, double tolerance) {
 unsigned int ZvStdFCurve::RemoveKeys(double start, double end, int excludeStart, int excludeEnd) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
-  if (s.readOnly) return 0;
+  if (s.readOnly || !std::isfinite(start) || !std::isfinite(end)) return 0;
   if (zvIsSameParameter(start, end) && excludeStart != excludeEnd) excludeStart = excludeEnd = 0;
   if (AreAnyParametersLockedInInterval(start, end, excludeStart, excludeEnd) ||
       AreAnyValuesLockedInInterval(start, end, excludeStart, excludeEnd)) {
@@ -248,7 +251,7 @@ unsigned int ZvStdFCurve::RemoveTail(double parameter) {
 
 unsigned int ZvStdFCurve::SetValueWhenNoKeys(double value) {
   ZvFCurveLockGuard guard(*this);
-  if (m_impl->readOnly) return 0;
+  if (m_impl->readOnly || !std::isfinite(value)) return 0;
   m_impl->valueWhenNoKeys = value;
   return 1;
 }
@@ -278,7 +281,10 @@ unsigned int ZvStdFCurve::SetKeyValue(double parameter, KeySide side, double val
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
   unsigned int i;
-  if (s.readOnly || !s.GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
+  if (s.readOnly || !std::isfinite(value) ||
+      !s.GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) {
+    return 0;
+  }
   CFCStdKey& k = s.keys[i];
   if (k.flags & CFCFlag_ValueLock) return 0;
   if (side == LeftSide) {

@@ -352,16 +352,5 @@ int ZvStdFCurveImpl::ComputeKeyExtent(unsigned int i, ZvExtent2<double>& extent)
 }
 
 int ZvStdFCurveImpl::ComputeNeighboringKeysExtent(double t, ZvExtent2<double>& extent) const {
-  const unsigned int n = keys.size;
-  if (n == 0) return 0;
-  int found;
-  const unsigned int at = LocateParameter(t, found);
-  if (found) return ComputeKeyExtent(at - 1, extent);
-  if (at == 0) return ComputeKeyExtent(0, extent);
-  if (at >= n) return ComputeKeyExtent(n - 1, extent);
-  ZvExtent2<double> other;
-  ComputeKeyExtent(at - 1, extent);
-  ComputeKeyExtent(at, other);
-  extent.Union(other);
-  return 1;
+  return NeighboringKeysExtent(*this, t, extent);
 }

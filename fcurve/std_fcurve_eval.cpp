@@ -133,8 +133,6 @@ double ZvStdFCurveImpl::EvalLeft(double t) const {
   return EvalJustAfterIndex(t, at - 1);
 }
 
-// Brings t into the keyed range for the cycle with offset and counts the periods. The right
-// version sends a whole number of periods to the last key, the left version to the first.
 double ZvStdFCurveImpl::CycleOffsetFold(double t, int& cycles, bool left) const {
   const unsigned int n = keys.size;
   const double first = keys[0].parameter, last = keys[n - 1].parameter;

@@ -96,6 +96,7 @@ void ZvStdFCurveImpl::RegularizeRightTgt(unsigned int i, const ZvPoint2<double>&
 // function.
 int ZvStdFCurveImpl::SetActualKeyTgtHandle(unsigned int i, int side,
                                            const ZvPoint2<double>& relative) {
+  if (!std::isfinite(relative.x) || !std::isfinite(relative.y)) return 0;
   CFCStdKey& k = keys[i];
   if (side == ZvBaseFCurve::LeftSide) {
     const ZvPoint2<double> h{k.parameter + relative.x, k.leftValue + relative.y};

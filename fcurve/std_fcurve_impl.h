@@ -40,6 +40,10 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
   double EvalLeft(double t) const;
   double EvalRightUsingExtrapolationMethod(double t) const;
   double EvalLeftUsingExtrapolationMethod(double t) const;
+  // Brings t into the keyed range for the cycle with offset and counts the periods (two keys or
+  // more). The right version sends a whole number of periods to the last key, the left version
+  // to the first.
+  double CycleOffsetFold(double t, int& cycles, bool left) const;
   double Clamp(double v) const {
     if (v <= minClamp) return minClamp;
     if (v >= maxClamp) return maxClamp;
@@ -113,7 +117,6 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
 
  private:
   double EvaluatedRightX(unsigned int i) const;
-  double CycleOffsetFold(double t, int& cycles, bool left) const;
 };
 
 #endif

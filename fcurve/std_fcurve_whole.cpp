@@ -66,7 +66,7 @@ unsigned int ZvStdFCurve::ScaleParameterAxis(double factor) {
 unsigned int ZvStdFCurve::ShiftValues(double delta) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
-  if (s.readOnly || AnyKeyHas(s, CFCFlag_ValueLock)) return 0;
+  if (s.readOnly || !std::isfinite(delta) || AnyKeyHas(s, CFCFlag_ValueLock)) return 0;
   MapValues(s, 1.0, delta);
   return 1;
 }
@@ -74,7 +74,10 @@ unsigned int ZvStdFCurve::ShiftValues(double delta) {
 unsigned int ZvStdFCurve::ScaleAndShiftValues(double scale, double offset) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
-  if (s.readOnly || AnyKeyHas(s, CFCFlag_ValueLock)) return 0;
+  if (s.readOnly || !std::isfinite(scale) || !std::isfinite(offset) ||
+      AnyKeyHas(s, CFCFlag_ValueLock)) {
+    return 0;
+  }
   MapValues(s, scale, offset);
   return 1;
 }
@@ -87,12 +90,32 @@ unsigned int ZvStdFCurve::MirrorValues() {
   return 1;
 }
 
+// Under the cycle methods the interval is folded into the keyed range first: within one period
+// the folded interval is resampled; across a period boundary the two folded pieces up to the
+// ends of the keys; over more than a period the whole key range.
 unsigned int ZvStdFCurve::ResampleSequence(double start, double end, double step,
                                            int keepExistingKeys, int) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
   if (s.readOnly || !std::isfinite(start) || !std::isfinite(end)) return 0;
-  return ZvStdFCurveImpl::Engine::ResampleKeys(s, start, end, step, keepExistingKeys, *this);
+  using Engine = ZvStdFCurveImpl::Engine;
+  const unsigned int n = s.keys.size;
+  if ((s.extrapolation != CycleExtrapolation && s.extrapolation != CycleWithOffsetExtrapolation) ||
+      n < 2) {
+    return Engine::ResampleKeys(s, start, end, step, keepExistingKeys, *this);
+  }
+  const double first = s.keys[0].parameter, last = s.keys[n - 1].parameter;
+  int startCycle, endCycle;
+  const double foldedStart = s.CycleOffsetFold(start, startCycle, true);
+  const double foldedEnd = s.CycleOffsetFold(end, endCycle, false);
+  if (startCycle == endCycle) {
+    return Engine::ResampleKeys(s, foldedStart, foldedEnd, step, keepExistingKeys, *this);
+  }
+  if (end - start <= last - first) {
+    if (!Engine::ResampleKeys(s, first, foldedEnd, step, keepExistingKeys, *this)) return 0;
+    return Engine::ResampleKeys(s, foldedStart, last, step, keepExistingKeys, *this);
+  }
+  return Engine::ResampleKeys(s, first, last, step, keepExistingKeys, *this);
 }
 
 unsigned int ZvStdFCurve::SmoothSequence(double start, double end, const double* kernel,

@@ -18,6 +18,10 @@
 // Sequential evaluation, parameter after parameter, costs constant time per call: the search for
 // the segment starts from where the last one ended. Every public operation takes the curve's
 // lock, queries included.
+//
+// Not available yet; these refuse with 0 (or null) and change nothing: SnapShot, Cut, Append,
+// Paste, ReduceNumKeys, EvalSequence, Flatten, FlattenFromTo, MirrorParameters,
+// ScaleAndOffsetParameters, GetBufferSize, WriteToBuffer, ReadFromBufferBody.
 #ifndef ZV_STD_FCURVE_H
 #define ZV_STD_FCURVE_H
 
@@ -26,6 +30,7 @@
 #include <zv/point.h>
 
 class ZvStdFCurveImpl;
+class ZvFCurveLockGuard;
 
 class ZV_API ZvStdFCurve : public ZvBaseFCurve {
  public:
@@ -102,7 +107,6 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   double GetValueUpperBound(int clamped) const override;
   double GetValueLowerBound(int clamped) const override;
   double Eval(double parameter, int clamped) const override;
-  // Samples from start to end by step (positive), read off the flattened curve.
   unsigned int EvalSequence(double start, double end, double step, double tolerance,
                             ZvDoubleArray& parameters, ZvDoubleArray& values,
                             int clamped) const override;
@@ -189,6 +193,9 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   unsigned int IsValid() const;
 
  private:
+  // Copies under the source's lock, held from before the user data is copied until the keys are.
+  ZvStdFCurve(const ZvStdFCurve& other, const ZvFCurveLockGuard& sourceLock);
+
   ZvStdFCurveImpl* m_impl;
 };
 

@@ -6,6 +6,7 @@
 #include <zv/std_fcurve.h>
 
 #include "fcurve/cfc_base_impl.h"
+#include "fcurve/std_fcurve_impl.h"
 
 namespace {
 
@@ -175,6 +176,33 @@ TEST(KeystoreEdit, ReduceDropsRepeatedUnlockedValues) {
   EXPECT_EQ(two.ReduceNumKeys(0, 1, 0.0, owner.curve), 0u);
 }
 
+TEST(KeystoreEdit, RawAndStandardStoresThinAlongLines) {
+  Owner owner;
+  RawStore raw;
+  const double values[] = {0.0, 1.0, 2.0, 3.05, 4.0, 9.0, 10.0};
+  for (unsigned int i = 0; i < 7; ++i)
+    raw.InsertKey(i, i, values[i]);
+  // Keys 1, 2 and 3 lie on the line from key 0 within 0.1; key 4 too, but key 5 leaves it,
+  // so key 4 stays and the line restarts there.
+  EXPECT_EQ(raw.ReduceNumKeys(0, 6, 0.1, owner.curve), 3u);
+  ASSERT_EQ(raw.keys.size, 4u);
+  EXPECT_EQ(raw.keys[1].parameter, 4.0);
+  EXPECT_EQ(raw.keys[2].parameter, 5.0);
+  EXPECT_EQ(raw.keys[3].parameter, 6.0);
+
+  ZvStdFCurveImpl line(0.0, ZvBaseFCurve::LinearSegment);
+  for (unsigned int i = 0; i < 5; ++i) {
+    line.InsertKey(i, i, i < 4 ? i : 7.0);
+    line.keys[i].segmentKind = ZvBaseFCurve::LinearSegment;
+  }
+  line.SetConstraint(1, ZvBaseFCurve::ValueLock, 1);
+  line.keys[3].segmentKind = ZvBaseFCurve::CubicSegment;      // key 3 starts a cubic: it stays
+  EXPECT_EQ(line.ReduceNumKeys(0, 4, 0.0, owner.curve), 1u);  // only key 2 goes
+  ASSERT_EQ(line.keys.size, 4u);
+  EXPECT_EQ(line.keys[1].parameter, 1.0);
+  EXPECT_EQ(line.keys[2].parameter, 3.0);
+}
+
 TEST(KeystoreEdit, ResampleWithALongStepKeepsOnlyTheEnds) {
   Owner owner;
   IntStore s = MakeInts({{0.0, 10}, {1.0, 20}, {2.0, 30}});
@@ -191,6 +219,23 @@ TEST(KeystoreEdit, ResampleWithALongStepKeepsOnlyTheEnds) {
     EXPECT_DOUBLE_EQ(grid.keys[i].parameter, 0.25 * i);
   EXPECT_EQ(grid.keys[1].value, 1);
   EXPECT_EQ(grid.keys[2].value, 2);  // the step of the removed key at 0.3
+}
+
+TEST(KeystoreEdit, RedrawBoxesCoverTheStepsAroundAKey) {
+  IntStore s = MakeInts({{0.0, 5}, {2.0, 1}, {3.0, 8}});
+  s.valueBeforeFirstKey = -2;
+  ZvExtent2<double> box;
+  ASSERT_EQ(s.ComputeKeyExtent(1, box), 1);
+  EXPECT_EQ(box.xmin, 0.0);
+  EXPECT_EQ(box.xmax, 3.0);
+  EXPECT_EQ(box.ymin, 1.0);
+  EXPECT_EQ(box.ymax, 8.0);
+  ASSERT_EQ(s.ComputeNeighboringKeysExtent(-1.0, box), 1);
+  EXPECT_EQ(box.ymin, -2.0);  // the step into the first key
+  ASSERT_EQ(s.ComputeNeighboringKeysExtent(2.5, box), 1);
+  EXPECT_EQ(box.xmin, 0.0);
+  EXPECT_EQ(box.xmax, 3.0);
+  EXPECT_EQ(s.ComputeKeyExtent(3, box), 0);
 }
 
 TEST(KeystoreEdit, SmoothingConvolvesThroughTheOwner) {

@@ -265,6 +265,28 @@ TEST(StdCurveAnalysis, BoundsAreThoseOfTheControlPolygons) {
   EXPECT_EQ(ZvStdFCurve(5.0).GetValueUpperBound(0), 5.0);
 }
 
+TEST(StdCurveAnalysis, RedrawBoxesIncludeTheEvaluatedHandles) {
+  ZvStdFCurveImpl s = Keys({{0, 0}, {3, 6}, {6, 0}});
+  s.keys[1].leftTangent = {2, 9};
+  s.keys[1].rightTangent = {4, 3};
+  s.keys[0].rightTangent = {1, -2};
+  ZvExtent2<double> box;
+  ASSERT_EQ(s.ComputeKeyExtent(1, box), 1);
+  EXPECT_EQ(box.xmin, 0.0);
+  EXPECT_EQ(box.xmax, 6.0);
+  EXPECT_EQ(box.ymin, -2.0);  // the previous key's handle into the segment
+  EXPECT_EQ(box.ymax, 9.0);
+  s.keys[1].flags = CFCFlag_CollapsedTangent;
+  ASSERT_EQ(s.ComputeKeyExtent(1, box), 1);
+  EXPECT_EQ(box.ymax, 6.0);
+  ASSERT_EQ(s.ComputeNeighboringKeysExtent(4.5, box), 1);
+  EXPECT_EQ(box.xmin, 0.0);
+  EXPECT_EQ(box.xmax, 6.0);
+  ASSERT_EQ(s.ComputeNeighboringKeysExtent(9.0, box), 1);
+  EXPECT_EQ(box.xmin, 3.0);
+  EXPECT_EQ(s.ComputeKeyExtent(3, box), 0);
+}
+
 TEST(StdCurveAnalysis, InversionOfMonotoneCurves) {
   ZvStdFCurve rising({0, 0}, {1, 0.5}, {2, 2.5}, {3, 3});
   rising.CreateKey(4.0, 5.0, C::LinearSegment, C::LinearSegment);

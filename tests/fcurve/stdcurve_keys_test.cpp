@@ -204,6 +204,31 @@ TEST(StdCurveKeys, HandlesAndSegmentKinds) {
   EXPECT_EQ(line.GetFirstSegmentKind(), C::ConstantSegment);
 }
 
+TEST(StdCurveKeys, BadInputIsRefusedAndChangesNothing) {
+  ZvStdFCurve curve = Wave();
+  const std::vector<double> before = Sample(curve, -1.0, 8.5, 100);
+  const double nan = std::nan(""), inf = HUGE_VAL;
+  EXPECT_EQ(curve.CreateKey(1.0, nan), 0u);
+  EXPECT_EQ(curve.CreateKey(inf, 1.0), 0u);
+  EXPECT_EQ(curve.CreateKey(1.0, 1.0, static_cast<C::FSKind>(7), C::LinearSegment), 0u);
+  EXPECT_EQ(curve.MergeAndCreateKey(nan, 3.0, 1.0, 1.0, 0, 0, 0), 0u);
+  EXPECT_EQ(curve.RemoveKeys(nan, nan, 0, 0), 0u);
+  EXPECT_EQ(curve.SetKeyValue(1.5, C::RightSide, inf, 0.0), 0u);
+  EXPECT_EQ(curve.SetKeyTgtHandle(0.0, C::LeftSide, {nan, 1.0}, 0.0), 0u);
+  EXPECT_EQ(curve.SetValueWhenNoKeys(nan), 0u);
+  EXPECT_EQ(curve.ShiftValues(nan), 0u);
+  EXPECT_EQ(curve.ScaleAndShiftValues(1.0, inf), 0u);
+  EXPECT_EQ(curve.ShiftParameters(inf), 0u);
+  EXPECT_EQ(curve.ResampleSequence(0.0, 7.5, 0.0, 0, 0), 0u);
+  EXPECT_EQ(curve.SmoothSequence(0.0, 7.5, nullptr, 3), 0u);
+  EXPECT_EQ(curve.SetClampingValues(nan, 1.0), 0u);
+  double found;
+  EXPECT_EQ(curve.EvalInverse(nan, found, 0), 0u);
+  EXPECT_EQ(curve.GetNumKeys(), 6u);
+  EXPECT_EQ(curve.IsValid(), 1u);
+  ExpectSameShape(before, Sample(curve, -1.0, 8.5, 100), 0.0);
+}
+
 TEST(StdCurveKeys, CopiesAreIndependent) {
   ZvStdFCurve curve = Wave();
   ZvBaseFCurve* clone = curve.Clone();
@@ -293,6 +318,19 @@ TEST(StdCurveKeys, WholeCurveMoves) {
   ExpectSameShape(shape, Sample(grid, 0.0, 7.5, 60), 1e-9);
   ASSERT_EQ(grid.ResampleSequence(0.0, 7.5, 2.5, 0, 0), 1u);
   EXPECT_EQ(grid.GetNumKeys(), 4u);
+
+  // Under a cycle method the interval is folded into the keys first.
+  ZvStdFCurve cycled = Wave();
+  cycled.SetExtrapolationMethod(C::CycleExtrapolation);
+  ASSERT_EQ(cycled.ResampleSequence(9.0, 10.5, 0.5, 1, 0), 1u);
+  EXPECT_EQ(cycled.GetNumKeys(), 8u);
+  EXPECT_EQ(cycled.IsKeyParameter(2.5, 1e-12), 1u);
+  ASSERT_EQ(cycled.ResampleSequence(6.5, 8.5, 0.5, 1, 0), 1u);  // across a period boundary
+  EXPECT_EQ(cycled.GetNumKeys(), 12u);
+  EXPECT_EQ(cycled.IsKeyParameter(0.5, 1e-12), 1u);
+  EXPECT_EQ(cycled.IsKeyParameter(7.0, 1e-12), 1u);
+  cycled.SetExtrapolationMethod(C::ConstantExtrapolation);
+  ExpectSameShape(shape, Sample(cycled, 0.0, 7.5, 60), 1e-9);
 }
 
 }  // namespace

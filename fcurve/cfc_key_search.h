@@ -1,0 +1,241 @@
+// The search layer of the key engine: the hinted locate, the nearest key in a centred interval,
+// key intervals, folding under the cycle methods, and the KeyFlags constraint bits.
+//
+// The search writes the hint even in const queries, so it runs under the owning curve's lock
+// like everything else in the engine.
+#ifndef ZV_FCURVE_CFC_KEY_SEARCH_H
+#define ZV_FCURVE_CFC_KEY_SEARCH_H
+
+#include <zv/fcurve.h>
+
+#include "fcurve/cfc_key_store.h"
+#include "fcurve/key_params.h"
+
+#include <cmath>
+
+// Identity of stored parameters.
+constexpr double kCFCParameterEpsilon = 1e-15;
+// An evaluation parameter within this of a key is taken as the key.
+constexpr double kCFCSnapTolerance = 1e-12;
+
+template <class T, class Key, class Store>
+class CFCKeySearch : public Store {
+ public:
+  using Store::keys;
+
+  // ---- Search -------------------------------------------------------------------------------
+
+  // The number of keys at or below t, i.e. the index of the first key above t; `found` tells
+  // whether t lies on a key (then the result minus 1). Never on an empty store.
+  //
+  // The ends and the two-key neighbourhood of the hint compare with the parameter epsilon; the
+  // bisection compares exactly, deliberately, so a t a hair above a key far from the hint
+  // counts as after the key. Below 12 keys the neighbourhood is skipped.
+  unsigned int LocateParameter(double t, int& found) const {
+    const unsigned int n = keys.size;
+    const Key* k = keys.data;
+    if (k[0].parameter >= t) {
+      this->searchHint = 0;
+      found = zvIsSameParameter(t, k[0].parameter);
+      return found ? 1 : 0;
+    }
+    if (t >= k[n - 1].parameter) {
+      this->searchHint = n - 1;
+      found = t - k[n - 1].parameter <= kCFCParameterEpsilon;
+      return n;
+    }
+    const unsigned int c = this->searchHint < n - 1 ? this->searchHint : n - 1;
+    const unsigned int back = c < 2 ? c : 2;
+    const unsigned int forward = n - 1 - c < 2 ? n - 1 - c : 2;
+    this->searchHint = c;
+    const double lowEnd = k[c - back].parameter, highEnd = k[c + forward].parameter;
+    if (n - 1 >= 11 && t >= lowEnd && highEnd >= t) {
+      unsigned int hit;
+      if (forward > 0 && (InPair(t, c, hit) || InPair(t, c + forward - 1, hit))) {
+        return Hit(t, hit, found);
+      }
+      if (back > 0 && (InPair(t, c - back, hit) || InPair(t, c - 1, hit))) {
+        return Hit(t, hit, found);
+      }
+      if (zvIsSameParameter(t, highEnd)) {
+        found = 1;
+        this->searchHint = c + forward;
+        return c + forward + 1;
+      }
+    }
+    unsigned int low = 0, high = n - 1;
+    if (lowEnd > t) {
+      high = c - back;
+    } else if (t > highEnd) {
+      low = c + forward;
+    }
+    while (high - low > 1) {
+      const unsigned int mid = (low + high) / 2;
+      if (t > k[mid].parameter) {
+        low = mid;
+      } else {
+        high = mid;
+        if (t >= k[mid].parameter) {  // exact equality, on purpose
+          this->searchHint = mid;
+          found = 1;
+          return mid + 1;
+        }
+      }
+    }
+    this->searchHint = low;
+    found = 0;
+    return low + 1;
+  }
+
+  // The key nearest to t among those in [t - tolerance, t + tolerance]; of equal distances the
+  // earlier. 0 when there is none.
+  int GetClosestKeyIndexInCenteredInterval(double t, double tolerance, unsigned int& index) const {
+    const unsigned int n = keys.size;
+    if (n == 0) return 0;
+    const double lo = t - tolerance, hi = t + tolerance;
+    int found;
+    unsigned int start = LocateParameter(lo, found);
+    if (found) --start;
+    if (start >= n) return 0;
+    if (!(hi >= keys[start].parameter)) return 0;
+    unsigned int last = start;
+    while (!zvIsSameParameter(keys[last].parameter, hi) && last + 1 < n &&
+           keys[last + 1].parameter - hi <= kCFCParameterEpsilon) {
+      ++last;
+    }
+    unsigned int best = start;
+    double bestDistance = std::fabs(t - keys[start].parameter);
+    for (unsigned int i = start + 1; i <= last; ++i) {
+      const double d = std::fabs(t - keys[i].parameter);
+      if (d < bestDistance) {
+        bestDistance = d;
+        best = i;
+      }
+    }
+    index = best;
+    return 1;
+  }
+
+  // The first and last index of the keys in the interval. 0, with `first` and `last` left
+  // alone, when it holds none.
+  int GetKeyIndicesInInterval(double start, double end, unsigned int& first, unsigned int& last,
+                              int excludeStart, int excludeEnd) const {
+    const unsigned int n = keys.size;
+    if (n == 0) return 0;
+    if (excludeStart && excludeEnd && zvIsSameParameter(start, end)) return 0;
+    int found;
+    long f = static_cast<long>(LocateParameter(start, found));
+    if (found && !excludeStart) --f;
+    long l = static_cast<long>(LocateParameter(end, found)) - 1;
+    if (found && excludeEnd) --l;
+    if (f > l || f >= static_cast<long>(n) || l < 0) return 0;
+    first = static_cast<unsigned int>(f);
+    last = static_cast<unsigned int>(l);
+    return 1;
+  }
+
+  // Under the cycle methods, brings t into the keyed range and onto a key within the snap
+  // tolerance. Nothing happens with fewer than two keys or another method.
+  void FoldParameter(double& t) const {
+    const unsigned int n = keys.size;
+    if ((this->extrapolation != 3 && this->extrapolation != 4) || n < 2) return;
+    const double first = keys[0].parameter, last = keys[n - 1].parameter;
+    const double period = last - first;
+    if (t > last) {
+      t = first + std::fmod(t - first, period);
+    } else if (t < first) {
+      t = last - std::fmod(first - t, period);
+    }
+    if (t < first) t = first;
+    if (t > last) t = last;
+    unsigned int i;
+    if (GetClosestKeyIndexInCenteredInterval(t, kCFCSnapTolerance, i)) t = keys[i].parameter;
+  }
+
+  // Folds t and moves both bounds by the same displacement, then orders the bounds and clamps
+  // t into them.
+  void FoldBoundsAndParameter(double& start, double& end, double& t) const {
+    const double before = t;
+    FoldParameter(t);
+    const double shift = t - before;
+    start += shift;
+    end += shift;
+    if (start > end) {
+      const double s = start;
+      start = end;
+      end = s;
+    }
+    if (t < start) t = start;
+    if (t > end) t = end;
+  }
+
+  // ---- Constraints --------------------------------------------------------------------------
+
+  // `code` may combine several codes; each sets or clears the bits its store knows for it.
+  int SetConstraint(unsigned int index, unsigned int code, int on) {
+    unsigned short bits = 0;
+    for (unsigned int c = 1; c != 0 && c <= code; c <<= 1) {
+      if (code & c) bits |= Store::ConstraintBits(c);
+    }
+    const unsigned short f = this->GetKeyFlags(index);
+    this->SetKeyFlags(index, static_cast<unsigned short>(on ? (f | bits) : (f & ~bits)));
+    return 1;
+  }
+
+  // Exactly one code. A code of several bits (the whole-key lock) reads true only when all are
+  // set; an unknown code reads 0.
+  int GetConstraint(unsigned int index, unsigned int code) const {
+    const unsigned short bits = Store::ConstraintBits(code);
+    if (bits == 0) return 0;
+    return (this->GetKeyFlags(index) & bits) == bits ? 1 : 0;
+  }
+
+  // 1 when a key of the interval has all of `bits` in its KeyFlags.
+  int AnyKeyHasFlagsInInterval(double start, double end, int excludeStart, int excludeEnd,
+                               unsigned short bits) const {
+    unsigned int first, last;
+    if (!GetKeyIndicesInInterval(start, end, first, last, excludeStart, excludeEnd)) return 0;
+    for (unsigned int i = first; i <= last; ++i) {
+      if ((this->GetKeyFlags(i) & bits) == bits) return 1;
+    }
+    return 0;
+  }
+
+  unsigned int NearestKeyIndex(double t) const {
+    int found;
+    const unsigned int at = LocateParameter(t, found);
+    if (found) return at - 1;
+    if (at == 0) return 0;
+    if (at >= keys.size) return keys.size - 1;
+    const double before = t - keys[at - 1].parameter, after = keys[at].parameter - t;
+    return after < before ? at : at - 1;
+  }
+
+  // The last key that stays left of a merged interval and the first that stays right of it;
+  // -1 and the key count stand for "none".
+  void MergeBounds(double start, double end, int excludeStart, int excludeEnd, long& left,
+                   long& right) const {
+    int found;
+    left = static_cast<long>(LocateParameter(start, found)) - 1;
+    if (found && !excludeStart) --left;
+    right = static_cast<long>(LocateParameter(end, found));
+    if (found && excludeEnd) --right;
+  }
+
+ private:
+  // Does t lie in [key[lo], key[lo + 1])? `hit` receives lo.
+  bool InPair(double t, unsigned int lo, unsigned int& hit) const {
+    if (t >= keys[lo].parameter && keys[lo + 1].parameter > t) {
+      hit = lo;
+      return true;
+    }
+    return false;
+  }
+  unsigned int Hit(double t, unsigned int lo, int& found) const {
+    found = t - keys[lo].parameter <= kCFCParameterEpsilon;
+    this->searchHint = lo;
+    return lo + 1;
+  }
+};
+
+#endif
