@@ -37,6 +37,7 @@ template <class Array>
 int FitBezier(const Array& points, const ZvDoubleArray& chords, unsigned int first,
               unsigned int last, unsigned int d, const ZvFitControl* ctl, ZvPoint2<double>* out,
               double* handle) {
+  if (d > 8 || last <= first) return 0;
   const unsigned int n = last - first;
   ZvMatrix A(0, static_cast<int>(n), 0, static_cast<int>(d));
   ZvMatrix H(0, static_cast<int>(d), 0, static_cast<int>(d));
