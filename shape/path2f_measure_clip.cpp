@@ -1,9 +1,18 @@
 // Flattening of the closed subpaths of ZvPath2f, clipped as polygons, for the rasterisers.
 //
 // The rasterisers must never see coordinates far outside their raster, so each closed subpath
-// is clipped to the caller's extent by four Sutherland-Hodgman passes. The output polygon keeps
-// the winding of the input and lies inside the extent, bounds included.
+// is clipped to the caller's extent by four Sutherland-Hodgman passes, in the order x >= xmin,
+// y >= ymin, x <= xmax, y <= ymax. The output polygon keeps the winding of the input and lies
+// inside the extent, bounds included.
+//
+// A pass over a polygon wholly inside its half-plane gives the polygon back unchanged, and a
+// curve lies inside the hull of its control points: so the passes whose bound the mapped
+// control points clear are skipped, and a subpath that needs none is flattened straight into
+// the caller's array. This is the common case of a shape inside its raster, and it costs no
+// more per point than flattening alone.
 #include <zv/path2f.h>
+
+#include <cmath>
 
 #include "shape/path2f_measure.h"
 #include "shape/shape_lock.h"
@@ -48,6 +57,51 @@ struct HalfPlane {
   }
 };
 
+struct Clipper {
+  HalfPlane<0, true> left;
+  HalfPlane<1, true> bottom;
+  HalfPlane<0, false> right;
+  HalfPlane<1, false> top;
+
+  void Pass(int which, const ZvPoint2dArray& in, ZvPoint2dArray& out) const {
+    switch (which) {
+      case 0:
+        left.Clip(in.data, in.size, out);
+        break;
+      case 1:
+        bottom.Clip(in.data, in.size, out);
+        break;
+      case 2:
+        right.Clip(in.data, in.size, out);
+        break;
+      default:
+        top.Clip(in.data, in.size, out);
+        break;
+    }
+  }
+};
+
+// The passes (bit k for pass k) that may cut the subpath s..e mapped by `transform`: the box
+// of its control points, mapped as a box, bounds the curve. The flattened points are computed
+// and may stray from the hull by rounding; a box that clears a bound by less than a millionth
+// of its coordinates' size keeps that pass.
+unsigned int PassesNeeded(const ZvPoint2fArray& pts, unsigned int s, unsigned int e,
+                          const ZvTransfo4& transform, const ZvExtent2<double>& extent) {
+  ZvExtent2<double> box;
+  for (unsigned int k = s; k <= e; ++k)
+    box.AddPoint(pts[k]);
+  transform.MapInPlace(box);
+  const double size = std::fmax(std::fmax(std::fabs(box.xmin), std::fabs(box.xmax)),
+                                std::fmax(std::fabs(box.ymin), std::fabs(box.ymax)));
+  const double margin = 1e-6 * (1.0 + size);
+  unsigned int needed = 0;
+  if (!(box.xmin - margin >= extent.xmin)) needed |= 1u;
+  if (!(box.ymin - margin >= extent.ymin)) needed |= 2u;
+  if (!(box.xmax + margin <= extent.xmax)) needed |= 4u;
+  if (!(box.ymax + margin <= extent.ymax)) needed |= 8u;
+  return needed;
+}
+
 }  // namespace
 
 unsigned int ZvPath2f::TransformFlattenAndClipClosedSubPaths(const ZvTransfo4& transform,
@@ -58,37 +112,38 @@ unsigned int ZvPath2f::TransformFlattenAndClipClosedSubPaths(const ZvTransfo4& t
   ZvShapeLock guard(*this);
   if (extent.kind == ZvExtent2<double>::Empty) return 0;
   const bool clip = extent.kind != ZvExtent2<double>::Infinite;
-  const HalfPlane<0, true> left{extent.xmin};
-  const HalfPlane<1, true> bottom{extent.ymin};
-  const HalfPlane<0, false> right{extent.xmax};
-  const HalfPlane<1, false> top{extent.ymax};
+  const Clipper clipper{{extent.xmin}, {extent.ymin}, {extent.xmax}, {extent.ymax}};
 
   ZvBezierTool tool;
   ZvPoint2dArray polygon(64), work(64);
   unsigned int written = 0;
   zvForEachSubpath(*this, [&](unsigned int s, unsigned int e) {
     if (e <= s + 1 || !ZvPath2fMeasure::IsClosed(*this, e)) return;
-    if (polygon.capacity < e - s + 1) polygon.Resize(e - s + 1);
-    polygon.Chop(0);
-    ZvPath2fMeasure::FlattenSubpath<ZvFlattenInDouble>(*this, s, e, &transform, tolerance, polygon,
-                                                       tool);
-    // The end repeats the start: without it the polygon is implicitly closed.
-    polygon.Chop(polygon.size - 1);
-    if (polygon.size == 0) return;
+    const unsigned int needed = clip ? PassesNeeded(points, s, e, transform, extent) : 0u;
     const unsigned int before = out.size;
-    if (!clip) {
-      out.Add(polygon);
+    if (needed == 0) {
+      ZvPath2fMeasure::FlattenSubpath<ZvFlattenInDouble>(*this, s, e, &transform, tolerance, out,
+                                                         tool);
+      out.Chop(out.size - 1);  // the end repeats the start: the polygon closes implicitly
     } else {
-      work.Chop(0);
-      left.Clip(polygon.data, polygon.size, work);
-      if (work.size == 0) return;
       polygon.Chop(0);
-      bottom.Clip(work.data, work.size, polygon);
-      if (polygon.size == 0) return;
-      work.Chop(0);
-      right.Clip(polygon.data, polygon.size, work);
-      if (work.size == 0) return;
-      top.Clip(work.data, work.size, out);
+      ZvPath2fMeasure::FlattenSubpath<ZvFlattenInDouble>(*this, s, e, &transform, tolerance,
+                                                         polygon, tool);
+      polygon.Chop(polygon.size - 1);
+      ZvPoint2dArray* in = &polygon;
+      ZvPoint2dArray* next = &work;
+      for (int pass = 0; pass < 4 && in->size > 0; ++pass) {
+        if (!(needed & (1u << pass))) continue;
+        // The last pass needed writes straight into the caller's array.
+        const bool last = (needed >> (pass + 1)) == 0;
+        ZvPoint2dArray& dst = last ? out : *next;
+        dst.Chop(last ? dst.size : 0);
+        clipper.Pass(pass, *in, dst);
+        if (last) break;
+        ZvPoint2dArray* t = in;
+        in = next;
+        next = t;
+      }
     }
     const unsigned int m = out.size - before;
     if (m == 0) return;

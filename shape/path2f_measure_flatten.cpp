@@ -12,10 +12,18 @@ bool ZvPath2fMeasure::IsClosed(const ZvPath2f& path, unsigned int end) {
 }
 
 void zvAppendSubpathTags(ZvPointTagArray& tags, unsigned int t) {
-  tags.Add(ZvPointTag_First);
+  const unsigned int at = tags.size;
+  // Like t + 1 calls of Add: the array grows when full and never gives back room it has.
+  if (at + t + 1 <= tags.capacity) {
+    tags.size = at + t + 1;
+  } else {
+    tags.Resize(at + t + 1);
+  }
+  ZvPointTag* tag = tags.data + at;
+  tag[0] = ZvPointTag_First;
   for (unsigned int k = 1; k < t; ++k)
-    tags.Add(ZvPointTag_Continue);
-  tags.Add(ZvPointTag_Last);
+    tag[k] = ZvPointTag_Continue;
+  tag[t] = ZvPointTag_Last;
 }
 
 namespace {

@@ -4,6 +4,8 @@
 #include <zv/transfo4.h>
 
 #include <cmath>
+#include <random>
+#include <vector>
 
 #include "tests/shape/path_fixtures.h"
 
@@ -165,6 +167,79 @@ TEST(PathMeasureClip, AppendsMapsAndHandlesEmptyAndInfiniteExtents) {
   // The cut runs through the centre along a line of symmetry of the flattened circle.
   EXPECT_NEAR(2.0 * half, Area(pts, before, pts.size - before - 1), 1e-6);
   EXPECT_EQ(pts.size, tags.size);
+}
+
+// Plain four-pass clipping of a polygon, every pass run: the reference for the clipper, which
+// skips the passes a subpath's control points clear and flattens straight into the output.
+std::vector<ZvPoint2<double>> ClipAllPasses(std::vector<ZvPoint2<double>> poly, const E& e) {
+  for (int pass = 0; pass < 4 && !poly.empty(); ++pass) {
+    const int axis = pass % 2;
+    const bool isMin = pass < 2;
+    const double b = pass == 0 ? e.xmin : pass == 1 ? e.ymin : pass == 2 ? e.xmax : e.ymax;
+    auto a = [&](const ZvPoint2<double>& p) { return axis == 0 ? p.x : p.y; };
+    auto o = [&](const ZvPoint2<double>& p) { return axis == 0 ? p.y : p.x; };
+    auto inside = [&](const ZvPoint2<double>& p) { return isMin ? a(p) >= b : b >= a(p); };
+    std::vector<ZvPoint2<double>> next;
+    ZvPoint2<double> q = poly.back();
+    for (const ZvPoint2<double>& r : poly) {
+      if (inside(r) != inside(q)) {
+        const double w = a(q) - a(r);
+        const double c = (w < -1e-15 || w > 1e-15)
+                             ? (b - a(q)) * (o(r) - o(q)) / (a(r) - a(q)) + o(q)
+                             : (o(q) + o(r)) * 0.5;
+        next.push_back(axis == 0 ? ZvPoint2<double>{b, c} : ZvPoint2<double>{c, b});
+      }
+      if (inside(r)) next.push_back(r);
+      q = r;
+    }
+    poly = next;
+  }
+  return poly;
+}
+
+TEST(PathMeasureClip, SkippingPassesChangesNothing) {
+  std::mt19937 rng(5);
+  std::uniform_real_distribution<double> u(0.0, 100.0);
+  for (int trial = 0; trial < 60; ++trial) {
+    ZvPath2f path;
+    for (int sub = 0; sub < 2; ++sub) {
+      const ZvPoint2<float> start = P(float(u(rng)), float(u(rng)));
+      path.Moveto(start);
+      for (int k = 0; k < 5; ++k)
+        path.Curveto(P(float(u(rng)), float(u(rng))), P(float(u(rng)), float(u(rng))),
+                     k == 4 ? start : P(float(u(rng)), float(u(rng))));
+      path.Closeto();
+    }
+    ZvTransfo4 t;
+    t.Translate(u(rng) - 50.0, u(rng) - 50.0, 0.0);
+    t.Scale(0.5 + u(rng) / 50.0);
+    // Extents that hold everything, cut one side, or cut several.
+    const double lo = trial % 3 == 0 ? -1000.0 : u(rng) - 20.0;
+    const E extent(lo, trial % 2 ? -1000.0 : u(rng) - 20.0, trial % 5 ? 1000.0 : lo + u(rng),
+                   1000.0);
+
+    ZvPoint2dArray got, flat;
+    ZvPointTagArray gotTags, flatTags;
+    path.TransformFlattenAndClipClosedSubPaths(t, 0.2, extent, got, gotTags);
+    path.TransformAndFlattenClosedSubPaths(t, 0.2, flat, flatTags);
+    std::vector<ZvPoint2<double>> expect;
+    std::vector<ZvPoint2<double>> poly;
+    for (unsigned int i = 0; i < flat.size; ++i) {
+      if (flatTags[i] != ZvPointTag_Last) {
+        poly.push_back(flat[i]);
+        continue;
+      }
+      const std::vector<ZvPoint2<double>> clipped = ClipAllPasses(poly, extent);
+      expect.insert(expect.end(), clipped.begin(), clipped.end());
+      if (!clipped.empty()) expect.push_back(clipped.front());
+      poly.clear();
+    }
+    ASSERT_EQ(expect.size(), got.size) << trial;
+    for (unsigned int i = 0; i < got.size; ++i) {
+      EXPECT_EQ(expect[i].x, got[i].x) << trial << " " << i;
+      EXPECT_EQ(expect[i].y, got[i].y) << trial << " " << i;
+    }
+  }
 }
 
 }  // namespace
