@@ -13,10 +13,11 @@
 // ---------------------------------------------------------------------------------------------
 // Flattening
 //
-// A flatten appends a polyline that follows the cubic within `tolerance` and returns the number
-// of points it appended. With `skipFirst` 0 the first appended point is P0; otherwise the array
-// is taken to end at P0 already and P0 is not added. The last point is always P3 itself, copied
-// from the control point, never recomputed.
+// A flatten appends a polyline that follows the cubic to about `tolerance` and returns the
+// number of points it appended. (The flatness measure looks across each piece's chord only, so
+// at tight turns the polyline may stray a few times further.) With `skipFirst` 0 the first appended
+// point is P0; otherwise the array is taken to end at P0 already and P0 is not added. The last
+// point is always P3 itself, copied from the control point, never recomputed.
 //
 // The subdivision is fixed up front from the length of the third difference of the control
 // points: the curve is halved floor(log8(|D| / tolerance + 0.5)) times, and each piece is then
