@@ -15,7 +15,7 @@
 //
 // A flatten appends a polyline that follows the cubic to about `tolerance` and returns the
 // number of points it appended. (The flatness measure looks across each piece's chord only, so
-// at tight turns the polyline may stray a few times further.) With `skipFirst` 0 the first appended
+// at tight turns the polyline can stray well beyond it.) With `skipFirst` 0 the first appended
 // point is P0; otherwise the array is taken to end at P0 already and P0 is not added. The last
 // point is always P3 itself, copied from the control point, never recomputed.
 //
