@@ -8,7 +8,7 @@ namespace {
 
 // Walks all 2^levels segments of the piece [t0, t1], the last one ending on the computed point
 // rather than on P3, and keeps the first segment reaching a strictly smaller squared distance.
-// No cap on levels here: location is not bound by the rasterisers' edge tables.
+// Unlike the plane flatten, the levels are not capped here.
 template <class G>
 bool CubicForwardDifferencingForPointLocation(const typename G::Point* p, double factor,
                                               const typename G::Point& point, double limit,
