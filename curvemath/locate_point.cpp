@@ -62,8 +62,7 @@ template <class G>
 int LocatePoint(const typename G::Point* p, double tolerance, const typename G::Point& point,
                 double distance, bool boxByLimit, double& outDistance2, double& outT) {
   if (!p) return 0;
-  // Squared tolerance plus a plain distance: this exact mix is what callers' pick distances
-  // were tuned against.
+  // A squared tolerance plus a plain distance: the mix is part of the behaviour, not a slip.
   const double limit = tolerance * tolerance + distance;
   if (G::IsOutsideGrownControlBox(p, point, boxByLimit ? limit : distance)) return 0;
   double factor;

@@ -87,8 +87,8 @@ ZV_API int ClipAndAddLineSegment(ZvPoint2<double>& a, ZvPoint2<double>& b,
 // polyline a flatten would produce (without the 1023 cap). Returns 1 and writes the squared
 // distance and the parameter when one is found whose squared distance is at most `distance`.
 // Note: the squared distance is compared with the plain `distance`, and segments are searched
-// within tolerance * tolerance + distance; both are kept as they are because callers have tuned
-// their pick distances against them. Returns 0 with both outputs unchanged otherwise.
+// within tolerance * tolerance + distance. Both mixes of squared and plain values are part of
+// the behaviour hit tests depend on. Returns 0 with both outputs unchanged otherwise.
 // The 2d form gives up at once when the point lies farther than `distance` from the control
 // box; the 3d form uses the search limit for that test instead.
 // ---------------------------------------------------------------------------------------------
