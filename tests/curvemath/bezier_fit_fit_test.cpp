@@ -239,3 +239,22 @@ TEST(BezierFitFit, DoubleCubicFitMatchesTheFloatForm) {
 }
 
 }  // namespace
+
+namespace {
+
+// Points that are not numbers make no fit, but the recursion still ends on short stretches and
+// the path stays well formed, one segment per count.
+TEST(BezierFitFit, NonFiniteInputStillEnds) {
+  ZvPoint2fArray wild;
+  for (int k = 0; k < 40; ++k)
+    wild.Add(k * 3.0, k == 17 ? std::nan("") : std::sin(k * 0.3) * 10.0);
+  ZvBezierTool tool;
+  for (unsigned int degree : {3u, 6u}) {
+    ZvPath2f path;
+    const unsigned int made = tool.OpenFit(wild, 0.5, degree, 0.5, 0, &path, 0);
+    EXPECT_EQ(made, Degrees(path).size());
+    EXPECT_EQ(39.0f * 3.0f, path.GetCurrentPoint().x);
+  }
+}
+
+}  // namespace
