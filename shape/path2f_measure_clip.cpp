@@ -12,6 +12,7 @@
 // more per point than flattening alone.
 #include <zv/path2f.h>
 
+#include <algorithm>
 #include <cmath>
 
 #include "shape/path2f_measure.h"
@@ -87,9 +88,20 @@ struct Clipper {
 // of its coordinates' size keeps that pass.
 unsigned int PassesNeeded(const ZvPoint2fArray& pts, unsigned int s, unsigned int e,
                           const ZvTransfo4& transform, const ZvExtent2<double>& extent) {
-  ZvExtent2<double> box;
-  for (unsigned int k = s; k <= e; ++k)
-    box.AddPoint(pts[k]);
+  // Branch-free bounds; a point that is not finite keeps every pass (x - x is 0 only for a
+  // finite x).
+  float x0 = pts[s].x, x1 = x0, y0 = pts[s].y, y1 = y0;
+  bool finite = true;
+  for (unsigned int k = s; k <= e; ++k) {
+    const ZvPoint2<float> q = pts[k];
+    x0 = std::min(x0, q.x);
+    x1 = std::max(x1, q.x);
+    y0 = std::min(y0, q.y);
+    y1 = std::max(y1, q.y);
+    finite &= (q.x - q.x == 0.0f) & (q.y - q.y == 0.0f);
+  }
+  if (!finite) return 15u;
+  ZvExtent2<double> box(x0, y0, x1, y1);
   transform.MapInPlace(box);
   const double size = std::fmax(std::fmax(std::fabs(box.xmin), std::fabs(box.xmax)),
                                 std::fmax(std::fabs(box.ymin), std::fabs(box.ymax)));
