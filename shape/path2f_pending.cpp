@@ -44,24 +44,6 @@ unsigned int ZvPath2f::Sample(const ZvGC&, ZvPoint2fArray&, ZvPointTagArray&) co
 
 // ---- Rasterising -------------------------------------------------------------------------------
 
-int ZvPath2f::Fill(const ZvGC&, ZvRaster<unsigned char>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::Fill(const ZvGC&, ZvRaster<float>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::Fill(const ZvGC&, ZvRaster<short>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::AAFill(const ZvGC&, ZvRaster<unsigned char>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::AAFill(const ZvGC&, ZvRaster<float>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::AAFill(const ZvGC&, ZvRaster<short>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
 int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<unsigned char>&, int (*)()) const {
   return 0;
 }
@@ -69,9 +51,6 @@ int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<float>&, int (*)()) const {
   return 0;
 }
 int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<short>&, int (*)()) const {
-  return 0;
-}
-int ZvPath2f::Stroke(const ZvGC&, ZvRaster<unsigned char>&) const {
   return 0;
 }
 

@@ -26,8 +26,9 @@ struct IntBbox2l {
 };
 
 // Boolean masks of two shapes' aliased fills (each filled on its own into a zeroed raster of the
-// target's size, with the given context). The target is only ever set to 255, never cleared:
-// clear it first for a pure result. Null shapes paint nothing.
+// target's size, with the given context, in unflipped rows: the target's orientation flag is not
+// consulted). The target is only ever set to 255, never cleared: clear it first for a pure
+// result. Null shapes paint nothing.
 ZV_API void ZvShape2f_IntersectionAB(const ZvGC& gc, const ZvShape2f* a, const ZvShape2f* b,
                                      ZvRaster<unsigned char>& target);
 ZV_API void ZvShape2f_UnionAB(const ZvGC& gc, const ZvShape2f* a, const ZvShape2f* b,
