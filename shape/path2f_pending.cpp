@@ -35,9 +35,6 @@ unsigned int ZvPath2f::IntersectSamplePointsExtent(const ZvGC&, const ZvExtent2<
   return 0;
 }
 
-unsigned int ZvPath2f::Flatten(const ZvGC&, ZvPoint2fArray&, ZvPointTagArray&) const {
-  return 0;
-}
 unsigned int ZvPath2f::Sample(const ZvGC&, ZvPoint2fArray&, ZvPointTagArray&) const {
   return 0;
 }
