@@ -8,14 +8,13 @@ template <bool NonZero, class T>
 int Sweep(CFillContext& ctx, int numVertices, const ZvFillBox& box, ZvRaster<T>& raster,
           int (*callback)()) {
   CFillSweep sweep(ctx, numVertices);
-  const T full = ZvPixelScale<T>::full;
   for (int y = box.yMin; y < box.yMax; ++y) {
     if (callback && callback()) return 0;
     sweep.Advance(y);
     T* row = raster.GetRaster() + raster.CalculateOffsetForPos(0, raster.ConvertBottomUpY(y));
-    sweep.Spans<NonZero>(box.xMin, box.xMax, [row, full](int l, int r) {
+    sweep.Spans<NonZero>(box.xMin, box.xMax, [row](int l, int r) {
       for (int x = l; x <= r; ++x)
-        row[x] = full;
+        row[x] = ZvPixelScale<T>::full;
     });
   }
   return 1;
