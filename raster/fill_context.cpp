@@ -2,20 +2,8 @@
 #include "raster/fill_context.h"
 
 #include <algorithm>
-#include <cstdlib>
+#include <cmath>
 #include <new>
-
-int CompareIndices(const void* a, const void* b) {
-  const CFillSortedVertex& first = *static_cast<const CFillSortedVertex*>(a);
-  const CFillSortedVertex& second = *static_cast<const CFillSortedVertex*>(b);
-  return second.vertices[second.index].y >= first.vertices[first.index].y ? -1 : 1;
-}
-
-int CompareActiveEdges(const void* a, const void* b) {
-  const CFillActiveEdge& first = *static_cast<const CFillActiveEdge*>(a);
-  const CFillActiveEdge& second = *static_cast<const CFillActiveEdge*>(b);
-  return second.x >= first.x ? -1 : 1;
-}
 
 namespace {
 template <class Word>
@@ -74,6 +62,8 @@ int CFillContext::BuildTables(const ZvPoint2dArray& points, const ZvPointTagArra
     }
     vertices[n].x = points[i].x * scale;
     vertices[n].y = points[i].y * scale;
+    // A non-finite coordinate has no place in the y order: such a polygon is not filled.
+    if (!std::isfinite(vertices[n].x) || !std::isfinite(vertices[n].y)) return 0;
     sortedVertices[n] = CFillSortedVertex{n, n - 1, n + 1, vertices};
     ++n;
   }
@@ -82,12 +72,10 @@ int CFillContext::BuildTables(const ZvPoint2dArray& points, const ZvPointTagArra
     sortedVertices[subpathStart].prev = n - 1;
     sortedVertices[n - 1].next = subpathStart;
   }
-  // Rising y; the order among equal y is free (it never changes which pixels are inside), so a
-  // direct comparison replaces the comparator's indirect calls.
-  const CFillVertex* v = vertices;
+  // Rising y, with the comparator inlined rather than called through qsort.
   std::sort(sortedVertices, sortedVertices + n,
-            [v](const CFillSortedVertex& a, const CFillSortedVertex& b) {
-              return v[a.index].y < v[b.index].y;
+            [](const CFillSortedVertex& a, const CFillSortedVertex& b) {
+              return CompareIndices(&b, &a) > 0;
             });
   return n;
 }

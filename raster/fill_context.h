@@ -31,9 +31,19 @@ struct CFillActiveEdge {
   std::int32_t direction;  // +1 downwards in path order, -1 upwards (winding rule only)
 };
 
-// qsort comparators that never answer 0: the order among equal keys is the sort's own.
-int CompareIndices(const void* a, const void* b);
-int CompareActiveEdges(const void* a, const void* b);
+// The two orderings of the sweep, in the form of qsort comparators that never answer 0: 1 when
+// the first record goes after the second (its key is greater), -1 otherwise. The order among
+// equal keys is left to the sort; it never changes which pixels are inside.
+inline int CompareIndices(const void* a, const void* b) {
+  const CFillSortedVertex& first = *static_cast<const CFillSortedVertex*>(a);
+  const CFillSortedVertex& second = *static_cast<const CFillSortedVertex*>(b);
+  return second.vertices[second.index].y >= first.vertices[first.index].y ? -1 : 1;
+}
+inline int CompareActiveEdges(const void* a, const void* b) {
+  const CFillActiveEdge& first = *static_cast<const CFillActiveEdge*>(a);
+  const CFillActiveEdge& second = *static_cast<const CFillActiveEdge*>(b);
+  return second.x >= first.x ? -1 : 1;
+}
 
 class CFillContext {
  public:
@@ -43,8 +53,8 @@ class CFillContext {
   ~CFillContext();
 
   // Fills the three tables from flattened closed subpaths (tag 2 closes a subpath and is itself
-  // dropped), every coordinate multiplied by `scale`. Answers the number of vertices. The tables
-  // get one slot per input point; bad_alloc propagates.
+  // dropped), every coordinate multiplied by `scale`. Answers the number of vertices, 0 when a
+  // coordinate is not finite. The tables get one slot per input point; bad_alloc propagates.
   int BuildTables(const ZvPoint2dArray& points, const ZvPointTagArray& tags, double scale);
 
   // Zeroed coverage rows of cells indexed first..end-1 (row pointers pre-offset by `first`): one

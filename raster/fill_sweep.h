@@ -35,10 +35,10 @@ class CFillSweep {
     // would.
     CFillActiveEdge* e = ctx.activeEdges;
     for (int i = 1; i < numActive; ++i) {
-      if (!(e[i].x < e[i - 1].x)) continue;
+      if (CompareActiveEdges(&e[i - 1], &e[i]) < 0) continue;
       const CFillActiveEdge moving = e[i];
       int j = i;
-      for (; j > 0 && moving.x < e[j - 1].x; --j)
+      for (; j > 0 && CompareActiveEdges(&e[j - 1], &moving) > 0; --j)
         e[j] = e[j - 1];
       e[j] = moving;
     }

@@ -161,3 +161,33 @@ TEST(AAFill, FeatheredRangeWritesZeroCountsBetweenTouchedCells) {
   EXPECT_EQ(b.GetVal(5, 1), 0);
   EXPECT_EQ(b.GetVal(1, 1), ByteValue(16, 464213));  // its own 16 of 36 samples
 }
+
+namespace {
+int callbacks = 0;
+int CountCallback() {
+  ++callbacks;
+  return 0;
+}
+int StopAtFifth() {
+  return ++callbacks == 5;
+}
+}  // namespace
+
+TEST(AAFill, CallbackPerSubSampleRowExceptFourByFourEvenOdd) {
+  struct Case {
+    int rate, rule, perRow;
+  } cases[] = {{4, 0, 1}, {4, 1, 4}, {8, 0, 8}, {8, 1, 8}};
+  for (const Case& c : cases) {
+    ZvRaster<unsigned char> r(8, 8, 0);
+    callbacks = 0;
+    EXPECT_EQ(AAFillRings({Rect(1, 2, 7, 5)}, Context(c.rate, 0, 1.0, c.rule), r, CountCallback),
+              1);
+    EXPECT_EQ(callbacks, 8 * c.perRow) << c.rate << " " << c.rule;  // the box is the raster
+  }
+  // Stopped in the second pixel row of 4x4 non-zero: only the first row is written.
+  ZvRaster<unsigned char> r(8, 8, 0);
+  callbacks = 0;
+  EXPECT_EQ(AAFillRings({Rect(1, 0, 7, 3)}, Context(4), r, StopAtFifth), 0);
+  EXPECT_EQ(r.GetVal(3, 0), 255);
+  EXPECT_EQ(r.GetVal(3, 1), 0);
+}

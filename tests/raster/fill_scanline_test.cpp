@@ -176,3 +176,11 @@ TEST(ScanlineFill, RandomPolygonsMatchPointInPolygonUnderBothRules) {
   }
   EXPECT_GT(checked, 150000);
 }
+
+TEST(ScanlineFill, NonFiniteVertexFillsNothing) {
+  ZvPoint2dArray points;
+  ZvPointTagArray tags;
+  ToArrays({Ring{{1, 1}, {std::nan(""), 5}, {1, 8}}, Rect(0, 0, 4, 4)}, points, tags);
+  CFillContext ctx;
+  EXPECT_EQ(ctx.BuildTables(points, tags, 1.0), 0);
+}
