@@ -57,8 +57,10 @@ int ZvPath2f::CalculateFillParameters(const ZvGC& gc, int rasterWidth, int raste
     if (yMin < box->y) yMin = box->y;
     const long long right = static_cast<long long>(box->x) + box->width - 1;
     const long long bottom = static_cast<long long>(box->y) + box->height - 1;
-    if (xMax > right) xMax = static_cast<int>(right);
-    if (yMax > bottom) yMax = static_cast<int>(bottom);
+    // A box ending before the pixel box empties it (compared in 64 bits: an empty box at the
+    // lowest origin ends below the int range).
+    if (xMax > right) xMax = right < xMin ? xMin : static_cast<int>(right);
+    if (yMax > bottom) yMax = bottom < yMin ? yMin : static_cast<int>(bottom);
   }
   if (xMin >= xMax || yMin >= yMax) return 0;
   const double tolerance = gc.flattenTolerance > 0.25 ? gc.flattenTolerance : 0.25;

@@ -88,3 +88,12 @@ TEST(FillPath, BooleanMasksCombineTwoFillsAndNeverClear) {
     EXPECT_EQ(t.GetVal(9, 0), 7);
   }
 }
+
+TEST(FillPath, EmptyOrFarBoxesPaintNothing) {
+  ZvGC gc;
+  ZvRaster<unsigned char> r(10, 10, 0);
+  const IntBbox2l boxes[] = {{2, 2, 1, 5}, {-2147483647 - 1, 0, 0, 10}, {20, 20, 5, 5}};
+  for (const IntBbox2l& box : boxes)
+    EXPECT_EQ(Square(0, 0, 10, 10).Fill(gc, r, nullptr, &box), 0);
+  EXPECT_TRUE(r.AllPixelValuesAre(0));
+}
