@@ -5,63 +5,8 @@
 // Each definition here is removed when the real one arrives.
 #include <zv/path2f.h>
 
-// ---- Measuring ---------------------------------------------------------------------------------
-
-ZvExtent2<float>& ZvPath2f::GetTightExtent(ZvExtent2<float>& extent) const {
-  return extent;
-}
-ZvExtent2<double>& ZvPath2f::GetTightExtent(ZvExtent2<double>& extent) const {
-  return extent;
-}
-
-int ZvPath2f::GetClosePointIndex(const ZvPoint2<float>&, double, unsigned int*) const {
-  return 0;
-}
-
-unsigned int ZvPath2f::GetPointsInExtentIndices(const ZvExtent2<float>&, ZvULongArray*) const {
-  return 0;
-}
-
-int ZvPath2f::IsIntersectingExtent(const ZvGC&, const ZvExtent2<float>&, int) const {
-  return 0;
-}
-
-int ZvPath2f::IsInteriorIntersectingExtent(const ZvGC&, const ZvExtent2<float>&, int) const {
-  return 0;
-}
-
-unsigned int ZvPath2f::IntersectSamplePointsExtent(const ZvGC&, const ZvExtent2<float>&,
-                                                   ZvPoint2fArray&, ZvPointTagArray&, int) const {
-  return 0;
-}
-
-unsigned int ZvPath2f::Flatten(const ZvGC&, ZvPoint2fArray&, ZvPointTagArray&) const {
-  return 0;
-}
-unsigned int ZvPath2f::Sample(const ZvGC&, ZvPoint2fArray&, ZvPointTagArray&) const {
-  return 0;
-}
-
 // ---- Rasterising -------------------------------------------------------------------------------
 
-int ZvPath2f::Fill(const ZvGC&, ZvRaster<unsigned char>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::Fill(const ZvGC&, ZvRaster<float>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::Fill(const ZvGC&, ZvRaster<short>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::AAFill(const ZvGC&, ZvRaster<unsigned char>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::AAFill(const ZvGC&, ZvRaster<float>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::AAFill(const ZvGC&, ZvRaster<short>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
 int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<unsigned char>&, int (*)()) const {
   return 0;
 }
@@ -69,9 +14,6 @@ int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<float>&, int (*)()) const {
   return 0;
 }
 int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<short>&, int (*)()) const {
-  return 0;
-}
-int ZvPath2f::Stroke(const ZvGC&, ZvRaster<unsigned char>&) const {
   return 0;
 }
 

@@ -35,6 +35,7 @@
 class ZvRect2f;
 class ZvOval2f;
 class ZvByteReader;
+class CFillContext;
 
 class ZV_API ZvPath2f : public ZvShape2f {
  public:
@@ -174,6 +175,49 @@ class ZV_API ZvPath2f : public ZvShape2f {
   ZvPoint2<float> GetCurrentPoint() const;
   unsigned int MaxDegreeForThisImplementation() const { return 8; }
 
+  // ---- Measuring (under the lock; each appends to the caller's arrays, never clears them) ----
+  // Polyline outputs pair the points with one tag per point: 0 first point of a subpath, 1 a
+  // point inside, 2 its last point. A closed subpath simply ends on its start. A subpath of a
+  // lone start point comes out as that point twice, tagged 0 and 2. Cubics are flattened by
+  // ZvBezierTool_FlattenCubic2f / 2d, other degrees by ZvBezierTool::Flatten.
+
+  // Flatten without a transform, at `tolerance`. Result: points added.
+  unsigned int AltFlatten(double tolerance, ZvPoint2fArray& points, ZvPointTagArray& tags) const;
+  // The subpath holding `index`, without tags. Result: points added; 0 for an index outside.
+  unsigned int FlattenSubpath(unsigned int index, double tolerance, ZvPoint2fArray& points) const;
+  // Samples at relative arc positions (0..1 over the whole flattened path, in order), tagged
+  // per subpath. Result: points added.
+  unsigned int Sample(const ZvGC& gc, const ZvFloatArray& positions, ZvPoint2fArray& points,
+                      ZvPointTagArray& tags) const;
+  // Flatten in double precision through `transform`. Result: subpaths written.
+  unsigned int TransformAndFlattenPath(const ZvTransfo4& transform, double tolerance,
+                                       ZvPoint2dArray& points, ZvPointTagArray& tags) const;
+  // The same for the closed subpaths only. Result: closed subpaths written.
+  unsigned int TransformAndFlattenClosedSubPaths(const ZvTransfo4& transform, double tolerance,
+                                                 ZvPoint2dArray& points,
+                                                 ZvPointTagArray& tags) const;
+  // For the rasterisers: every closed subpath of more than two indices, mapped, flattened and
+  // clipped as a polygon to `extent` (x >= xmin, y >= ymin, x <= xmax, y <= ymax, bounds
+  // inside), so that no coordinate leaves the extent. Each polygon that keeps any area is
+  // written as m points tagged 0, 1, ..., 1 plus its first point again tagged 2. An Empty extent
+  // writes nothing; an Infinite one clips nothing. Result: polygons written.
+  unsigned int TransformFlattenAndClipClosedSubPaths(const ZvTransfo4& transform, double tolerance,
+                                                     const ZvExtent2<double>& extent,
+                                                     ZvPoint2dArray& points,
+                                                     ZvPointTagArray& tags) const;
+  // Box of the control points of the segment holding `index`; Empty for an index outside.
+  ZvExtent2<float>& GetSegmentExtent(unsigned int index, ZvExtent2<float>& extent) const;
+  // The point nearest to `point` in the octagonal metric (larger axis distance plus 0.3334 times
+  // the smaller); the lowest index wins a tie. 0 for an empty path.
+  int GetClosePointIndex(const ZvPoint2<float>& point, unsigned int* index) const;
+  // Arc length from the start of the node's subpath to the node over the subpath's length, both
+  // measured on the polyline flattened at `tolerance`: 0 at the start, 1 at the end.
+  double GetNodeNormalizedArcLength(unsigned int node, double tolerance) const;
+  // Appends a copy of `source` resampled at gc.sampleSpacing and refitted with cubics, corners
+  // at gc.fitTolerance taken as a squared cosine and gc.flattenTolerance as the fit tolerance.
+  // Locks this path, then the source. Result: points added to this path.
+  unsigned int AddFittedSamplesFromPath(const ZvGC& gc, const ZvPath2f& source);
+
   // ---- Structure queries for callers that hold the lock -------------------------------------
   // Degree of the segment `index` belongs to; for a start point, of the segment behind it (0
   // for a lone start). 0 for an illegal code.
@@ -193,6 +237,20 @@ class ZV_API ZvPath2f : public ZvShape2f {
   int LockG1(unsigned int index);
   int UnlockG1(unsigned int index);
 
+  // ---- Rasterising (the fills above, and strokes into the other pixel types) ----------------
+  // Strokes of the unsigned char variant above into the other rasteriser types: the outline
+  // filled with full values, never antialiased.
+  int Stroke(const ZvGC& gc, ZvRaster<short>& raster) const;
+  int Stroke(const ZvGC& gc, ZvRaster<float>& raster) const;
+  // The shared front end of the fills: the pixel box (columns xMin..xMax-1, rows yMin..yMax-1)
+  // of the closed subpaths mapped by the context's transform, clipped to the raster and to
+  // `box` (whose last column and row stay outside, on purpose), and the edge tables of their
+  // polygon, flattened at max(0.25, tolerance) pixels and then scaled by `scale`. Answers 0 when
+  // there is nothing to fill.
+  int CalculateFillParameters(const ZvGC& gc, int rasterWidth, int rasterHeight, double scale,
+                              CFillContext& ctx, int& xMin, int& yMin, int& xMax, int& yMax,
+                              int& numVertices, const IntBbox2l* box) const;
+
  protected:
   // Builds the outline of a rectangle from the handles of `shape` read through GetPoint (corners
   // 2, 4, 6, 8), or of an oval from its handles 1..8 read through GetPoints. These carry the
@@ -205,6 +263,9 @@ class ZV_API ZvPath2f : public ZvShape2f {
   unsigned int currentSubpathOpen;
 
  private:
+  template <class T>
+  int StrokeImp(const ZvGC& gc, ZvRaster<T>& raster) const;
+  friend class ZvPath2fMeasure;  // the measuring code reads the arrays directly
   friend ZvShape2f* ZvShape2f_CreateFromBuffer(const void*, std::size_t, unsigned int&);
   // The body reader behind ReadFromBufferBody and the bounded factory.
   unsigned int ReadBody(ZvByteReader& in);

@@ -4,10 +4,12 @@
 
 #include <zv/api.h>
 #include <zv/arrays.h>
+#include <zv/bezier_fit.h>
 #include <zv/bezier_tool.h>
 #include <zv/critical_section.h>
 #include <zv/fcurve.h>
 #include <zv/fcurve_userdata.h>
+#include <zv/fill.h>
 #include <zv/gc.h>
 #include <zv/matrix.h>
 #include <zv/path2f.h>

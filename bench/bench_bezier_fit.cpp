@@ -1,0 +1,274 @@
+// Fitting cubic Bezier chains to pen strokes: ZvBezierTool::OpenFit against lib2geom's
+// bezier_fit_cubic_r on the same strokes, in one run.
+//
+// 200 strokes of 300 points each: smooth random curves (curvature a sum of three random waves,
+// the pen speed varying by half around 3 px a point) plus Gaussian noise of 0.3 px on x and y,
+// from a fixed seed. Every benchmark fits all strokes once per iteration. OpenFit runs at
+// tolerance 1.0 with cubics, and for comparison with quartics and quintics; lib2geom receives
+// the same bound as its squared error, 1.0 (its argument is the square of a distance).
+//
+// The criteria differ: lib2geom accepts a segment when every point lies within the bound of the
+// curve point at that point's (Newton-refined) parameter; OpenFit when every point lies within
+// the bound of the point of the segment's flattened polyline at the same arc length. So the
+// accuracy of both outputs is measured the same way, once and outside the timed loops: for each
+// input point its distance to the nearest point of the fitted chain (each segment evaluated
+// densely), and per stroke the largest. The table gives segments per stroke, the mean and the
+// maximum of the per-stroke largest distances, and time ratios against OpenFit with cubics.
+#include <benchmark/benchmark.h>
+#include <zv/bezier_fit.h>
+#include <zv/path2f.h>
+
+#include <algorithm>
+#include <cmath>
+#include <cstdio>
+#include <functional>
+#include <map>
+#include <random>
+#include <string>
+#include <vector>
+
+#include "tests/curvemath/bezier_fit_strokes.h"
+
+#if ZV_HAVE_2GEOM
+#include <2geom/bezier-utils.h>
+#endif
+
+namespace {
+
+using P2 = ZvPoint2<double>;
+
+constexpr int kStrokes = 200;
+constexpr unsigned int kPointsPerStroke = 300;
+constexpr double kTolerance = 1.0;
+constexpr double kCornerCos2 = 0.5;
+
+const std::vector<ZvPoint2fArray>& Strokes() {
+  static const std::vector<ZvPoint2fArray> strokes = [] {
+    std::mt19937 rng(20261122);
+    std::vector<ZvPoint2fArray> v;
+    for (int i = 0; i < kStrokes; ++i)
+      v.push_back(PenStroke(rng, kPointsPerStroke, 3.0, 0.3));
+    return v;
+  }();
+  return strokes;
+}
+
+// A fitted stroke as a list of segments, each its control points.
+using Chain = std::vector<std::vector<P2>>;
+
+struct Method {
+  std::string name;
+  // Fits every stroke once; returns the number of segments.
+  std::function<size_t()> timedPass;
+  // Fits one stroke for the accuracy measure.
+  std::function<Chain(const ZvPoint2fArray&)> fit;
+};
+
+Chain ChainOf(const ZvPath2f& path) {
+  Chain chain;
+  for (unsigned int i = 1; i < path.NumPoints();) {
+    unsigned int a, b;
+    path.GetSegmentIndices(i, a, b);
+    std::vector<P2> c;
+    for (unsigned int k = a; k <= b; ++k)
+      c.push_back(P2{path.GetPoint(k).x, path.GetPoint(k).y});
+    chain.push_back(c);
+    i = b + 1;
+  }
+  return chain;
+}
+
+Method ZvMethod(unsigned int degree) {
+  Method m;
+  m.name = "zv-OpenFit-d" + std::to_string(degree);
+  m.timedPass = [degree] {
+    ZvBezierTool tool;
+    size_t segments = 0;
+    for (const ZvPoint2fArray& s : Strokes()) {
+      ZvPath2f path(64);
+      segments += tool.OpenFit(s, kCornerCos2, degree, kTolerance, 0, &path, 0);
+      benchmark::DoNotOptimize(path.NumPoints());
+    }
+    return segments;
+  };
+  m.fit = [degree](const ZvPoint2fArray& s) {
+    ZvBezierTool tool;
+    ZvPath2f path;
+    tool.OpenFit(s, kCornerCos2, degree, kTolerance, 0, &path, 0);
+    return ChainOf(path);
+  };
+  return m;
+}
+
+#if ZV_HAVE_2GEOM
+constexpr unsigned int kMaxBeziers = 1000;
+
+const std::vector<std::vector<Geom::Point>>& GeomStrokes() {
+  static const std::vector<std::vector<Geom::Point>> strokes = [] {
+    std::vector<std::vector<Geom::Point>> v;
+    for (const ZvPoint2fArray& s : Strokes()) {
+      std::vector<Geom::Point> g;
+      for (unsigned int i = 0; i < s.size; ++i)
+        g.emplace_back(s[i].x, s[i].y);
+      v.push_back(g);
+    }
+    return v;
+  }();
+  return strokes;
+}
+
+Method GeomMethod() {
+  Method m;
+  m.name = "2geom-cubic_r";
+  m.timedPass = [] {
+    static std::vector<Geom::Point> out(4 * kMaxBeziers);
+    size_t segments = 0;
+    for (const std::vector<Geom::Point>& s : GeomStrokes()) {
+      const int n = Geom::bezier_fit_cubic_r(out.data(), s.data(), static_cast<int>(s.size()),
+                                             kTolerance * kTolerance, kMaxBeziers);
+      segments += n > 0 ? n : 0;
+      benchmark::DoNotOptimize(out.data());
+    }
+    return segments;
+  };
+  m.fit = [](const ZvPoint2fArray& s) {
+    std::vector<Geom::Point> in, out(4 * kMaxBeziers);
+    for (unsigned int i = 0; i < s.size; ++i)
+      in.emplace_back(s[i].x, s[i].y);
+    const int n = Geom::bezier_fit_cubic_r(out.data(), in.data(), static_cast<int>(in.size()),
+                                           kTolerance * kTolerance, kMaxBeziers);
+    Chain chain;
+    for (int k = 0; k < n; ++k) {
+      std::vector<P2> c;
+      for (int j = 0; j < 4; ++j)
+        c.push_back(P2{out[4 * k + j][0], out[4 * k + j][1]});
+      chain.push_back(c);
+    }
+    return chain;
+  };
+  return m;
+}
+#endif
+
+P2 Eval(const std::vector<P2>& p, double t) {
+  std::vector<P2> w = p;
+  for (size_t level = w.size() - 1; level > 0; --level)
+    for (size_t i = 0; i < level; ++i)
+      w[i] = w[i] * (1.0 - t) + w[i + 1] * t;
+  return w[0];
+}
+
+double DistanceToSegment(const P2& q, const P2& a, const P2& b) {
+  const P2 ab = b - a, aq = q - a;
+  const double l2 = ZvDot(ab, ab);
+  double t = l2 > 0.0 ? ZvDot(aq, ab) / l2 : 0.0;
+  t = t < 0.0 ? 0.0 : (t > 1.0 ? 1.0 : t);
+  const P2 d = a + ab * t - q;
+  return std::sqrt(ZvDot(d, d));
+}
+
+struct Accuracy {
+  double segmentsPerStroke = 0, meanMax = 0, maxMax = 0, overTolerance = 0;
+};
+
+Accuracy Measure(const Method& m) {
+  Accuracy acc;
+  for (const ZvPoint2fArray& s : Strokes()) {
+    const Chain chain = m.fit(s);
+    acc.segmentsPerStroke += chain.size();
+    std::vector<P2> dense;
+    for (const std::vector<P2>& c : chain)
+      for (int k = 0; k <= 128; ++k)
+        dense.push_back(Eval(c, k / 128.0));
+    double worst = 0.0;
+    for (unsigned int i = 0; i < s.size; ++i) {
+      const P2 q{s[i].x, s[i].y};
+      double best = HUGE_VAL;
+      for (size_t k = 0; k + 1 < dense.size(); ++k)
+        best = std::min(best, DistanceToSegment(q, dense[k], dense[k + 1]));
+      worst = std::max(worst, best);
+    }
+    acc.meanMax += worst;
+    acc.maxMax = std::max(acc.maxMax, worst);
+    if (worst > kTolerance) acc.overTolerance += 1.0;
+  }
+  acc.segmentsPerStroke /= kStrokes;
+  acc.meanMax /= kStrokes;
+  acc.overTolerance *= 100.0 / kStrokes;
+  return acc;
+}
+
+// Keeps the time per stroke of every repetition, or the medians when aggregates are reported.
+class CollectingReporter : public benchmark::ConsoleReporter {
+ public:
+  std::map<std::string, std::vector<double>> runs;
+  std::map<std::string, double> medians;
+
+  void ReportRuns(const std::vector<Run>& reported) override {
+    for (const Run& r : reported) {
+      if (r.error_occurred) continue;
+      const double seconds = r.GetAdjustedCPUTime() / benchmark::GetTimeUnitMultiplier(r.time_unit);
+      const double us = seconds / kStrokes * 1e6;
+      if (r.run_type == Run::RT_Iteration) runs[r.run_name.str()].push_back(us);
+      if (r.run_type == Run::RT_Aggregate && r.aggregate_name == "median")
+        medians[r.run_name.str()] = us;
+    }
+    ConsoleReporter::ReportRuns(reported);
+  }
+
+  double UsPerStroke(const std::string& name) const {
+    const auto m = medians.find(name);
+    if (m != medians.end()) return m->second;
+    const auto it = runs.find(name);
+    if (it == runs.end() || it->second.empty()) return 0.0;
+    std::vector<double> v = it->second;
+    std::sort(v.begin(), v.end());
+    const size_t n = v.size();
+    return n % 2 ? v[n / 2] : 0.5 * (v[n / 2 - 1] + v[n / 2]);
+  }
+};
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  Strokes();
+  std::vector<Method> methods = {ZvMethod(3), ZvMethod(4), ZvMethod(5)};
+#if ZV_HAVE_2GEOM
+  methods.push_back(GeomMethod());
+#endif
+  for (const Method& m : methods) {
+    benchmark::RegisterBenchmark(m.name.c_str(), [&m](benchmark::State& state) {
+      size_t segments = 0;
+      for (auto _ : state)
+        segments = m.timedPass();
+      state.counters["t/stroke"] = benchmark::Counter(
+          kStrokes, benchmark::Counter::kIsIterationInvariantRate | benchmark::Counter::kInvert);
+      state.counters["seg/stroke"] = static_cast<double>(segments) / kStrokes;
+    })->Unit(benchmark::kMillisecond);
+  }
+  benchmark::Initialize(&argc, argv);
+  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
+  CollectingReporter reporter;
+  benchmark::RunSpecifiedBenchmarks(&reporter);
+
+  std::printf(
+      "\n%d pen strokes of %u points, tolerance %.1f (2geom: squared error %.1f).\n"
+      "us/stroke: median CPU time of the runs above. max dist: the largest distance of an input\n"
+      "point from its fitted chain, per stroke; mean and maximum over the strokes, and the share\n"
+      "of strokes beyond the tolerance. Ratios against zv-OpenFit-d3.\n\n",
+      kStrokes, kPointsPerStroke, kTolerance, kTolerance * kTolerance);
+  std::printf("%-16s %10s %10s %10s %10s %8s %10s %10s\n", "method", "us/stroke", "seg/stroke",
+              "mean max", "max max", ">tol %", "time", "segments");
+  const double zvTime = reporter.UsPerStroke(methods[0].name);
+  const Accuracy zv = Measure(methods[0]);
+  for (const Method& m : methods) {
+    const double us = reporter.UsPerStroke(m.name);
+    if (us == 0.0) continue;
+    const Accuracy a = &m == &methods[0] ? zv : Measure(m);
+    std::printf("%-16s %10.1f %10.2f %10.3f %10.3f %8.1f %9.2fx %9.2fx\n", m.name.c_str(), us,
+                a.segmentsPerStroke, a.meanMax, a.maxMax, a.overTolerance,
+                zvTime > 0 ? us / zvTime : 0.0, a.segmentsPerStroke / zv.segmentsPerStroke);
+  }
+  benchmark::Shutdown();
+  return 0;
+}

@@ -1,0 +1,166 @@
+// Extents, picks, node arc positions and hit tests of paths.
+#include <gtest/gtest.h>
+#include <zv/gc.h>
+#include <zv/path2f.h>
+#include <zv/raster.h>
+
+#include <cmath>
+
+#include "tests/shape/path_fixtures.h"
+
+namespace {
+
+using EF = ZvExtent2<float>;
+
+ZvPath2f Arch(unsigned int degree) {
+  ZvPath2f path;
+  path.Moveto(P(0, 0));
+  if (degree == 3) {
+    path.Curveto(P(0, 10), P(10, 10), P(10, 0));
+  } else {  // the same curve raised to degree 4
+    const ZvPoint2<float> q[4] = {P(0, 7.5f), P(5, 10), P(10, 7.5f), P(10, 0)};
+    path.AltCurveto(q, 4);
+  }
+  return path;
+}
+
+ZvPath2f Square(float x0, float y0, float x1, float y1) {
+  ZvPath2f path;
+  path.Moveto(P(x0, y0));
+  path.Lineto(P(x1, y0));
+  path.Lineto(P(x1, y1));
+  path.Lineto(P(x0, y1));
+  path.Lineto(P(x0, y0));
+  path.Closeto();
+  return path;
+}
+
+TEST(PathMeasurePick, TightExtentsHugTheCurveForLinesAndCubicsOnly) {
+  EF box, tight;
+  Arch(3).GetExtent(box);
+  Arch(3).GetTightExtent(tight);
+  EXPECT_EQ(10.0f, box.ymax);
+  EXPECT_LT(tight.ymax, 8.0f);  // the arch peaks at 7.5
+  EXPECT_GE(tight.ymax, 7.5f);
+  EXPECT_EQ(0.0f, tight.xmin);
+  EXPECT_EQ(10.0f, tight.xmax);
+  // The quartic gets its control points: as loose as the control-point extent.
+  Arch(4).GetExtent(box);
+  Arch(4).GetTightExtent(tight);
+  EXPECT_EQ(box.ymax, tight.ymax);
+  ZvExtent2<double> wide;
+  Arch(3).GetTightExtent(wide);
+  EXPECT_GE(wide.ymax, 7.5);
+  EXPECT_LT(wide.ymax, 8.0);
+  ZvPath2f().GetTightExtent(tight);
+  EXPECT_EQ(EF::Empty, tight.kind);
+  EXPECT_EQ(0.0f, tight.xmax);
+
+  const ZvPath2f three = ThreeSubpaths();
+  three.GetSegmentExtent(4, tight);  // a control point of the first cubic
+  EXPECT_EQ(20.0f, tight.xmin);
+  EXPECT_EQ(35.0f, tight.xmax);
+  EXPECT_EQ(-5.0f, tight.ymin);
+  three.GetSegmentExtent(99, tight);
+  EXPECT_EQ(EF::Empty, tight.kind);
+}
+
+TEST(PathMeasurePick, ClosePointsAndPointsInABox) {
+  ZvPath2f path;
+  path.Moveto(P(0, 0));
+  path.Lineto(P(4, 0));
+  path.Lineto(P(1, 0));
+  path.Lineto(P(1, 0));
+  unsigned int index = 99;
+  // The box of side 2.2 around (2, 0) holds 1, 2, 3: the first in index order wins.
+  EXPECT_EQ(1, path.GetClosePointIndex(P(2, 0), 2.2, &index));
+  EXPECT_EQ(2u, index);  // (4,0) is at distance 2: outside; (1,0) at index 2 is first
+  // Size 0 finds only the very coordinates.
+  EXPECT_EQ(0, path.GetClosePointIndex(P(1.0001f, 0), 0.0, &index));
+  EXPECT_EQ(1, path.GetClosePointIndex(P(4, 0), 0.0, &index));
+  EXPECT_EQ(1u, index);
+  // Nearest in the octagonal metric; the lower index wins the tie between 2 and 3.
+  EXPECT_EQ(1, path.GetClosePointIndex(P(1.2f, 0.5f), &index));
+  EXPECT_EQ(2u, index);
+  EXPECT_EQ(1, path.GetClosePointIndex(P(3, 3), &index));
+  EXPECT_EQ(1u, index);  // |1|+0.3334*3 = 2.0 beats 3+0.3334*2 = 3.67
+  EXPECT_EQ(0, ZvPath2f().GetClosePointIndex(P(0, 0), &index));
+
+  ZvULongArray indices;
+  indices.Add(77u);
+  EXPECT_EQ(3u, path.GetPointsInExtentIndices(EF(0.5f, -1, 4, 1), &indices));
+  EXPECT_EQ(0u, path.GetPointsInExtentIndices(EF(), &indices));
+  EXPECT_EQ(4u, path.GetPointsInExtentIndices(EF(0, 0, 0, 0, EF::Infinite), &indices));
+  ASSERT_EQ(8u, indices.size);
+  EXPECT_EQ(77u, indices[0]);
+  EXPECT_EQ(1u, indices[1]);
+  EXPECT_EQ(3u, indices[3]);
+}
+
+TEST(PathMeasurePick, NodeArcPositions) {
+  ZvPath2f path;
+  path.Moveto(P(0, 0));
+  path.Lineto(P(10, 0));
+  path.Lineto(P(10, 30));
+  path.Curveto(P(20, 40), P(30, 30), P(30, 20));
+  // Start and end answer without flattening, whatever the tolerance.
+  EXPECT_EQ(0.0, path.GetNodeNormalizedArcLength(0, 0.0));
+  EXPECT_EQ(1.0, path.GetNodeNormalizedArcLength(5, std::nan("")));
+  const double total = path.GetNodeNormalizedArcLength(2, 0.01);
+  ZvPath2f lines;
+  lines.Moveto(P(0, 0));
+  lines.Lineto(P(10, 0));
+  lines.Lineto(P(10, 30));
+  lines.Lineto(P(40, 30));
+  EXPECT_DOUBLE_EQ(1.0 / 7.0, lines.GetNodeNormalizedArcLength(1, 1.0));
+  EXPECT_DOUBLE_EQ(4.0 / 7.0, lines.GetNodeNormalizedArcLength(2, 1.0));
+  // 40 of about 40 + 24 along the curve.
+  EXPECT_GT(total, 0.55);
+  EXPECT_LT(total, 0.7);
+  // A control point counts as the end of its segment.
+  EXPECT_EQ(path.GetNodeNormalizedArcLength(5, 0.01), path.GetNodeNormalizedArcLength(3, 0.01));
+}
+
+TEST(PathMeasurePick, OutlineAndInteriorHits) {
+  const ZvPath2f square = Square(0, 0, 100, 100);
+  ZvGC gc;
+  EXPECT_EQ(1, square.IsIntersectingExtent(gc, EF(-5, -5, 5, 5), 0));    // holds a node
+  EXPECT_EQ(1, square.IsIntersectingExtent(gc, EF(40, -5, 60, 5), 0));   // crosses an edge
+  EXPECT_EQ(0, square.IsIntersectingExtent(gc, EF(40, 40, 60, 60), 0));  // deep inside
+  EXPECT_EQ(0, square.IsIntersectingExtent(gc, EF(200, 0, 300, 9), 0));  // outside
+  EXPECT_EQ(0, square.IsIntersectingExtent(gc, EF(), 1));
+  EXPECT_EQ(1, square.IsIntersectingExtent(gc, EF(0, 0, 0, 0, EF::Infinite), 0));
+  gc.transform.Translate(1000.0, 0.0, 0.0);
+  EXPECT_EQ(1, square.IsIntersectingExtent(gc, EF(1040, -5, 1060, 5), 0));
+  EXPECT_EQ(0, square.IsIntersectingExtent(gc, EF(40, -5, 60, 5), 0));
+
+  ZvGC plain;
+  EXPECT_EQ(1, square.IsInteriorIntersectingExtent(plain, EF(40, -5, 60, 5), 0));
+  EXPECT_EQ(0, square.IsInteriorIntersectingExtent(plain, EF(200, 0, 300, 9), 0));
+  // Deep inside, the answer comes from a one-pixel fill.
+  ZvRaster<unsigned char> probe(1, 1, 0);
+  square.Fill(plain, probe, nullptr, nullptr);
+  if (probe.GetVal(0) == 0) GTEST_SKIP() << "no scanline fill on this build";
+  EXPECT_EQ(1, square.IsInteriorIntersectingExtent(plain, EF(40, 40, 60, 60), 0));
+  EXPECT_EQ(0, Square(0, 0, 10, 10).IsInteriorIntersectingExtent(plain, EF(40, 40, 60, 60), 1));
+}
+
+TEST(PathMeasurePick, SamplesInsideAnExtentKeepTheirTags) {
+  ZvPath2f line;
+  line.Moveto(P(0, 0));
+  line.Lineto(P(10, 0));
+  ZvGC gc;
+  gc.sampleSpacing = 1.0;  // samples at 0, 1, ..., 9
+  ZvPoint2fArray pts;
+  ZvPointTagArray tags;
+  EXPECT_EQ(3u, line.IntersectSamplePointsExtent(gc, EF(6.5f, -1, 20, 1), pts, tags, 0));
+  ASSERT_EQ(3u, pts.size);
+  EXPECT_EQ(7.0f, pts[0].x);
+  EXPECT_EQ(ZvPointTag_Continue, tags[0]);
+  EXPECT_EQ(ZvPointTag_Last, tags[2]);
+  EXPECT_EQ(0u, line.IntersectSamplePointsExtent(gc, EF(20, 20, 30, 30), pts, tags, 0));
+  EXPECT_EQ(10u, line.IntersectSamplePointsExtent(gc, EF(0, 0, 0, 0, EF::Infinite), pts, tags, 0));
+  EXPECT_EQ(13u, tags.size);
+}
+
+}  // namespace
