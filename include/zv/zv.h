@@ -4,6 +4,7 @@
 
 #include <zv/api.h>
 #include <zv/arrays.h>
+#include <zv/bezier_tool.h>
 #include <zv/critical_section.h>
 #include <zv/fcurve.h>
 #include <zv/fcurve_userdata.h>
