@@ -18,19 +18,6 @@ unsigned int ZvStdFCurve::Paste(const ZvBaseFCurve&, double, double) {
 unsigned int ZvStdFCurve::ReduceNumKeys(double, double, double) {
   return 0;
 }
-unsigned int ZvStdFCurve::EvalSequence(double, double, double, double, ZvDoubleArray&,
-                                       ZvDoubleArray&, int) const {
-  return 0;
-}
-unsigned int ZvStdFCurve::Flatten(const ZvTransfo4&, double, ZvPoint2dArray&, ZvPointTagArray&,
-                                  int) const {
-  return 0;
-}
-unsigned int ZvStdFCurve::FlattenFromTo(const ZvExtent2<double>&, const ZvTransfo4&, double,
-                                        ZvPoint2dArray&, ZvPointTagArray&, ZvBoolArray&,
-                                        int) const {
-  return 0;
-}
 unsigned int ZvStdFCurve::MirrorParameters() {
   return 0;
 }
