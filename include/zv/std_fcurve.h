@@ -19,9 +19,10 @@
 // the segment starts from where the last one ended. Every public operation takes the curve's
 // lock, queries included.
 //
-// Not available yet; these refuse with 0 (or null) and change nothing: SnapShot, Cut, Append,
-// Paste, ReduceNumKeys, EvalSequence, Flatten, FlattenFromTo, MirrorParameters,
-// ScaleAndOffsetParameters, GetBufferSize, WriteToBuffer, ReadFromBufferBody.
+// Persistence is not available yet: GetBufferSize, WriteToBuffer and ReadFromBufferBody refuse
+// with 0 and change nothing. ScaleAndOffsetParameters does what concerns every key (a scale, a
+// mirror, a shift of the whole curve) and refuses with 0 a change of part of the keys, which
+// needs the interactive key stretcher and mover.
 #ifndef ZV_STD_FCURVE_H
 #define ZV_STD_FCURVE_H
 
@@ -46,7 +47,18 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   // segment if they fold back. The first point must lie left of the last.
   ZvStdFCurve(const ZvPoint2<double>& p0, const ZvPoint2<double>& p1, const ZvPoint2<double>& p2,
               const ZvPoint2<double>& p3);
+  // A curve through points in ascending parameter order. DPCatmullRom: cubic segments through
+  // every point, each tangent along the chord of the neighbours. DPCubicC2: the natural cubic
+  // spline through every point. DPLinearFitC0: lines, a key where a point leaves the current
+  // line by more than the tolerance. DPCubicFitG1: a cubic spline with continuous tangents that
+  // passes within the tolerance of every point, on as few keys as it needs. The last key takes
+  // `lastSegmentKind`. Points out of order, or not finite, give a curve without keys.
+  ZvStdFCurve(const ZvPoint2dArray& points, DPMethod method, double tolerance,
+              FSKind firstSegmentKind, FSKind lastSegmentKind);
   ZvStdFCurve(const ZvStdFCurve& other);
+  // The part of `source` from start to end: keys made at both ends without changing the shape,
+  // the keys outside gone with their user data, automatic handles at the cuts frozen.
+  ZvStdFCurve(const ZvStdFCurve& source, double start, double end);
   ~ZvStdFCurve() override;
   ZvStdFCurve& operator=(const ZvStdFCurve& other);
 
