@@ -46,6 +46,15 @@ ZvStdFCurve::ZvStdFCurve(const ZvPoint2<double>& p0, const ZvPoint2<double>& p1,
   m_impl->keys.Add(b);
 }
 
+ZvStdFCurve::ZvStdFCurve(double startParameter, double startValue, double endParameter,
+                         double endValue)
+    : ZvStdFCurve(ZvPoint2<double>{startParameter, startValue},
+                  ZvPoint2<double>{startParameter + (endParameter - startParameter) / 3.0,
+                                   startValue + (endValue - startValue) / 3.0},
+                  ZvPoint2<double>{endParameter - (endParameter - startParameter) / 3.0,
+                                   endValue - (endValue - startValue) / 3.0},
+                  ZvPoint2<double>{endParameter, endValue}) {}
+
 ZvStdFCurve::ZvStdFCurve(const ZvStdFCurve& other) : ZvStdFCurve(other, ZvFCurveLockGuard(other)) {}
 
 ZvStdFCurve::ZvStdFCurve(const ZvStdFCurve& other, const ZvFCurveLockGuard&)

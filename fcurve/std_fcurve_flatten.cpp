@@ -119,6 +119,11 @@ class Assembler {
     const bool cycles = n >= 2 && (s.extrapolation == ZvBaseFCurve::CycleExtrapolation ||
                                    s.extrapolation == ZvBaseFCurve::CycleWithOffsetExtrapolation);
     if (cycles) return RunCycles(pa, pb, x0, xn);
+    if (n == 1 && pa == x0 && pb == x0) {
+      // A lone key shows as its step from the left value to the right one.
+      Line(x0, s.keys[0].leftValue, x0, s.keys[0].rightValue);
+      return true;
+    }
     if (pa < x0) {
       const double e = pb < x0 ? pb : x0;
       Line(

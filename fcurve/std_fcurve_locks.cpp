@@ -189,6 +189,28 @@ unsigned int ZvStdFCurve::FreezeAllTangents(KeyConstraint constraints) {
                                   constraints);
 }
 
+unsigned int ZvStdFCurve::AdjustAdjacentAutomaticKeysTangents(double parameter) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  unsigned int i;
+  if (s.readOnly || !s.GetClosestKeyIndexInCenteredInterval(parameter, kCFCParameterEpsilon, i)) {
+    return 0;
+  }
+  const unsigned int first = i > 0 ? i - 1 : 0, last = i + 1 < s.keys.size ? i + 1 : i;
+  // Read before written: each evaluated handle depends on the neighbours.
+  ZvPoint2<double> left[3], right[3];
+  for (unsigned int k = first; k <= last; ++k) {
+    left[k - first] = s.GetEvaluatedLeftTgt(k);
+    right[k - first] = s.GetEvaluatedRightTgt(k);
+  }
+  for (unsigned int k = first; k <= last; ++k) {
+    if (!(s.keys[k].flags & CFCFlag_AutoTangent)) continue;
+    s.SetActualLeftTgt(k, left[k - first]);
+    s.SetActualRightTgt(k, right[k - first]);
+  }
+  return 1;
+}
+
 unsigned int ZvStdFCurve::GetConstraintAtIndex(unsigned int index, KeyConstraint constraint,
                                                int& on) const {
   ZvFCurveLockGuard guard(*this);

@@ -19,6 +19,12 @@
 // the segment starts from where the last one ended. Every public operation takes the curve's
 // lock, queries included.
 //
+// Flattening. Flatten and FlattenFromTo append a tagged polyline to the arrays (tags
+// ZvPointTag_First, _Continue, _Last per run; a jump in value is a vertical edge inside a run)
+// and return 1. Flatten covers the keys; FlattenFromTo covers the parameters that a box in
+// transformed space shows, with extrapolation, clipped to the box. EvalSequence samples that
+// polyline at regular steps and replaces the contents of its arrays.
+//
 // Persistence is not available yet: GetBufferSize, WriteToBuffer and ReadFromBufferBody refuse
 // with 0 and change nothing. ScaleAndOffsetParameters does what concerns every key (a scale, a
 // mirror, a shift of the whole curve) and refuses with 0 a change of part of the keys, which
@@ -47,6 +53,9 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   // segment if they fold back. The first point must lie left of the last.
   ZvStdFCurve(const ZvPoint2<double>& p0, const ZvPoint2<double>& p1, const ZvPoint2<double>& p2,
               const ZvPoint2<double>& p3);
+  // One straight cubic segment from (startParameter, startValue) to (endParameter, endValue),
+  // handles at the thirds of the chord. The start must lie left of the end.
+  ZvStdFCurve(double startParameter, double startValue, double endParameter, double endValue);
   // A curve through points in ascending parameter order. DPCatmullRom: cubic segments through
   // every point, each tangent along the chord of the neighbours. DPCubicC2: the natural cubic
   // spline through every point. DPLinearFitC0: lines, a key where a point leaves the current
@@ -259,6 +268,10 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   unsigned int FreezeTangentsInInterval(double first, double last, int excludeFirst,
                                         int excludeLast, KeyConstraint constraints);
   unsigned int FreezeAllTangents(KeyConstraint constraints);
+  // The keys with AutoTangent at the parameter and next to it take their evaluated handles as
+  // actual handles, keeping the flag, so that they keep their shape once the flag goes. 0 on a
+  // read-only curve or without a key at the parameter.
+  unsigned int AdjustAdjacentAutomaticKeysTangents(double parameter);
   unsigned int GetConstraintAtIndex(unsigned int index, KeyConstraint constraint, int& on) const;
   unsigned int SetConstraintAtIndex(unsigned int index, KeyConstraint constraints, int on);
 

@@ -153,3 +153,15 @@ TEST(StdEditConstruct, SingleKeyAndSingleSegment) {
 }
 
 }  // namespace
+
+namespace {
+
+TEST(StdEditConstruct, StraightSegmentFromFourNumbers) {
+  const ZvStdFCurve segment(1.0, 2.0, 4.0, 8.0);
+  ASSERT_EQ(segment.GetNumKeys(), 2u);
+  EXPECT_NEAR(segment.Eval(2.5, 0), 5.0, 1e-12);
+  const ZvStdFCurve reversed(4.0, 2.0, 1.0, 8.0);
+  EXPECT_EQ(reversed.GetNumKeys(), 0u);
+}
+
+}  // namespace

@@ -79,7 +79,14 @@ TEST(StdEditFlatten, TransformedPointsMapBackOntoTheCurve) {
   ExpectOnCurve(curve, out.points, out.tags, 0.25 / 25.0 * 2.0);
 }
 
-TEST(StdEditFlatten, EmptyCurveIsAHorizontalPiece) {
+TEST(StdEditFlatten, EmptyCurveIsAHorizontalPieceAndOneKeyItsStep) {
+  ZvStdFCurve key(2.0, 1.0, 3.0, C::CubicSegment, C::CubicSegment);
+  Polyline step;
+  ASSERT_EQ(key.Flatten(ZvTransfo4(), 0.1, step.points, step.tags, 0), 1u);
+  ASSERT_EQ(step.points.size, 2u);
+  EXPECT_EQ(step.points[0].y, 1.0);
+  EXPECT_EQ(step.points[1].y, 3.0);
+
   ZvStdFCurve curve(3.5);
   Polyline out;
   ASSERT_EQ(curve.Flatten(ZvTransfo4(), 0.1, out.points, out.tags, 0), 1u);

@@ -137,3 +137,31 @@ TEST(StdEditTangents, ConstraintsByIndex) {
 }
 
 }  // namespace
+
+namespace {
+
+TEST(StdEditTangents, AdjustingAutomaticNeighboursKeepsTheirShape) {
+  ZvStdFCurve curve = stdedit::Mixed();
+  for (double t : {1.5, 3.0, 4.5}) {
+    double at = t;
+    curve.SetConstraint(at, C::AutoTangent, 1, 0.0);
+  }
+  const std::vector<double> before = stdedit::Sample(curve, 0.0, 6.0, 300);
+  ASSERT_EQ(curve.AdjustAdjacentAutomaticKeysTangents(3.0), 1u);
+  ZvPoint2<double> actualL, actualR, evalL, evalR;
+  for (double t : {1.5, 3.0, 4.5}) {
+    curve.GetActualKeyTgtHandles(t, actualL, actualR, 0.0);
+    curve.GetEvaluatedKeyTgtHandles(t, evalL, evalR, 0.0);
+    EXPECT_NEAR(actualR.y, evalR.y, 1e-12) << t;
+    double at = t;
+    int on = 0;
+    curve.GetConstraint(at, C::AutoTangent, on, 0.0);
+    EXPECT_EQ(on, 1);
+    curve.SetConstraint(at, C::AutoTangent, 0, 0.0);
+  }
+  // With the flags gone the shape stays.
+  stdedit::ExpectSameShape(before, stdedit::Sample(curve, 0.0, 6.0, 300), 1e-12);
+  EXPECT_EQ(curve.AdjustAdjacentAutomaticKeysTangents(3.3), 0u);
+}
+
+}  // namespace
