@@ -97,16 +97,17 @@ size_t AggPass(double scale) {
   static agg::curve4_div curve;
   curve.approximation_scale(scale);
   size_t points = 0;
-  double sink = 0, x, y;
+  double x, y;
   for (const Cubic& c : Cubics()) {
     curve.init(c.p[0].x, c.p[0].y, c.p[1].x, c.p[1].y, c.p[2].x, c.p[2].y, c.p[3].x, c.p[3].y);
     curve.rewind(0);
     while (!agg::is_stop(curve.vertex(&x, &y))) {
-      sink += x;
+      // Materialise each point without chaining the points through a sum.
+      benchmark::DoNotOptimize(x);
+      benchmark::DoNotOptimize(y);
       ++points;
     }
   }
-  benchmark::DoNotOptimize(sink);
   return points;
 }
 
@@ -168,10 +169,12 @@ size_t CairoFlatten(cairo_t* cr, const Cubic& c, Sink&& sink) {
 size_t CairoPass(double tolerance) {
   cairo_t* cr = CairoFor(tolerance);
   size_t points = 0;
-  double sum = 0;
-  for (const Cubic& c : Cubics())
-    points += CairoFlatten(cr, c, [&](double x, double) { sum += x; });
-  benchmark::DoNotOptimize(sum);
+  for (const Cubic& c : Cubics()) {
+    points += CairoFlatten(cr, c, [](double x, double y) {
+      benchmark::DoNotOptimize(x);
+      benchmark::DoNotOptimize(y);
+    });
+  }
   return points;
 }
 
@@ -313,8 +316,9 @@ class CollectingReporter : public benchmark::ConsoleReporter {
 int main(int argc, char** argv) {
   Cubics();
   const std::vector<Method> methods = Methods();
-  for (const Method& m : methods) {
-    for (double tol : kTolerances) {
+  // Tolerance-major, so that the methods compared with each other run next to each other.
+  for (double tol : kTolerances) {
+    for (const Method& m : methods) {
       benchmark::RegisterBenchmark(Key(m.name, tol).c_str(), [&m, tol](benchmark::State& state) {
         size_t points = 0;
         for (auto _ : state)

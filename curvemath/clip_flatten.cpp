@@ -24,7 +24,7 @@ void CloseLastPiece(ZvPointTagArray& tags, ZvBoolArray& flags, int flag) {
 }
 
 // Starts (or continues) a piece at `start` on the unclipped path. An interrupted piece keeps
-// flag 0 on its last vertex here, where the clipped path leaves 1: readers tell the two apart.
+// flag 0 on its last vertex here, where the clipped path leaves 1; the difference is intended.
 void StartUnclippedPiece(const ZvPoint2<double>& start, ZvPoint2dArray& points,
                          ZvPointTagArray& tags, ZvBoolArray& flags) {
   if (points.size == 0) {

@@ -22,59 +22,6 @@ inline bool zvIsOutsideGrownRange(double c0, double c1, double c2, double c3, do
   return q < lo - grow || q > hi + grow;
 }
 
-// What differs between plane and space curves: how the third difference is measured, how far
-// the second differences stray from the chord, and the search primitives of point location.
-struct ZvCubicGeom2 {
-  using Point = ZvPoint2<double>;
-
-  static double ThirdDifferenceLength(const Point& d) { return zvGuardedLength(d); }
-
-  // Distance of the second differences from the chord line, by the 2-D cross product. Rounded
-  // division by the same chord is monotone, so dividing the larger one alone gives the same e.
-  static double Deviation(const Point& a1, const Point& a2, const Point& k, double chord) {
-    const double c1 = std::fabs(a1.x * k.y - a1.y * k.x);
-    const double c2 = std::fabs(a2.x * k.y - a2.y * k.x);
-    return (c1 > c2 ? c1 : c2) / chord;
-  }
-
-  static bool IsOutsideGrownControlBox(const Point* p, const Point& q, double grow) {
-    return zvIsOutsideGrownRange(p[0].x, p[1].x, p[2].x, p[3].x, q.x, grow) ||
-           zvIsOutsideGrownRange(p[0].y, p[1].y, p[2].y, p[3].y, q.y, grow);
-  }
-
-  static int FindClosestPointOnLineSegment(const Point& q, const Point& a, const Point& b,
-                                           double maxDistance2, double& d2, double& t) {
-    return ZvPoint2_FindClosestPointOnLineSegment<double>(q, a, b, maxDistance2, d2, t);
-  }
-};
-
-struct ZvCubicGeom3 {
-  using Point = ZvPoint3<double>;
-
-  // Space curves measure the third difference without the length guard.
-  static double ThirdDifferenceLength(const Point& d) { return std::sqrt(ZvDot(d, d)); }
-
-  // Distance of each second difference from its projection on the chord.
-  static double Deviation(const Point& a1, const Point& a2, const Point& k, double chord) {
-    const double chord2 = chord * chord;
-    const Point r1 = k * (ZvDot(a1, k) / chord2) - a1;
-    const Point r2 = k * (ZvDot(a2, k) / chord2) - a2;
-    const double l1 = ZvDot(r1, r1), l2 = ZvDot(r2, r2);
-    return std::sqrt(l1 > l2 ? l1 : l2);  // sqrt is monotone: one root serves
-  }
-
-  static bool IsOutsideGrownControlBox(const Point* p, const Point& q, double grow) {
-    return zvIsOutsideGrownRange(p[0].x, p[1].x, p[2].x, p[3].x, q.x, grow) ||
-           zvIsOutsideGrownRange(p[0].y, p[1].y, p[2].y, p[3].y, q.y, grow) ||
-           zvIsOutsideGrownRange(p[0].z, p[1].z, p[2].z, p[3].z, q.z, grow);
-  }
-
-  static int FindClosestPointOnLineSegment(const Point& q, const Point& a, const Point& b,
-                                           double maxDistance2, double& d2, double& t) {
-    return ZvPoint3_FindClosestPointOnLineSegment<double>(q, a, b, maxDistance2, d2, t);
-  }
-};
-
 // Truncation to an unsigned 32-bit count. Out of range (a zero tolerance, an overflowing
 // curve) the count means nothing; it saturates so that the conversion stays defined.
 inline unsigned int zvTruncateToCount(double v) {
@@ -111,24 +58,103 @@ inline unsigned int zvForwardDifferencingLevels(double e, double factor) {
   return levels;
 }
 
+// zvForwardDifferencingLevels(num / sqrt(l2), factor), for a plane piece whose deviation is
+// num / chord with chord = sqrt(l2) > 0, mostly without the square root and the division that
+// dominate the cost of a piece. With x = num * factor, the piece takes one more level at each
+// v = x / chord reaching 4^j - 0.5, that is at each x^2 reaching (4^j - 0.5)^2 l2. For the
+// usual levels 0 to 3, x^2 is compared with those bounds directly; a value within 1e-12 of a
+// bound (the rounding of either route stays below 1e-15) or past the fourth goes the exact way.
+inline unsigned int zvLevelsOfQuotient(double num, double l2, double factor) {
+  const double x = num * factor;
+  const double q = x * x;
+  const double b0 = 0.25 * l2, b1 = 12.25 * l2, b2 = 240.25 * l2, b3 = 4032.25 * l2;
+  const bool clear = num > 0.0 && factor > 0.0 && l2 < 1e280 && q < b3 * (1.0 - 1e-12) &&
+                     std::fabs(q - b0) > 1e-12 * b0 && std::fabs(q - b1) > 1e-12 * b1 &&
+                     std::fabs(q - b2) > 1e-12 * b2;
+  if (clear) return (q >= b0) + (q >= b1) + (q >= b2);
+  return zvForwardDifferencingLevels(num / std::sqrt(l2), factor);
+}
+
+// What differs between plane and space curves: how the third difference is measured, how the
+// straying of the second differences from the chord becomes levels, and the search primitives
+// of point location.
+struct ZvCubicGeom2 {
+  using Point = ZvPoint2<double>;
+
+  static double ThirdDifferenceLength(const Point& d) { return zvGuardedLength(d); }
+
+  // Levels from the distance of the second differences from the chord line, by the 2-D cross
+  // product. False when the chord is null (guarded length 0). Rounded division by the same
+  // chord is monotone, so the larger cross product alone decides.
+  static bool ChordLevels(const Point& a1, const Point& a2, const Point& k, double factor,
+                          unsigned int& levels) {
+    const double l2 = k.x * k.x + k.y * k.y;
+    if (l2 <= 1e-9) return false;
+    const double c1 = std::fabs(a1.x * k.y - a1.y * k.x);
+    const double c2 = std::fabs(a2.x * k.y - a2.y * k.x);
+    levels = zvLevelsOfQuotient(c1 > c2 ? c1 : c2, l2, factor);
+    return true;
+  }
+
+  static bool IsOutsideGrownControlBox(const Point* p, const Point& q, double grow) {
+    return zvIsOutsideGrownRange(p[0].x, p[1].x, p[2].x, p[3].x, q.x, grow) ||
+           zvIsOutsideGrownRange(p[0].y, p[1].y, p[2].y, p[3].y, q.y, grow);
+  }
+
+  static int FindClosestPointOnLineSegment(const Point& q, const Point& a, const Point& b,
+                                           double maxDistance2, double& d2, double& t) {
+    return ZvPoint2_FindClosestPointOnLineSegment<double>(q, a, b, maxDistance2, d2, t);
+  }
+};
+
+struct ZvCubicGeom3 {
+  using Point = ZvPoint3<double>;
+
+  // Space curves measure the third difference without the length guard.
+  static double ThirdDifferenceLength(const Point& d) { return std::sqrt(ZvDot(d, d)); }
+
+  // Levels from the distance of each second difference from its projection on the chord.
+  // False when the chord is null.
+  static bool ChordLevels(const Point& a1, const Point& a2, const Point& k, double factor,
+                          unsigned int& levels) {
+    const double chord = zvGuardedLength(k);
+    if (std::fabs(chord) <= 1e-15) return false;
+    levels = zvForwardDifferencingLevels(Deviation(a1, a2, k, chord), factor);
+    return true;
+  }
+
+  static double Deviation(const Point& a1, const Point& a2, const Point& k, double chord) {
+    const double chord2 = chord * chord;
+    const Point r1 = k * (ZvDot(a1, k) / chord2) - a1;
+    const Point r2 = k * (ZvDot(a2, k) / chord2) - a2;
+    const double l1 = ZvDot(r1, r1), l2 = ZvDot(r2, r2);
+    return std::sqrt(l1 > l2 ? l1 : l2);  // sqrt is monotone: one root serves
+  }
+
+  static bool IsOutsideGrownControlBox(const Point* p, const Point& q, double grow) {
+    return zvIsOutsideGrownRange(p[0].x, p[1].x, p[2].x, p[3].x, q.x, grow) ||
+           zvIsOutsideGrownRange(p[0].y, p[1].y, p[2].y, p[3].y, q.y, grow) ||
+           zvIsOutsideGrownRange(p[0].z, p[1].z, p[2].z, p[3].z, q.z, grow);
+  }
+
+  static int FindClosestPointOnLineSegment(const Point& q, const Point& a, const Point& b,
+                                           double maxDistance2, double& d2, double& t) {
+    return ZvPoint3_FindClosestPointOnLineSegment<double>(q, a, b, maxDistance2, d2, t);
+  }
+};
+
 // Forward-differencing levels of one piece, before any cap; factor is 0.75 / tolerance.
 template <class G>
 inline unsigned int zvCubicLevels(const typename G::Point* p, double factor) {
   using Point = typename G::Point;
   const Point d0 = p[1] - p[0], d1 = p[2] - p[1], d2 = p[3] - p[2];
-  const Point k = p[3] - p[0];
-  const double chord = zvGuardedLength(k);
-  double e;
-  if (std::fabs(chord) <= 1e-15) {
-    // Closed or nearly closed piece: the chord gives no direction, so the spread of the
-    // controls around P0 stands in for the deviation.
-    const double l1 = zvGuardedLength(d0);
-    const double l2 = zvGuardedLength(p[2] - p[0]);
-    e = l1 > l2 ? l1 : l2;
-  } else {
-    e = G::Deviation(d1 - d0, d2 - d1, k, chord);
-  }
-  return zvForwardDifferencingLevels(e, factor);
+  unsigned int levels;
+  if (G::ChordLevels(d1 - d0, d2 - d1, p[3] - p[0], factor, levels)) return levels;
+  // Closed or nearly closed piece: the chord gives no direction, so the spread of the controls
+  // around P0 stands in for the deviation.
+  const double l1 = zvGuardedLength(d0);
+  const double l2 = zvGuardedLength(p[2] - p[0]);
+  return zvForwardDifferencingLevels(l1 > l2 ? l1 : l2, factor);
 }
 
 inline ZvPoint2<double> zvLdexp(const ZvPoint2<double>& v, int e) {

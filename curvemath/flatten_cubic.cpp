@@ -7,8 +7,8 @@
 
 namespace {
 
-// Plane curves in double. Forward differencing is capped at 2^10 steps per piece: these
-// polylines feed the rasterisers, whose edge tables are sized on that bound.
+// Plane curves in double. This form alone caps forward differencing at 2^10 steps per piece;
+// the float and space forms and the locators walk as many steps as the deviation asks for.
 struct Flat2d {
   using Geom = ZvCubicGeom2;
   using Source = ZvPoint2<double>;

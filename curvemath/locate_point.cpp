@@ -8,7 +8,7 @@ namespace {
 
 // Walks all 2^levels segments of the piece [t0, t1], the last one ending on the computed point
 // rather than on P3, and keeps the first segment reaching a strictly smaller squared distance.
-// No cap on levels here: location is not bound by the rasterisers' edge tables.
+// Unlike the plane flatten, the levels are not capped here.
 template <class G>
 bool CubicForwardDifferencingForPointLocation(const typename G::Point* p, double factor,
                                               const typename G::Point& point, double limit,
@@ -62,8 +62,7 @@ template <class G>
 int LocatePoint(const typename G::Point* p, double tolerance, const typename G::Point& point,
                 double distance, bool boxByLimit, double& outDistance2, double& outT) {
   if (!p) return 0;
-  // Squared tolerance plus a plain distance: this exact mix is what callers' pick distances
-  // were tuned against.
+  // A squared tolerance plus a plain distance: the mix is part of the behaviour, not a slip.
   const double limit = tolerance * tolerance + distance;
   if (G::IsOutsideGrownControlBox(p, point, boxByLimit ? limit : distance)) return 0;
   double factor;

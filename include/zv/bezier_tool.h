@@ -13,10 +13,11 @@
 // ---------------------------------------------------------------------------------------------
 // Flattening
 //
-// A flatten appends a polyline that follows the cubic within `tolerance` and returns the number
-// of points it appended. With `skipFirst` 0 the first appended point is P0; otherwise the array
-// is taken to end at P0 already and P0 is not added. The last point is always P3 itself, copied
-// from the control point, never recomputed.
+// A flatten appends a polyline that follows the cubic to about `tolerance` and returns the
+// number of points it appended. (The flatness measure looks across each piece's chord only, so
+// at tight turns the polyline can stray well beyond it.) With `skipFirst` 0 the first appended
+// point is P0; otherwise the array is taken to end at P0 already and P0 is not added. The last
+// point is always P3 itself, copied from the control point, never recomputed.
 //
 // The subdivision is fixed up front from the length of the third difference of the control
 // points: the curve is halved floor(log8(|D| / tolerance + 0.5)) times, and each piece is then
@@ -86,8 +87,8 @@ ZV_API int ClipAndAddLineSegment(ZvPoint2<double>& a, ZvPoint2<double>& b,
 // polyline a flatten would produce (without the 1023 cap). Returns 1 and writes the squared
 // distance and the parameter when one is found whose squared distance is at most `distance`.
 // Note: the squared distance is compared with the plain `distance`, and segments are searched
-// within tolerance * tolerance + distance; both are kept as they are because callers have tuned
-// their pick distances against them. Returns 0 with both outputs unchanged otherwise.
+// within tolerance * tolerance + distance. Both mixes of squared and plain values are part of
+// the behaviour hit tests depend on. Returns 0 with both outputs unchanged otherwise.
 // The 2d form gives up at once when the point lies farther than `distance` from the control
 // box; the 3d form uses the search limit for that test instead.
 // ---------------------------------------------------------------------------------------------
