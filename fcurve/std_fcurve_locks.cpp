@@ -14,9 +14,9 @@ namespace {
 // AutoTangent, CollapsedTangent and ChordTangent.
 constexpr unsigned int kFreezableCodes = 3008;
 
+// Does a cubic segment start or end at key i? What lies beyond the end keys is no segment.
 bool TouchesCubic(const ZvStdFCurveImpl& s, unsigned int i) {
-  const unsigned int before = i > 0 ? s.keys[i - 1].segmentKind : s.firstSegmentKind;
-  return before == ZvBaseFCurve::CubicSegment ||
+  return (i > 0 && s.keys[i - 1].segmentKind == ZvBaseFCurve::CubicSegment) ||
          (i + 1 < s.keys.size && s.keys[i].segmentKind == ZvBaseFCurve::CubicSegment);
 }
 

@@ -217,7 +217,9 @@ unsigned int ZvStdFCurve::Paste(const ZvBaseFCurve& source, double start, double
     s.keys.InsertBefore(a + 1, s.keys[a]);
     ok = s.MoveTail(a + 1, length, *this);
   } else if (b > a) {
-    ok = s.MoveTail(a + 1, lo + length - hi, *this);
+    // A piece as long as the interval leaves the tail where it is, rounding included.
+    const double delta = lo + length - hi;
+    if (std::fabs(delta) > 1e-12 * (1.0 + std::fabs(hi))) ok = s.MoveTail(a + 1, delta, *this);
   }
   if (ok)
     ok = b == a && length <= 0.0 ? s.SpliceAfter(a, p, piece, false, *this)

@@ -23,7 +23,8 @@
 // ZvPointTag_First, _Continue, _Last per run; a jump in value is a vertical edge inside a run)
 // and return 1. Flatten covers the keys; FlattenFromTo covers the parameters that a box in
 // transformed space shows, with extrapolation, clipped to the box. EvalSequence samples that
-// polyline at regular steps and replaces the contents of its arrays.
+// polyline at regular steps and replaces the contents of its arrays. Under the cycle methods a
+// box showing more than a million periods is refused with 0.
 //
 // Persistence is not available yet: GetBufferSize, WriteToBuffer and ReadFromBufferBody refuse
 // with 0 and change nothing. ScaleAndOffsetParameters does what concerns every key (a scale, a

@@ -181,6 +181,15 @@ TEST(StdEditWhole, ReduceThinsLinesAndRefitsCubics) {
   for (int i = 0; i <= 60; ++i)
     points.Add({i * 0.1, std::sin(i * 0.1)});
   ZvStdFCurve dense(points, ZvStdFCurve::DPCatmullRom, 0.0, C::CubicSegment, C::CubicSegment);
+  // A part of the range first: the keys after it stay exactly where they were.
+  ZvStdFCurve part = dense;
+  ASSERT_EQ(part.ReduceNumKeys(0.0, 2.95, 1e-3), 1u);
+  ZvDoubleArray was(64), now(64);
+  dense.GetAllKeyParameters(was);
+  part.GetAllKeyParameters(now);
+  ASSERT_LT(now.size, was.size);
+  for (unsigned int i = 1; i <= 31; ++i)
+    EXPECT_EQ(now[now.size - i], was[was.size - i]) << i;
   double at = 3.0;
   dense.SetConstraint(at, C::ValueLock, 1, 0.0);
   ASSERT_EQ(dense.ReduceNumKeys(0.0, 6.0, 1e-3), 1u);
