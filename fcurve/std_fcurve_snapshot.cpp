@@ -49,6 +49,23 @@ double FoldEnd(double hi, double t0, double tn, double& cycle) {
   return folded < t0 ? t0 : folded > tn ? tn : folded;
 }
 
+// Moves a snapshot under construction along either axis. Its keys carry the source's locks,
+// which guard the source against edits, not the copies against being put in place.
+void MoveAlong(ZvStdFCurveImpl& s, ZvBaseFCurve& curve, double dx, double dy) {
+  for (unsigned int i = 0; i < s.keys.size; ++i) {
+    CFCStdKey& k = s.keys[i];
+    k.parameter += dx;
+    k.leftTangent.x += dx;
+    k.rightTangent.x += dx;
+    k.leftValue += dy;
+    k.rightValue += dy;
+    k.leftTangent.y += dy;
+    k.rightTangent.y += dy;
+  }
+  s.valueWhenNoKeys += dy;
+  if (dx != 0.0) curve.TranslateAllKeyUserData(dx);
+}
+
 }  // namespace
 
 ZvBaseFCurve* ZvStdFCurve::SnapShot(double start, double end, ExtrapolationMethod method) const {
@@ -88,25 +105,25 @@ ZvBaseFCurve* ZvStdFCurve::SnapShot(double start, double end, ExtrapolationMetho
         if (fs < tn) {
           out = section(fs, tn);
           out->m_impl->readOnly = 0;
-          if (offset != 0.0) out->ShiftValues(a * offset);
+          MoveAlong(*out->m_impl, *out, 0.0, a * offset);
         }
         if (a + 1 < b) {
           ZvStdFCurve whole(*this);
           whole.m_impl->readOnly = 0;
-          whole.ShiftValues((a + 1) * offset);
+          MoveAlong(*whole.m_impl, whole, 0.0, (a + 1) * offset);
           for (double c = a + 1; c < b; c += 1.0) {
             if (out) {
               out->Append(whole);
             } else {
               out.reset(new ZvStdFCurve(whole));
             }
-            whole.ShiftValues(offset);
+            MoveAlong(*whole.m_impl, whole, 0.0, offset);
           }
         }
         if (fe > t0) {
           Curve last = section(t0, fe);
           last->m_impl->readOnly = 0;
-          last->ShiftValues(b * offset);
+          MoveAlong(*last->m_impl, *last, 0.0, b * offset);
           if (out) {
             out->Append(*last);
           } else {
@@ -115,7 +132,7 @@ ZvBaseFCurve* ZvStdFCurve::SnapShot(double start, double end, ExtrapolationMetho
         }
       }
       if (!out) return nullptr;
-      out->ShiftParameters(shift);
+      MoveAlong(*out->m_impl, *out, shift, 0.0);
     } else {
       const double t0 = s.keys[0].parameter, tn = s.keys[n - 1].parameter;
       const unsigned int ext = s.extrapolation;

@@ -129,6 +129,8 @@ TEST(StdEditWhole, MirroredParametersTurnTheCurveAboutItsMiddle) {
 
 TEST(StdEditWhole, SnapShotMatchesTheCurveOnItsInterval) {
   ZvStdFCurve curve = stdedit::Mixed();
+  double locked = 3.0;  // locks guard the source; the snapshot's copies are still put in place
+  curve.SetConstraint(locked, C::WholeKeyLock, 1, 0.0);
   for (int m = 1; m <= 4; ++m) {
     curve.SetExtrapolationMethod(static_cast<C::ExtrapolationMethod>(m));
     const double spans[][2] = {{-3.0, 12.0}, {-3.0, -1.0}, {-2.0, 5.0},   {1.0, 6.0},
