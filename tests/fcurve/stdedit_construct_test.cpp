@@ -150,16 +150,10 @@ TEST(StdEditConstruct, SingleKeyAndSingleSegment) {
   const ZvStdFCurve segment({0, 0}, {2.5, 1}, {-0.5, 1}, {1, 0});
   EXPECT_EQ(segment.GetNumKeys(), 2u);
   EXPECT_EQ(segment.IsValid(), 1u);
-}
-
-}  // namespace
-
-namespace {
-
-TEST(StdEditConstruct, StraightSegmentFromFourNumbers) {
-  const ZvStdFCurve segment(1.0, 2.0, 4.0, 8.0);
-  ASSERT_EQ(segment.GetNumKeys(), 2u);
-  EXPECT_NEAR(segment.Eval(2.5, 0), 5.0, 1e-12);
+  // Four numbers: a straight cubic.
+  const ZvStdFCurve straight(1.0, 2.0, 4.0, 8.0);
+  ASSERT_EQ(straight.GetNumKeys(), 2u);
+  EXPECT_NEAR(straight.Eval(2.5, 0), 5.0, 1e-12);
   const ZvStdFCurve reversed(4.0, 2.0, 1.0, 8.0);
   EXPECT_EQ(reversed.GetNumKeys(), 0u);
 }

@@ -179,6 +179,29 @@ TEST(StdEditFlatten, BoxInViewSpaceSelectsTheParameters) {
   EXPECT_EQ(none.points.size, 0u);
 }
 
+TEST(StdEditFlatten, ARotatedViewShowsTheParametersUnderItsBox) {
+  const ZvStdFCurve curve = stdedit::Mixed();
+  ZvTransfo4 view;
+  view.Rotate(30.0, 0.0, 0.0, 1.0);
+  const ZvExtent2<double> box(-3.0, -3.0, 3.0, 3.0);
+  Polyline out;
+  ASSERT_EQ(curve.FlattenFromTo(box, view, 0.01, out.points, out.tags, out.flags, 0), 1u);
+  ASSERT_GT(out.points.size, 10u);
+  ZvTransfo4 back;
+  ASSERT_EQ(view.Inverse(back), 1);
+  double lowest = 1e9, highest = -1e9;
+  for (unsigned int i = 0; i < out.points.size; ++i) {
+    EXPECT_LE(std::fabs(out.points[i].x), 3.0 + 1e-9);
+    EXPECT_LE(std::fabs(out.points[i].y), 3.0 + 1e-9);
+    const ZvPoint2<double> q = back.Map(out.points[i]);
+    lowest = q.x < lowest ? q.x : lowest;
+    highest = q.x > highest ? q.x : highest;
+  }
+  // The box's corners reach parameters beyond 0 on the left; the curve is drawn there too.
+  EXPECT_LT(lowest, -0.5);
+  EXPECT_GT(highest, 1.0);
+}
+
 TEST(StdEditFlatten, SequenceMatchesEvalUnderEveryMethod) {
   ZvStdFCurve curve = stdedit::Mixed();
   for (int m = 1; m <= 4; ++m) {

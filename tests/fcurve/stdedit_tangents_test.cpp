@@ -121,25 +121,6 @@ TEST(StdEditTangents, ExcludedEndsFreezeOnlyTheInwardHandle) {
   EXPECT_NEAR(right.y, evalRight.y, 1e-15);
 }
 
-TEST(StdEditTangents, ConstraintsByIndex) {
-  ZvStdFCurve curve = stdedit::Mixed();
-  int on = 1;
-  ASSERT_EQ(curve.GetConstraintAtIndex(2, C::ValueLock, on), 1u);
-  EXPECT_EQ(on, 0);
-  ASSERT_EQ(curve.SetConstraintAtIndex(2, C::WholeKeyLock, 1), 1u);
-  curve.GetConstraintAtIndex(2, C::ParameterLock, on);
-  EXPECT_EQ(on, 1);
-  EXPECT_EQ(curve.AreAnyTgtDirectionsLockedInInterval(3.0, 3.0, 0, 0), 1u);
-  EXPECT_EQ(curve.GetConstraintAtIndex(8, C::ValueLock, on), 0u);
-  EXPECT_EQ(curve.SetConstraintAtIndex(8, C::ValueLock, 1), 0u);
-  curve.SetReadOnlyConstraint(1);
-  EXPECT_EQ(curve.SetConstraintAtIndex(0, C::ValueLock, 1), 0u);
-}
-
-}  // namespace
-
-namespace {
-
 TEST(StdEditTangents, AdjustingAutomaticNeighboursKeepsTheirShape) {
   ZvStdFCurve curve = stdedit::Mixed();
   for (double t : {1.5, 3.0, 4.5}) {
