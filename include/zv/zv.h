@@ -8,9 +8,13 @@
 #include <zv/critical_section.h>
 #include <zv/fcurve.h>
 #include <zv/fcurve_userdata.h>
+#include <zv/gc.h>
 #include <zv/matrix.h>
+#include <zv/path2f.h>
 #include <zv/point.h>
 #include <zv/polyline.h>
+#include <zv/raster.h>
+#include <zv/shape.h>
 #include <zv/spline.h>
 #include <zv/std_fcurve.h>
 #include <zv/trace.h>

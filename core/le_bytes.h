@@ -1,0 +1,99 @@
+// Little-endian persistence, one byte at a time, so that a block is the same from every build
+// whatever the host's byte order, word size or structure padding.
+//
+// ZvByteWriter appends to a block the caller sized. ZvByteReader reads a block either trusting
+// the caller (unbounded: the caller vouches that the block is complete) or within a known size
+// (bounded: every read is checked first, and a read past the end fails instead of happening).
+// Readers of persistent classes are written once against ZvByteReader and ask Has(n) before each
+// run of reads, which is always true for an unbounded reader; so the trusted and the checked
+// entry points share one body of code.
+//
+// Floats travel as their 32-bit pattern, copied in memory and never through a floating-point
+// register, so that every bit (signalling NaNs included) survives a 32-bit x87 build too.
+#ifndef ZV_CORE_LE_BYTES_H
+#define ZV_CORE_LE_BYTES_H
+
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+
+class ZvByteWriter {
+ public:
+  explicit ZvByteWriter(void* block) : start_(static_cast<unsigned char*>(block)), at_(start_) {}
+
+  void U8(std::uint8_t v) { *at_++ = v; }
+  void U16(std::uint16_t v) {
+    at_[0] = static_cast<unsigned char>(v);
+    at_[1] = static_cast<unsigned char>(v >> 8);
+    at_ += 2;
+  }
+  void U32(std::uint32_t v) {
+    for (int i = 0; i < 4; ++i)
+      at_[i] = static_cast<unsigned char>(v >> (8 * i));
+    at_ += 4;
+  }
+  // The bit pattern of the float stored at `f`.
+  void F32(const float* f) {
+    std::uint32_t bits;
+    std::memcpy(&bits, f, 4);
+    U32(bits);
+  }
+  std::size_t Written() const { return static_cast<std::size_t>(at_ - start_); }
+
+ private:
+  unsigned char* start_;
+  unsigned char* at_;
+};
+
+class ZvByteReader {
+ public:
+  // Unbounded: the caller vouches for the block.
+  explicit ZvByteReader(const void* block)
+      : start_(static_cast<const unsigned char*>(block)), at_(start_), left_(0), bounded_(false) {}
+  // Bounded to `size` bytes.
+  ZvByteReader(const void* block, std::size_t size)
+      : start_(static_cast<const unsigned char*>(block)),
+        at_(start_),
+        left_(size),
+        bounded_(true) {}
+
+  // Whether `count` more bytes may be read. The count is 64-bit so that a caller can ask for
+  // products of stored counts without overflowing first.
+  bool Has(std::uint64_t count) const { return !bounded_ || count <= left_; }
+
+  // Reads without asking: the caller asked Has() for the run first.
+  std::uint8_t U8() { return *Take(1); }
+  std::uint16_t U16() {
+    const unsigned char* p = Take(2);
+    return static_cast<std::uint16_t>(p[0] | (p[1] << 8));
+  }
+  std::uint32_t U32() {
+    const unsigned char* p = Take(4);
+    std::uint32_t v = 0;
+    for (int i = 0; i < 4; ++i)
+      v |= static_cast<std::uint32_t>(p[i]) << (8 * i);
+    return v;
+  }
+  // Stores the next 32-bit pattern into the float at `f`.
+  void F32(float* f) {
+    const std::uint32_t bits = U32();
+    std::memcpy(f, &bits, 4);
+  }
+  void Skip(std::size_t count) { Take(count); }
+
+  std::size_t Consumed() const { return static_cast<std::size_t>(at_ - start_); }
+
+ private:
+  const unsigned char* Take(std::size_t count) {
+    const unsigned char* p = at_;
+    at_ += count;
+    if (bounded_) left_ -= count;
+    return p;
+  }
+  const unsigned char* start_;
+  const unsigned char* at_;
+  std::uint64_t left_;
+  bool bounded_;
+};
+
+#endif

@@ -1,0 +1,84 @@
+// Feeds arbitrary bytes to the bounded shape reader and, when a path comes out, walks its
+// structure the way hosts and the other path operations do: the codes of a foreign block may
+// say anything, and no query may leave the arrays because of them. A written block must read
+// back to the same bytes.
+#include <zv/path2f.h>
+
+#include <cstddef>
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+#include <sstream>
+#include <vector>
+
+namespace {
+
+void Walk(ZvPath2f& path) {
+  const unsigned int n = path.NumPoints();
+  path.NumSegments();
+  path.NumSubpaths();
+  path.NumNodes();
+  path.NumNodesExceptLastNodeOfClosedSubpaths();
+  path.LargestDegree();
+  path.IsPolyline();
+  path.GetCurrentPoint();
+  ZvExtent2<double> extent;
+  path.GetExtent(extent);
+  std::ostringstream dump;
+  dump << path;
+  unsigned int first = 0, last = 0;
+  int closed = 0;
+  for (unsigned int i = 0; i < n; ++i) {
+    path.GetSegmentIndices(i, first, last);
+    if (first >= n || last >= n) std::abort();
+    path.GetSubpathIndices(i, first, last);
+    if (first > i || last < i || last >= n) std::abort();
+    path.GetDegree(i);
+    path.IsEndOfSubpath(i, closed);
+    path.IsSubpathClosed(i);
+    path.IsG1Continuous(i);
+  }
+  ZvPath2fIter it(path);
+  unsigned int subpaths = 0;
+  while (it.GetNextSubPathIndices(first, last))
+    ++subpaths;
+  if (subpaths != path.NumSubpaths()) std::abort();
+  if (n) {
+    ZvPath2f part(path, n / 3, n - 1);
+    part.NumSegments();
+  }
+  for (unsigned int i = 0; i < n && i < 64; ++i) {
+    path.LockG1(i);
+    path.UnlockG1(i);
+    path.OpenSubpath(i);
+  }
+  path.Closeto();
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  unsigned int consumed = 0;
+  ZvShape2f* shape = ZvShape2f_CreateFromBuffer(data, size, consumed);
+  if (!shape) {
+    if (consumed != 0) std::abort();
+    return 0;
+  }
+  if (consumed > size) std::abort();
+  ZvPath2f* path = static_cast<ZvPath2f*>(shape->QueryShapeKind(ZvShape2f::KindPath));
+  if (path) {
+    // What is read is written back identically, bar the bytes a writer leaves at 0.
+    std::vector<unsigned char> block(path->GetBufferSize());
+    path->WriteToBuffer(block.data());
+    unsigned int again = 0;
+    ZvShape2f* copy = ZvShape2f_CreateFromBuffer(block.data(), block.size(), again);
+    if (!copy || again != block.size()) std::abort();
+    std::vector<unsigned char> second(block.size());
+    copy->WriteToBuffer(second.data());
+    if (second != block) std::abort();
+    delete copy;
+    Walk(*path);
+  }
+  delete shape;
+  return 0;
+}

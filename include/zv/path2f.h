@@ -1,0 +1,235 @@
+// ZvPath2f: a list of subpaths built of Bezier segments of degree 1 to 8.
+//
+// Storage is two parallel arrays of equal length: the points (single precision, all subpaths in
+// drawing order) and one code byte per point. All structure (subpaths, segments, degrees,
+// nodes, closedness, tangent locks) is read from the codes; no other index is kept, so every
+// structure query is a linear scan and a path costs 9 bytes a point.
+//
+// A code byte holds the segment code in bits 0..5, the G1 lock of the node in bit 7 (never
+// persisted) and a bit 6 that is kept whenever a code is rewritten. Segment codes:
+//
+//   1          start of a subpath
+//   degree d   the d points of a segment (d-1 control points, then its end node) carry
+//              base(d) .. base(d)+d-1 with base(d) = d(d+1)/2 + 2; the first control point of
+//              the segment is the point before them. If the end node closes its subpath it
+//              carries base(d)+d instead, the closed end code.
+//
+//   degree 1: 3 (closed 4)   2: 5 6 (7)   3: 8 9 10 (11)   4: 12..15 (16)   5: 17..21 (22)
+//   degree 6: 23..28 (29)    7: 30..36 (37)   8: 38..45 (46)
+//
+// Codes 0, 2 and above 46 are illegal; the queries treat such a point as unknown and answer 0.
+// A closed subpath stores its end point, which coincides with its start within 1e-7 per axis;
+// closing never adds an implicit segment. Two paths are siblings when they have the same point
+// count and the same segment codes, lock bits aside.
+//
+// Failure. An appending call that fails to allocate chops both arrays back to their length on
+// entry, releases the lock and lets std::bad_alloc through. Clone, Clear, operator= and the
+// readers swallow it, leaving the documented result.
+#ifndef ZV_PATH2F_H
+#define ZV_PATH2F_H
+
+#include <zv/shape.h>
+
+#include <iosfwd>
+
+class ZvRect2f;
+class ZvOval2f;
+class ZvByteReader;
+
+class ZV_API ZvPath2f : public ZvShape2f {
+ public:
+  // ---- Construction and copying -------------------------------------------------------------
+  // An empty path; `reserve` only sizes the arrays.
+  explicit ZvPath2f(unsigned int reserve = 1);
+  ZvPath2f(const ZvPath2f& other);
+  // Points first..last of `source`, made well formed: the first point starts a subpath, and a
+  // cut through a closed subpath opens it and frees its tangent locks. An empty path when the
+  // range is not inside the source.
+  ZvPath2f(const ZvPath2f& source, unsigned int first, unsigned int last);
+  // A five-point closed polyline starting at corner 2 of the rectangle (defined with ZvRect2f).
+  explicit ZvPath2f(const ZvRect2f& rect);
+  // Four cubics through the oval's edge handles (defined with ZvOval2f).
+  explicit ZvPath2f(const ZvOval2f& oval);
+  // On itself a no-op. If the copy cannot be allocated the path ends up empty; nothing throws.
+  ZvPath2f& operator=(const ZvPath2f& other);
+  ~ZvPath2f() override;
+  // Empties the path; never throws.
+  void Clear();
+
+  // ---- The shape contract -------------------------------------------------------------------
+  ZvShape2f& operator=(const ZvShape2f& other) override;
+  ZvShape2f* QueryShapeKind(Kind kind) const override;
+  ZvShape2f* Clone() const override;
+  unsigned int NumPoints() const override;
+  // The box of all stored points, control points included; Empty (with zeros) for no points.
+  ZvExtent2<float>& GetExtent(ZvExtent2<float>& extent) const override;
+  ZvExtent2<double>& GetExtent(ZvExtent2<double>& extent) const override;
+  ZvExtent2<float>& GetTightExtent(ZvExtent2<float>& extent) const override;
+  ZvExtent2<double>& GetTightExtent(ZvExtent2<double>& extent) const override;
+  int GetPoint(unsigned int index, ZvPoint2<float>& point) const override;
+  ZvPoint2<float> GetPoint(unsigned int index) const override;
+  ZvPoint2<float>* GetPoints(unsigned int first, unsigned int last,
+                             ZvPoint2<float>* dst) const override;
+  ZvPoint2<double>* GetPoints(unsigned int first, unsigned int last,
+                              ZvPoint2<double>* dst) const override;
+  int GetClosePointIndex(const ZvPoint2<float>& point, double size,
+                         unsigned int* index) const override;
+  unsigned int GetPointsInExtentIndices(const ZvExtent2<float>& extent,
+                                        ZvULongArray* indices) const override;
+  int IsIntersectingExtent(const ZvGC& gc, const ZvExtent2<float>& extent,
+                           int noQuickReject) const override;
+  int IsInteriorIntersectingExtent(const ZvGC& gc, const ZvExtent2<float>& extent,
+                                   int noQuickReject) const override;
+  unsigned int IntersectSamplePointsExtent(const ZvGC& gc, const ZvExtent2<float>& extent,
+                                           ZvPoint2fArray& points, ZvPointTagArray& tags,
+                                           int noQuickReject) const override;
+  ZvShape2f& Translate(const ZvPoint2<float>& offset) override;
+  ZvShape2f& Rotate(double degrees, const ZvPoint2<float>& center) override;
+  ZvShape2f& Scale(double sx, double sy, const ZvPoint2<float>& center) override;
+  ZvShape2f& ShearX(double a, double b) override;
+  ZvShape2f& ShearY(double a, double b) override;
+  ZvShape2f& Transform(const ZvTransfo4& transform) override;
+  unsigned int Flatten(const ZvGC& gc, ZvPoint2fArray& points,
+                       ZvPointTagArray& tags) const override;
+  unsigned int Sample(const ZvGC& gc, ZvPoint2fArray& points, ZvPointTagArray& tags) const override;
+  int Fill(const ZvGC& gc, ZvRaster<unsigned char>& raster, int (*callback)(),
+           const IntBbox2l* box) const override;
+  int Fill(const ZvGC& gc, ZvRaster<float>& raster, int (*callback)(),
+           const IntBbox2l* box) const override;
+  int Fill(const ZvGC& gc, ZvRaster<short>& raster, int (*callback)(),
+           const IntBbox2l* box) const override;
+  int AAFill(const ZvGC& gc, ZvRaster<unsigned char>& raster, int (*callback)(),
+             const IntBbox2l* box) const override;
+  int AAFill(const ZvGC& gc, ZvRaster<float>& raster, int (*callback)(),
+             const IntBbox2l* box) const override;
+  int AAFill(const ZvGC& gc, ZvRaster<short>& raster, int (*callback)(),
+             const IntBbox2l* box) const override;
+  int SoftFill(const ZvGC& gc, ZvRaster<unsigned char>& raster, int (*callback)()) const override;
+  int SoftFill(const ZvGC& gc, ZvRaster<float>& raster, int (*callback)()) const override;
+  int SoftFill(const ZvGC& gc, ZvRaster<short>& raster, int (*callback)()) const override;
+  int Stroke(const ZvGC& gc, ZvRaster<unsigned char>& raster) const override;
+  // Block layout (n points, 9n + 16 bytes):
+  //   0  u32  body length 9n + 12    4  u16  kind 1    6  u16  0    8  u32  n
+  //   12 n x (f32 x, f32 y)    12+8n  n x u8 segment code (lock bits dropped)
+  //   12+9n  u32 currentSubpathOpen
+  unsigned int WriteToBuffer(void* buffer) const override;
+  unsigned int GetBufferSize() const override;
+  // 0 and no change for another kind; 9n + 12 on success. A failed allocation leaves the path
+  // empty and answers 0.
+  unsigned int ReadFromBufferBody(const void* body) override;
+
+  // ---- Editing slots added by paths ---------------------------------------------------------
+  virtual int ReplaceSegment(unsigned int index, const ZvPoint2<float>* points,
+                             unsigned int degree);
+  virtual int ReplaceSubpathSection(unsigned int start, unsigned int end);
+  virtual int ReplaceSubpathSection(unsigned int start, unsigned int end, const ZvPoint2<float>& c1,
+                                    const ZvPoint2<float>& c2);
+  virtual int ReplaceSubpathSection(unsigned int start, unsigned int end, const ZvPath2f& source,
+                                    unsigned int first, unsigned int last);
+  virtual int RemoveSubpath(unsigned int index);
+  virtual int RemoveSubpathSection(unsigned int start, unsigned int end);
+
+  // ---- Drawing (each appends under the lock) ------------------------------------------------
+  void Moveto(const ZvPoint2<float>& p);  // starts a subpath and marks it open
+  void Lineto(const ZvPoint2<float>& p);
+  void Curveto(const ZvPoint2<float>& c, const ZvPoint2<float>& end);  // quadratic
+  void Curveto(const ZvPoint2<float>& c1, const ZvPoint2<float>& c2,
+               const ZvPoint2<float>& end);  // cubic
+  // `degree` points (inner control points, then the end node) for degree 1..8; any other
+  // degree appends nothing.
+  void AltCurveto(const ZvPoint2<float>* points, unsigned int degree);
+  // The same from array[first] on. Nothing when the points are not all inside the array.
+  void AltAltCurveto(const ZvPoint2fArray& array, unsigned int first, unsigned int degree);
+  // Closes the last subpath if its end already lies within 1e-7 of its start (per axis, single
+  // precision, bounds included): 1. Never adds a segment; 0 and no change when the ends are
+  // apart or the path is empty.
+  int Closeto();
+  // Closes the subpath holding `index`, adding a line back to its start when the ends are apart.
+  int CloseSubpath(unsigned int index);
+  // Reopens the subpath holding `index`: its closed end code becomes the open one and a tangent
+  // lock on the end is released. 0 when it was not closed.
+  int OpenSubpath(unsigned int index);
+
+  // ---- Structure queries (under the lock) ---------------------------------------------------
+  // Indices of the subpath / segment holding `index`. 0, outputs untouched, when the index is
+  // not below NumPoints().
+  int GetSubpathIndices(unsigned int index, unsigned int& first, unsigned int& last) const;
+  int GetSegmentIndices(unsigned int index, unsigned int& first, unsigned int& last) const;
+  int IsStartOfSubpath(unsigned int index) const;
+  // 1 if `index` ends its subpath (last point, or the next point starts one), writing whether
+  // the subpath is closed; otherwise 0 with `closed` untouched.
+  int IsEndOfSubpath(unsigned int index, int& closed) const;
+  int IsSubpathClosed(unsigned int index) const;
+  // A lone start point counts as a segment.
+  unsigned int NumSegments() const;
+  unsigned int NumSubpaths() const;
+  unsigned int NumNodes() const;
+  unsigned int NumNodesExceptLastNodeOfClosedSubpaths() const;
+  unsigned int GetDegree(unsigned int index) const;
+  unsigned int LargestDegree() const;
+  // 1 for a non-empty path of lines only.
+  int IsPolyline() const;
+  int IsSiblingOf(const ZvPath2f& other) const;
+  // The last point; (0, 0) for an empty path.
+  ZvPoint2<float> GetCurrentPoint() const;
+  unsigned int MaxDegreeForThisImplementation() const { return 8; }
+
+  // ---- Structure queries for callers that hold the lock -------------------------------------
+  // Degree of the segment `index` belongs to; for a start point, of the segment behind it (0
+  // for a lone start). 0 for an illegal code.
+  unsigned int Degree(unsigned int index) const;
+  // First and last point of the segment holding `index`. A start point answers itself as start
+  // and the end of the first segment behind it as end. 0 for an illegal code.
+  unsigned int StartOfSegment(unsigned int index) const;
+  unsigned int EndOfSegment(unsigned int index) const;
+
+  // ---- Tangent locks ------------------------------------------------------------------------
+  // Whether the node's two handles are parallel within a squared sine of 1e-6 and not a cusp.
+  // A handle of zero length counts as continuous. At a subpath's start or end, only for a closed
+  // subpath of at least three index steps.
+  int IsG1Continuous(unsigned int index) const;
+  // Marks a G1-continuous node between two segments of degree 3 or more (at a closed subpath's
+  // start and end, both ends are marked). 0 when refused.
+  int LockG1(unsigned int index);
+  int UnlockG1(unsigned int index);
+
+ protected:
+  // Builds the outline of a rectangle from the handles of `shape` read through GetPoint (corners
+  // 2, 4, 6, 8), or of an oval from its handles 1..8 read through GetPoints. These carry the
+  // constructors from ZvRect2f and ZvOval2f, which only supply the shape.
+  void SetToRectOutline(const ZvShape2f& rect);
+  void SetToOvalOutline(const ZvShape2f& oval);
+
+  ZvPoint2fArray points;
+  ZvUByteArray codes;
+  unsigned int currentSubpathOpen;
+
+ private:
+  friend ZvShape2f* ZvShape2f_CreateFromBuffer(const void*, std::size_t, unsigned int&);
+  // The body reader behind ReadFromBufferBody and the bounded factory.
+  unsigned int ReadBody(ZvByteReader& in);
+  // Makes room for `count` more points in both arrays, or restores them and rethrows.
+  void GrowBoth(unsigned int count);
+  void Append(const ZvPoint2<float>* p, unsigned int count, unsigned char firstCode);
+  unsigned int SubpathStart(unsigned int index) const;
+  unsigned int SubpathEnd(unsigned int index) const;
+  int IsSubpathBoundary(unsigned int index) const;
+};
+
+// A cursor over the subpaths of a path it does not own.
+class ZV_API ZvPath2fIter {
+ public:
+  explicit ZvPath2fIter(const ZvPath2f& path) : path(&path), next(0) {}
+  // The next subpath's first and last index; 0 when there is none left.
+  int GetNextSubPathIndices(unsigned int& first, unsigned int& last);
+  void Reset() { next = 0; }
+
+ private:
+  const ZvPath2f* path;
+  unsigned int next;
+};
+
+// Debug dump: statistics, then one line per point with its segment's first and last index.
+ZV_API std::ostream& operator<<(std::ostream& out, const ZvPath2f& path);
+
+#endif

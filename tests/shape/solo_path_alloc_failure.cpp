@@ -1,0 +1,306 @@
+// Paths under allocation failure. A test-only global operator new throws on the k-th allocation
+// after it is armed; each operation is run for k = 0, 1, 2, ... until it completes without the
+// failure firing, and after every failure the path must still be well formed: both arrays of
+// one length, codes that parse, the lock released, and what the operation promises (appends
+// chop back to the entry state and rethrow; Clone, Clear, operator= and the readers swallow).
+// Run under AddressSanitizer, leak detection catches anything a failure leaves behind.
+#include <zv/path2f.h>
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <functional>
+#include <new>
+#include <vector>
+
+#include "path_fixtures.h"
+
+namespace {
+
+long g_countdown = -1;  // allocations left before the failure; -1 when disarmed
+bool g_fired = false;
+
+void* Allocate(std::size_t n) {
+  if (g_countdown == 0) {
+    g_countdown = -1;
+    g_fired = true;
+    throw std::bad_alloc();
+  }
+  if (g_countdown > 0) --g_countdown;
+  if (void* p = std::malloc(n ? n : 1)) return p;
+  throw std::bad_alloc();
+}
+
+void Arm(long k) {
+  g_fired = false;
+  g_countdown = k;
+}
+
+// Whether the armed failure fired; disarms.
+bool Disarm() {
+  g_countdown = -1;
+  return g_fired;
+}
+
+}  // namespace
+
+void* operator new(std::size_t n) {
+  return Allocate(n);
+}
+void* operator new[](std::size_t n) {
+  return Allocate(n);
+}
+void operator delete(void* p) noexcept {
+  std::free(p);
+}
+void operator delete[](void* p) noexcept {
+  std::free(p);
+}
+void operator delete(void* p, std::size_t) noexcept {
+  std::free(p);
+}
+void operator delete[](void* p, std::size_t) noexcept {
+  std::free(p);
+}
+
+namespace {
+
+struct State {
+  std::vector<float> xy;
+  std::vector<int> codes;
+  unsigned int open;
+  bool operator==(const State& o) const { return xy == o.xy && codes == o.codes && open == o.open; }
+};
+
+State Snapshot(const ZvPath2f& path) {
+  State s;
+  const ZvPoint2fArray& pts = PathArrays::Points(path);
+  for (unsigned int i = 0; i < pts.size; ++i) {
+    s.xy.push_back(pts[i].x);
+    s.xy.push_back(pts[i].y);
+  }
+  s.codes = Codes(path, 255);
+  s.open = PathArrays::Open(path);
+  return s;
+}
+
+// Runs `op` with the k-th allocation failing, for every k until none fails, calling `check`
+// with whether the operation threw after each failure. Returns the number of failures.
+int ForEachFailure(const std::function<void()>& setup, const std::function<void()>& op,
+                   const std::function<void(bool threw)>& check) {
+  for (long k = 0;; ++k) {
+    setup();
+    Arm(k);
+    bool threw = false;
+    try {
+      op();
+    } catch (const std::bad_alloc&) {
+      threw = true;
+    }
+    if (!Disarm()) return static_cast<int>(k);
+    check(threw);
+    if (::testing::Test::HasFatalFailure()) return static_cast<int>(k);
+  }
+}
+
+using Step = std::function<void(ZvPath2f&)>;
+
+std::vector<Step> DrawingSteps() {
+  static const ZvPoint2<float> pts[8] = {P(1, 2), P(3, 1), P(4, 4), P(2, 6),
+                                         P(0, 5), P(1, 3), P(2, 2), P(0, 0)};
+  static ZvPoint2fArray array(1);
+  if (array.size == 0)
+    for (const auto& p : pts)
+      array.Add(p);
+  std::vector<Step> steps;
+  for (int round = 0; round < 3; ++round) {
+    steps.push_back([](ZvPath2f& p) { p.Moveto(P(0, 0)); });
+    steps.push_back([](ZvPath2f& p) { p.Lineto(P(5, 0)); });
+    steps.push_back([](ZvPath2f& p) { p.Curveto(P(6, 1), P(6, 3)); });
+    steps.push_back([](ZvPath2f& p) { p.Curveto(P(6, 5), P(4, 6), P(3, 6)); });
+    steps.push_back([](ZvPath2f& p) { p.AltCurveto(pts, 7); });
+    steps.push_back([](ZvPath2f& p) { p.AltAltCurveto(array, 0, 8); });
+    steps.push_back([](ZvPath2f& p) { p.Lineto(P(0, 0)); });
+    steps.push_back([](ZvPath2f& p) { p.Closeto(); });
+  }
+  return steps;
+}
+
+}  // namespace
+
+TEST(PathAllocFailure, AppendsChopBackAndRethrow) {
+  const std::vector<Step> steps = DrawingSteps();
+  ZvPath2f reference(1);
+  int failures = 0;
+  for (const Step& step : steps) {
+    const State entry = Snapshot(reference);
+    ZvPath2f* path = nullptr;
+    failures += ForEachFailure(
+        [&] {
+          delete path;
+          path = new ZvPath2f(reference);
+        },
+        [&] { step(*path); },
+        [&](bool threw) {
+          EXPECT_TRUE(threw);
+          EXPECT_TRUE(PathInvariantHolds(*path));
+          EXPECT_EQ(path->GetLockCount(), 0u);
+          EXPECT_TRUE(Snapshot(*path) == entry);
+        });
+    delete path;
+    step(reference);
+  }
+  EXPECT_GT(failures, 0);
+  EXPECT_EQ(reference.NumSubpaths(), 3u);
+}
+
+TEST(PathAllocFailure, CloseSubpathInsertionChopsBack) {
+  // Full arrays, so that the closing line needs room: an open triangle, then a lone start.
+  ZvPath2f source(1);
+  source.Moveto(P(0, 0));
+  source.Lineto(P(4, 0));
+  source.Lineto(P(4, 3));
+  source.Moveto(P(9, 9));
+  const State entry = Snapshot(source);
+  ZvPath2f* path = nullptr;
+  const int failures = ForEachFailure(
+      [&] {
+        delete path;
+        path = new ZvPath2f(source);
+      },
+      [&] { path->CloseSubpath(1); },
+      [&](bool threw) {
+        EXPECT_TRUE(threw);
+        EXPECT_TRUE(PathInvariantHolds(*path));
+        EXPECT_EQ(path->GetLockCount(), 0u);
+        EXPECT_TRUE(Snapshot(*path) == entry);
+      });
+  EXPECT_GT(failures, 0);
+  EXPECT_EQ(Codes(*path), (std::vector<int>{1, 3, 3, 4, 1}));
+  delete path;
+}
+
+TEST(PathAllocFailure, CloneAnswersNull) {
+  const ZvPath2f source = ThreeSubpaths();
+  const State entry = Snapshot(source);
+  ZvShape2f* clone = nullptr;
+  const int failures = ForEachFailure([&] { clone = nullptr; }, [&] { clone = source.Clone(); },
+                                      [&](bool threw) {
+                                        EXPECT_FALSE(threw);
+                                        EXPECT_EQ(clone, nullptr);
+                                        EXPECT_EQ(source.GetLockCount(), 0u);
+                                      });
+  EXPECT_GT(failures, 0);
+  ASSERT_NE(clone, nullptr);
+  EXPECT_TRUE(Snapshot(*static_cast<ZvPath2f*>(clone)) == entry);
+  delete clone;
+}
+
+TEST(PathAllocFailure, AssignmentEmptiesTheTarget) {
+  const ZvPath2f source = ThreeSubpaths();
+  ZvPath2f target;
+  const int failures = ForEachFailure(
+      [&] {
+        target.Clear();
+        target.Moveto(P(9, 9));
+      },
+      [&] { target = source; },
+      [&](bool threw) {
+        EXPECT_FALSE(threw);
+        EXPECT_TRUE(PathInvariantHolds(target));
+        EXPECT_EQ(target.NumPoints(), 0u);
+        EXPECT_EQ(PathArrays::Open(target), 0u);
+        EXPECT_EQ(target.GetLockCount(), 0u);
+        EXPECT_EQ(source.GetLockCount(), 0u);
+      });
+  EXPECT_GT(failures, 0);
+  EXPECT_TRUE(Snapshot(target) == Snapshot(source));
+}
+
+TEST(PathAllocFailure, ClearNeverFails) {
+  const ZvPath2f source = ThreeSubpaths();
+  ZvPath2f* path = nullptr;
+  const int failures = ForEachFailure(
+      [&] {
+        delete path;
+        path = new ZvPath2f(source);
+      },
+      [&] { path->Clear(); },
+      [&](bool threw) {
+        EXPECT_FALSE(threw);
+        EXPECT_EQ(path->NumPoints(), 0u);
+        EXPECT_TRUE(PathInvariantHolds(*path));
+        EXPECT_EQ(path->GetLockCount(), 0u);
+      });
+  EXPECT_GT(failures, 0);
+  EXPECT_EQ(path->NumPoints(), 0u);
+  path->Moveto(P(1, 1));  // still usable
+  delete path;
+}
+
+TEST(PathAllocFailure, ReadersEmptyThePathOrAnswerNull) {
+  const ZvPath2f source = ThreeSubpaths();
+  std::vector<unsigned char> block(source.GetBufferSize());
+  source.WriteToBuffer(block.data());
+  const unsigned char* body = block.data() + 4;
+
+  ZvPath2f target;
+  unsigned int read = 0;
+  int failures = ForEachFailure(
+      [&] {
+        target = source;
+        target.Translate(P(1, 1));
+      },
+      [&] { read = target.ReadFromBufferBody(body); },
+      [&](bool threw) {
+        EXPECT_FALSE(threw);
+        EXPECT_EQ(read, 0u);
+        EXPECT_EQ(target.NumPoints(), 0u);
+        EXPECT_EQ(PathArrays::Open(target), 0u);
+        EXPECT_TRUE(PathInvariantHolds(target));
+        EXPECT_EQ(target.GetLockCount(), 0u);
+      });
+  EXPECT_GT(failures, 0);
+  EXPECT_EQ(read, block.size() - 4);
+
+  ZvShape2f* shape = nullptr;
+  unsigned int consumed = 0;
+  const auto expectNull = [&](bool threw) {
+    EXPECT_FALSE(threw);
+    EXPECT_EQ(shape, nullptr);
+    EXPECT_EQ(consumed, 0u);
+  };
+  failures =
+      ForEachFailure([&] { shape = nullptr; },
+                     [&] { shape = ZvShape2f_CreateFromBufferBody(body, consumed); }, expectNull);
+  EXPECT_GT(failures, 0);
+  ASSERT_NE(shape, nullptr);
+  delete shape;
+  failures = ForEachFailure(
+      [&] { shape = nullptr; },
+      [&] { shape = ZvShape2f_CreateFromBuffer(block.data(), block.size(), consumed); },
+      expectNull);
+  EXPECT_GT(failures, 0);
+  ASSERT_NE(shape, nullptr);
+  EXPECT_EQ(consumed, block.size());
+  delete shape;
+}
+
+TEST(PathAllocFailure, ConstructorsReleaseWhatTheyHold) {
+  const ZvPath2f source = ThreeSubpaths();
+  ZvPath2f* made = nullptr;
+  const auto threwCleanly = [&](bool threw) {
+    EXPECT_TRUE(threw);
+    EXPECT_EQ(source.GetLockCount(), 0u);
+  };
+  int failures =
+      ForEachFailure([&] { made = nullptr; }, [&] { made = new ZvPath2f(source); }, threwCleanly);
+  EXPECT_GT(failures, 0);
+  delete made;
+  failures = ForEachFailure([&] { made = nullptr; }, [&] { made = new ZvPath2f(source, 4, 9); },
+                            threwCleanly);
+  EXPECT_GT(failures, 0);
+  ASSERT_NE(made, nullptr);
+  EXPECT_EQ(Codes(*made), (std::vector<int>{1, 9, 10, 8, 9, 10}));
+  delete made;
+}
