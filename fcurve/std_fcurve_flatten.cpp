@@ -95,18 +95,34 @@ void SubCubic(const ZvPoint2<double>* p, double u0, double u1, ZvPoint2<double>*
     out[i] = q[i];
 }
 
+// Takes the polyline in portions as it is made, so that a long one never has to be stored
+// whole. Each portion starts with the last point of the one before (from the second on).
+class PolylineSink {
+ public:
+  virtual void Take(const ZvPoint2dArray& points, unsigned int from) = 0;
+
+ protected:
+  ~PolylineSink() = default;
+};
+
 class Assembler {
  public:
   Assembler(const ZvStdFCurveImpl& s, const ZvTransfo4& transfo, double tolerance,
             const ZvExtent2<double>& box, ZvPoint2dArray& points, ZvPointTagArray& tags,
-            ZvBoolArray& flags)
+            ZvBoolArray& flags, PolylineSink* sink = nullptr)
       : s(s),
         map(transfo),
         tolerance(tolerance),
         box(box),
         points(points),
         tags(tags),
-        flags(flags) {}
+        flags(flags),
+        sink(sink) {}
+
+  // Hands what is left to the sink.
+  void Finish() {
+    if (sink && points.size > taken) sink->Take(points, taken);
+  }
 
   // The curve from parameter pa to pb (pa <= pb), with extrapolation.
   bool Run(double pa, double pb) {
@@ -209,6 +225,7 @@ class Assembler {
           m[j] = map(q[j].x + dx, q[j].y + dy);
         ZvBezierTool_ClipAndFlattenCubic2d(m, tolerance, box, &points, &tags, &flags);
         pen = {b + dx, q[3].y + dy};
+        Drain();
         return;
       }
       default:  // constant, and any kind the evaluation also holds constant
@@ -233,7 +250,25 @@ class Assembler {
     ZvPoint2<double> a = map(xa, ya), b = map(xb, yb);
     ClipAndAddLineSegment(a, b, box, points, tags, flags);
     pen = {xb, yb};
+    Drain();
   }
+
+  // With a sink, a full buffer goes to it, keeping its last point, to which the next piece
+  // joins.
+  void Drain() {
+    if (sink == nullptr || points.size < kPortion) return;
+    sink->Take(points, taken);
+    const unsigned int last = points.size - 1;
+    points[0] = points[last];
+    tags[0] = tags[last];
+    flags[0] = flags[last];
+    points.Chop(1);
+    tags.Chop(1);
+    flags.Chop(1);
+    taken = 1;
+  }
+
+  static constexpr unsigned int kPortion = 256;
 
   const ZvStdFCurveImpl& s;
   const PlaneMap map;
@@ -242,6 +277,8 @@ class Assembler {
   ZvPoint2dArray& points;
   ZvPointTagArray& tags;
   ZvBoolArray& flags;
+  PolylineSink* const sink;
+  unsigned int taken = 0;
   ZvPoint2<double> pen{0.0, 0.0};
   bool hasPen = false;
 };
@@ -405,49 +442,91 @@ unsigned int ZvStdFCurve::FlattenFromTo(const ZvExtent2<double>& box, const ZvTr
   return 1;
 }
 
-// Samples read from the flattened polyline: each parameter falls in one of its edges, found by
-// walking forward, never by searching.
+namespace {
+
+// Samples at start, start + step, ... below end, read from the polyline as it streams by: a
+// sample lies on the edge from the last point at or before it (within the snap tolerance, as
+// Eval snaps to keys) to the next point. At a jump that is the upper point, so the samples are
+// right-continuous like Eval.
+class Sampler : public PolylineSink {
+ public:
+  Sampler(double start, double end, double step, ZvDoubleArray& parameters, ZvDoubleArray& values)
+      : t(start), end(end), step(step), parameters(parameters), values(values) {}
+
+  void Take(const ZvPoint2dArray& points, unsigned int from) override {
+    for (unsigned int j = from; j < points.size; ++j) {
+      const ZvPoint2<double>& q = points[j];
+      if (hasPrevious) {
+        while (end > t && t + kCFCSnapTolerance < q.x) {
+          if (std::fabs(previous.x - t) <= kCFCSnapTolerance || previous.x == q.x) {
+            Add(t, previous.y);
+          } else {
+            Add(t, previous.y + (t - previous.x) * (q.y - previous.y) / (q.x - previous.x));
+          }
+          t += step;
+        }
+      }
+      previous = q;
+      hasPrevious = true;
+    }
+  }
+
+  // The samples beyond the last point, and the last sample at the end.
+  void Close() {
+    for (; end > t; t += step)
+      Add(t, previous.y);
+    Add(end, previous.y);
+  }
+
+  bool Empty() const { return !hasPrevious; }
+
+ private:
+  void Add(double p, double v) {
+    parameters.Add(p);
+    values.Add(v);
+  }
+
+  double t;
+  const double end, step;
+  ZvDoubleArray& parameters;
+  ZvDoubleArray& values;
+  ZvPoint2<double> previous{0.0, 0.0};
+  bool hasPrevious = false;
+};
+
+}  // namespace
+
+// Samples read from the flattened polyline, which streams through a small buffer.
 unsigned int ZvStdFCurve::EvalSequence(double start, double end, double step, double tolerance,
                                        ZvDoubleArray& parameters, ZvDoubleArray& values,
                                        int clamped) const {
   ZvFCurveLockGuard guard(*this);
   const ZvStdFCurveImpl& s = *m_impl;
-  if (!std::isfinite(start) || !std::isfinite(end) || !(step > 0.0) || !std::isfinite(step)) {
+  if (!std::isfinite(start) || !std::isfinite(end) || !(step > 0.0) || !std::isfinite(step) ||
+      std::isnan(tolerance)) {
     return 0;
   }
-  ZvPoint2dArray points(128);
-  ZvPointTagArray tags(128);
-  ZvBoolArray flags(128);
-  const double lo = start < end ? start : end, hi = start < end ? end : start;
-  const ZvExtent2<double> box(lo, -DBL_MAX, hi, DBL_MAX);
-  if (!FlattenFromTo(box, ZvTransfo4(), tolerance, points, tags, flags, 0)) return 0;
   parameters.Chop(0);
   values.Chop(0);
-  auto add = [&](double t, double v) {
-    parameters.Add(t);
-    values.Add(clamped ? s.Clamp(v) : v);
-  };
   if (std::fabs(start - end) <= kCFCParameterEpsilon) {
-    add(start, points.size ? points[0].y : s.EvalRightUsingExtrapolationMethod(start));
-    return 1;
+    parameters.Add(start);
+    values.Add(s.EvalRightUsingExtrapolationMethod(start));
+  } else {
+    const double lo = start < end ? start : end, hi = start < end ? end : start;
+    const ZvExtent2<double> box(lo, -DBL_MAX, hi, DBL_MAX);
+    ZvPoint2dArray points(128);
+    ZvPointTagArray tags(128);
+    ZvBoolArray flags(128);
+    Sampler sampler(start, end, step, parameters, values);
+    Assembler assembler(s, ZvTransfo4(), tolerance, box, points, tags, flags, &sampler);
+    if (!assembler.Run(lo, hi)) return 0;
+    assembler.Finish();
+    if (sampler.Empty()) return 0;
+    sampler.Close();
   }
-  if (points.size == 0) return 0;
-  const unsigned int last = points.size - 1;
-  unsigned int i = 0;
-  for (double t = start; end > t; t += step) {
-    // The last point at or before t: at a jump that is the point after it, so that the samples
-    // are right-continuous like Eval; like Eval, a t within the snap tolerance counts as on it.
-    while (i < last && points[i + 1].x <= t + kCFCSnapTolerance)
-      ++i;
-    if (i == last || std::fabs(points[i].x - t) <= kCFCSnapTolerance ||
-        points[i + 1].x == points[i].x) {
-      add(t, points[i].y);
-    } else {
-      const ZvPoint2<double>& a = points[i];
-      const ZvPoint2<double>& b = points[i + 1];
-      add(t, a.y + (t - a.x) * (b.y - a.y) / (b.x - a.x));
-    }
+  if (clamped) {
+    for (unsigned int i = 0; i < values.size; ++i)
+      values[i] = s.Clamp(values[i]);
   }
-  add(end, points[last].y);
   return parameters.size;
 }

@@ -221,6 +221,20 @@ TEST(StdEditFlatten, SequenceMatchesEvalUnderEveryMethod) {
   }
 }
 
+TEST(StdEditFlatten, LongSequencesStreamThroughTheFlattening) {
+  // Far more polyline points than one buffer holds, with jumps among the cubics.
+  ZvStdFCurve curve;
+  for (int i = 0; i < 300; ++i)
+    curve.CreateKey(i * 0.5, std::sin(i * 0.7) * 4.0);
+  for (int i = 10; i < 300; i += 37)
+    curve.SetKeyValue(i * 0.5, C::RightSide, 9.0, 0.0);
+  ZvDoubleArray t(8), v(8);
+  const unsigned int n = curve.EvalSequence(0.0, 149.5, 0.0625, 1e-4, t, v, 0);
+  ASSERT_EQ(n, 2393u);
+  for (unsigned int i = 0; i < n; ++i)
+    EXPECT_NEAR(v[i], curve.Eval(t[i], 0), 5e-4) << t[i];
+}
+
 TEST(StdEditFlatten, SequenceIsRightContinuousAtJumpsAndClamps) {
   ZvStdFCurve curve = stdedit::Mixed();
   ZvDoubleArray t(8), v(8);
