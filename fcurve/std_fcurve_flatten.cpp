@@ -445,8 +445,8 @@ unsigned int ZvStdFCurve::FlattenFromTo(const ZvExtent2<double>& box, const ZvTr
 namespace {
 
 // Samples at start, start + step, ... below end, read from the polyline as it streams by: a
-// sample lies on the edge from the last point at or before it (within the snap tolerance, as
-// Eval snaps to keys) to the next point. At a jump that is the upper point, so the samples are
+// sample lies on the edge from the last point at or before it (a point within 1e-15 counts as
+// hit exactly) to the next point. At a jump that is the upper point, so the samples are
 // right-continuous like Eval.
 class Sampler : public PolylineSink {
  public:
@@ -457,8 +457,8 @@ class Sampler : public PolylineSink {
     for (unsigned int j = from; j < points.size; ++j) {
       const ZvPoint2<double>& q = points[j];
       if (hasPrevious) {
-        while (end > t && t + kCFCSnapTolerance < q.x) {
-          if (std::fabs(previous.x - t) <= kCFCSnapTolerance || previous.x == q.x) {
+        while (end > t && t + kCFCParameterEpsilon < q.x) {
+          if (std::fabs(previous.x - t) <= kCFCParameterEpsilon || previous.x == q.x) {
             Add(t, previous.y);
           } else {
             Add(t, previous.y + (t - previous.x) * (q.y - previous.y) / (q.x - previous.x));
