@@ -3,11 +3,10 @@
 
 namespace {
 
-// The default feather profile: one cubic segment from (0, 1) to (1, 0) with its handles at the
-// thirds of the chord, so the weight falls evenly from the centre to the filter's edge.
+// The default feather profile: one cubic segment from value 1 at 0 to value 0 at 1, its handles
+// at the thirds of the chord, so the weight falls evenly from the centre to the filter's edge.
 ZvStdFCurve DefaultFeatherProfile() {
-  return ZvStdFCurve(ZvPoint2<double>{0.0, 1.0}, ZvPoint2<double>{1.0 / 3.0, 2.0 / 3.0},
-                     ZvPoint2<double>{2.0 / 3.0, 1.0 / 3.0}, ZvPoint2<double>{1.0, 0.0});
+  return ZvStdFCurve(0.0, 1.0, 1.0, 0.0);
 }
 
 }  // namespace

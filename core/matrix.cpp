@@ -54,7 +54,9 @@ ZvMatrix::ZvMatrix(const ZvMatrix& other)
 
 ZvMatrix::~ZvMatrix() {
   double** rowBlock = rows + rowLow;
-  delete[] rowBlock[Extent(rowLow, rowHigh)];
+  // The constructor checked the range already; the destructor must not throw.
+  const long long rowCount = static_cast<long long>(rowHigh) - rowLow + 1;
+  delete[] rowBlock[rowCount > 0 ? rowCount : 0];
   delete[] rowBlock;
 }
 

@@ -31,8 +31,10 @@ unsigned int ZvBezierTool_FlattenGamma(const ZvPoint2<double>* p, double /*toler
     // bound stops a corrupt piece with a huge u range from running away.
     double maxSteps = std::floor(1.0 / step) + 2.0;
     for (double u = u1 + step; u > u1 && u < u2 && maxSteps > 0.0; u += step, maxSteps -= 1.0) {
-      const float x = static_cast<float>(xRange * u + p0.x);
-      const float y = static_cast<float>(p0.y - std::pow(u, gamma) * yDrop);
+      // The points are rounded to float because a gamma piece comes out of a float path. They
+      // round through memory: g++ 12's vectoriser folds the float round trip away otherwise.
+      volatile float x = static_cast<float>(xRange * u + p0.x);
+      volatile float y = static_cast<float>(p0.y - std::pow(u, gamma) * yDrop);
       out->Add(x, y);
     }
   }

@@ -26,20 +26,24 @@ ZvBaseFCurve::~ZvBaseFCurve() {
   delete m_userData;
 }
 
+// Only the thread holding the mutex writes the count, so a plain load and store suffice; the
+// count is atomic only so that other threads may read it. This keeps the lock, which every
+// evaluation takes, free of a second locked instruction.
 void ZvBaseFCurve::Lock() const {
   m_lock.Lock();
-  ++m_lockCount;
+  m_lockCount.store(m_lockCount.load(std::memory_order_relaxed) + 1, std::memory_order_relaxed);
 }
 
 void ZvBaseFCurve::Unlock() const {
   // Releasing a lock that nobody holds is refused rather than undefined.
-  if (m_lockCount.load() == 0) return;
-  --m_lockCount;
+  const unsigned int count = m_lockCount.load(std::memory_order_relaxed);
+  if (count == 0) return;
+  m_lockCount.store(count - 1, std::memory_order_relaxed);
   m_lock.Unlock();
 }
 
 unsigned int ZvBaseFCurve::GetLockCount() const {
-  return m_lockCount.load();
+  return m_lockCount.load(std::memory_order_relaxed);
 }
 
 CFCUserDataStore& ZvBaseFCurve::GetOrCreateUserDataStore() {

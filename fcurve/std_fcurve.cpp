@@ -46,6 +46,15 @@ ZvStdFCurve::ZvStdFCurve(const ZvPoint2<double>& p0, const ZvPoint2<double>& p1,
   m_impl->keys.Add(b);
 }
 
+ZvStdFCurve::ZvStdFCurve(double startParameter, double startValue, double endParameter,
+                         double endValue)
+    : ZvStdFCurve(ZvPoint2<double>{startParameter, startValue},
+                  ZvPoint2<double>{startParameter + (endParameter - startParameter) / 3.0,
+                                   startValue + (endValue - startValue) / 3.0},
+                  ZvPoint2<double>{endParameter - (endParameter - startParameter) / 3.0,
+                                   endValue - (endValue - startValue) / 3.0},
+                  ZvPoint2<double>{endParameter, endValue}) {}
+
 ZvStdFCurve::ZvStdFCurve(const ZvStdFCurve& other) : ZvStdFCurve(other, ZvFCurveLockGuard(other)) {}
 
 ZvStdFCurve::ZvStdFCurve(const ZvStdFCurve& other, const ZvFCurveLockGuard&)
@@ -108,10 +117,17 @@ unsigned int ZvStdFCurve::CreateKey(double parameter, double value, FSKind left,
 unsigned int ZvStdFCurve::MergeAndCreateKey(double start, double end, double parameter,
                                             double value, int excludeStart, int excludeEnd,
                                             int keepAttributes) {
+  return MergeAndCreateKey(start, end, parameter, value, FSKind(0), FSKind(0), excludeStart,
+                           excludeEnd, keepAttributes);
+}
+
+unsigned int ZvStdFCurve::MergeAndCreateKey(double start, double end, double parameter,
+                                            double value, FSKind leftKind, FSKind rightKind,
+                                            int excludeStart, int excludeEnd, int keepAttributes) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
   if (s.readOnly || !std::isfinite(parameter) || !std::isfinite(value) || !std::isfinite(start) ||
-      !std::isfinite(end)) {
+      !std::isfinite(end) || leftKind > CubicSegment || rightKind > CubicSegment) {
     return 0;
   }
   if (AreAnyParametersLockedInInterval(start, end, excludeStart, excludeEnd) ||
@@ -119,12 +135,12 @@ unsigned int ZvStdFCurve::MergeAndCreateKey(double start, double end, double par
     return 0;
   }
   const long n = static_cast<long>(s.keys.size);
-  if (n == 0) return s.CreateKey(parameter, value, 0, 0, *this);
+  if (n == 0) return s.CreateKey(parameter, value, leftKind, rightKind, *this);
   long left, right;
   s.MergeBounds(start, end, excludeStart, excludeEnd, left, right);
   if ((right - left == 2 && zvIsSameParameter(s.keys[left + 1].parameter, parameter)) ||
       (n == 1 && !zvIsSameParameter(s.keys[0].parameter, parameter))) {
-    return s.CreateKey(parameter, value, 0, 0, *this);
+    return s.CreateKey(parameter, value, leftKind, rightKind, *this);
   }
   const bool inherit = keepAttributes && right - left > 1;
   unsigned short donorFlags = 0;
@@ -140,18 +156,20 @@ unsigned int ZvStdFCurve::MergeAndCreateKey(double start, double end, double par
     }
   }
   const unsigned int kind = left >= 0 ? s.keys[left].segmentKind : s.firstSegmentKind;
+  const unsigned int lk = leftKind ? static_cast<unsigned int>(leftKind) : kind;
+  const unsigned int rk = rightKind ? static_cast<unsigned int>(rightKind) : kind;
   if (left >= 0 && right < n) {
-    s.RemoveBodyAndCreateKeyBetweenExistingKeys(parameter, value, kind, kind,
+    s.RemoveBodyAndCreateKeyBetweenExistingKeys(parameter, value, lk, rk,
                                                 static_cast<unsigned int>(left),
                                                 static_cast<unsigned int>(right), *this);
   } else if (left >= 0) {
-    s.RemoveTailAndCreateKeyAfterExistingKey(parameter, value, kind, kind,
+    s.RemoveTailAndCreateKeyAfterExistingKey(parameter, value, lk, rk,
                                              static_cast<unsigned int>(left), *this);
   } else if (right < n) {
-    s.RemoveHeadAndCreateKeyBeforeExistingKey(parameter, value, kind, kind,
+    s.RemoveHeadAndCreateKeyBeforeExistingKey(parameter, value, lk, rk,
                                               static_cast<unsigned int>(right), *this);
   } else {
-    s.RemoveAllKeysAndCreateNewKey(parameter, value, kind, kind, *this);
+    s.RemoveAllKeysAndCreateNewKey(parameter, value, lk, rk, *this);
   }
   if (inherit) {
     unsigned int at;
@@ -187,20 +205,31 @@ unsigned int ZvStdFCurve::MergeAndCreateNonModifyingKey(double start, double end
 }
 
 unsigned int ZvStdFCurve::RemoveKey(double parameter, double tolerance) {
+  return RemoveKey(parameter, FSKind(0), tolerance);
+}
+
+unsigned int ZvStdFCurve::RemoveKey(double parameter, FSKind kind, double tolerance) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
-  if (s.readOnly) return 0;
+  if (s.readOnly || kind > CubicSegment) return 0;
   if (s.keys.size == 0) return 1;
   unsigned int i;
   if (!s.GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
   if (s.keys[i].flags & (CFCFlag_ValueLock | CFCFlag_ParameterLock)) return 0;
-  return s.RemoveKey(parameter, 0, tolerance, *this);
+  return s.RemoveKey(parameter, kind, tolerance, *this);
 }
 
 unsigned int ZvStdFCurve::RemoveKeys(double start, double end, int excludeStart, int excludeEnd) {
+  return RemoveKeys(start, end, FSKind(0), excludeStart, excludeEnd);
+}
+
+unsigned int ZvStdFCurve::RemoveKeys(double start, double end, FSKind removedKind, int excludeStart,
+                                     int excludeEnd) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
-  if (s.readOnly || !std::isfinite(start) || !std::isfinite(end)) return 0;
+  if (s.readOnly || !std::isfinite(start) || !std::isfinite(end) || removedKind > CubicSegment) {
+    return 0;
+  }
   if (zvIsSameParameter(start, end) && excludeStart != excludeEnd) excludeStart = excludeEnd = 0;
   if (AreAnyParametersLockedInInterval(start, end, excludeStart, excludeEnd) ||
       AreAnyValuesLockedInInterval(start, end, excludeStart, excludeEnd)) {
@@ -210,7 +239,9 @@ unsigned int ZvStdFCurve::RemoveKeys(double start, double end, int excludeStart,
   if (!s.GetKeyIndicesInInterval(start, end, first, last, excludeStart, excludeEnd)) return 1;
   const unsigned int n = s.keys.size;
   const bool hasLeft = first > 0, hasRight = last + 1 < n;
-  const unsigned int kind = hasLeft ? s.keys[first - 1].segmentKind : s.firstSegmentKind;
+  const unsigned int kind = removedKind ? static_cast<unsigned int>(removedKind)
+                            : hasLeft   ? s.keys[first - 1].segmentKind
+                                        : s.firstSegmentKind;
   if (hasLeft && hasRight) return s.RemoveBodyBetweenExistingKeys(kind, first - 1, last + 1, *this);
   if (hasLeft) return s.RemoveTailAfterExistingKey(kind, first - 1, *this);
   if (hasRight) return s.RemoveHeadBeforeExistingKey(kind, last + 1, *this);

@@ -101,6 +101,22 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
     RemoveBodyBetweenExistingKeys(keys[a].segmentKind, a, b, curve);
   }
 
+  // ---- Splicing of curves (std_fcurve_splice.cpp) ----
+
+  // Resolves AutoTangent on the keys whose segments touch [start, end], so that the shape there
+  // survives the removal of neighbours.
+  void ResolveAutoTangentsAround(double start, double end);
+  // Moves keys first.. by delta, handles along, user data along. Refuses with 0, moving nothing,
+  // when one of them is parameter-locked or the move would break the order.
+  int MoveTail(unsigned int first, double delta, ZvBaseFCurve& curve);
+  // Puts the keys of `piece`, shifted so that its first key lands on key a, after key a: key a
+  // takes the right side of the piece's first key. With `joinNext` the piece's last key lands
+  // on key a + 1 (which must lie there already) and key a + 1 takes its left side; otherwise
+  // the piece's other keys follow key a. The piece's key user data is copied along. Refuses
+  // with 0, before any change, when a value-locked key would change its value.
+  int SpliceAfter(unsigned int a, const ZvStdFCurveImpl& piece, const ZvBaseFCurve& pieceCurve,
+                  bool joinNext, ZvBaseFCurve& curve);
+
   // ---- Actual handles (std_fcurve_handles.cpp) ----
 
   void SetActualLeftTgt(unsigned int i, const ZvPoint2<double>& handle);

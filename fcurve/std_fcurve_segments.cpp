@@ -4,6 +4,8 @@
 #include "fcurve/fcurve_lock.h"
 #include "fcurve/std_fcurve_impl.h"
 
+#include <cmath>
+
 ZvBaseFCurve::FSKind ZvStdFCurve::GetFirstSegmentKind() const {
   ZvFCurveLockGuard guard(*this);
   return static_cast<FSKind>(m_impl->firstSegmentKind);
@@ -126,5 +128,90 @@ unsigned int ZvStdFCurve::SetKeyTgtHandles(double parameter, const ZvPoint2<doub
   if (!s.ActualTangentsAreUnified(i)) {
     s.keys[i].flags = static_cast<unsigned short>(s.keys[i].flags & ~CFCFlag_TangentContinuity);
   }
+  return 1;
+}
+
+namespace {
+
+bool IsKind(unsigned int kind) {
+  return kind >= ZvBaseFCurve::ConstantSegment && kind <= ZvBaseFCurve::CubicSegment;
+}
+
+// The kind of the segment from key i: the last key's byte is only carried, nothing follows it.
+void SetKindAtIndex(ZvStdFCurveImpl& s, unsigned int i, unsigned int kind) {
+  if (i + 1 == s.keys.size) {
+    s.keys[i].segmentKind = static_cast<unsigned char>(kind);
+  } else {
+    s.ModifyFSK(i, kind);
+  }
+}
+
+}  // namespace
+
+ZvBaseFCurve::FSKind ZvStdFCurve::GetSegmentKindAtParameter(double parameter) const {
+  ZvFCurveLockGuard guard(*this);
+  const ZvStdFCurveImpl& s = *m_impl;
+  if (s.keys.size == 0) return static_cast<FSKind>(s.firstSegmentKind);
+  int found;
+  const unsigned int at = s.LocateParameter(parameter, found);
+  return static_cast<FSKind>(at == 0 ? s.firstSegmentKind : s.keys[at - 1].segmentKind);
+}
+
+unsigned int ZvStdFCurve::SetSegmentKindAtParameter(double parameter, FSKind kind) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  if (s.readOnly || !IsKind(kind) || std::isnan(parameter)) return 0;
+  int found;
+  const unsigned int at = s.keys.size ? s.LocateParameter(parameter, found) : 0;
+  if (at == 0) {
+    s.firstSegmentKind = kind;
+  } else {
+    SetKindAtIndex(s, at - 1, kind);
+  }
+  return 1;
+}
+
+unsigned int ZvStdFCurve::GetSegmentKinds(ZvUByteArray& kinds) const {
+  ZvFCurveLockGuard guard(*this);
+  for (unsigned int i = 0; i < m_impl->keys.size; ++i)
+    kinds.Add(m_impl->keys[i].segmentKind);
+  return m_impl->keys.size;
+}
+
+unsigned int ZvStdFCurve::GetSegmentKindAtIndex(unsigned int index, FSKind& kind) const {
+  ZvFCurveLockGuard guard(*this);
+  if (index >= m_impl->keys.size) return 0;
+  kind = static_cast<FSKind>(m_impl->keys[index].segmentKind);
+  return 1;
+}
+
+unsigned int ZvStdFCurve::SetSegmentKindAtIndex(unsigned int index, FSKind kind) {
+  ZvFCurveLockGuard guard(*this);
+  if (m_impl->readOnly || index >= m_impl->keys.size || !IsKind(kind)) return 0;
+  SetKindAtIndex(*m_impl, index, kind);
+  return 1;
+}
+
+unsigned int ZvStdFCurve::ConvertToUniformSegmentKind(FSKind kind) {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  if (!IsKind(kind)) return 0;
+  FSKind current;
+  if (HasUniformSegmentKind(current) && current == kind) return 1;
+  if (s.readOnly) return 0;
+  s.firstSegmentKind = kind;
+  for (unsigned int i = 0; i < s.keys.size; ++i)
+    SetKindAtIndex(s, i, kind);
+  return 1;
+}
+
+unsigned int ZvStdFCurve::HasUniformSegmentKind(FSKind& kind) const {
+  ZvFCurveLockGuard guard(*this);
+  const ZvStdFCurveImpl& s = *m_impl;
+  if (s.keys.size == 0) return 0;
+  for (unsigned int i = 1; i < s.keys.size; ++i) {
+    if (s.keys[i].segmentKind != s.keys[0].segmentKind) return 0;
+  }
+  kind = static_cast<FSKind>(s.keys[0].segmentKind);
   return 1;
 }

@@ -126,3 +126,50 @@ unsigned int ZvStdFCurve::SmoothSequence(double start, double end, const double*
   if (s.readOnly || !s.GetKeyIndicesInInterval(start, end, first, last, 0, 0)) return 0;
   return s.SmoothSequence(first, last, kernel, kernelSize, *this);
 }
+
+// The curve turns about the middle of its keys: t -> first + last - t. A key's left side becomes
+// its right side; the value that arrives at a key (across a step, the step's value) is the one
+// that now leaves it, so steps keep their values. Each key takes the kind of the segment that
+// now follows it.
+unsigned int ZvStdFCurve::MirrorParameters() {
+  ZvFCurveLockGuard guard(*this);
+  ZvStdFCurveImpl& s = *m_impl;
+  if (s.readOnly || AnyKeyHas(s, CFCFlag_ParameterLock)) return 0;
+  const unsigned int n = s.keys.size;
+  if (n == 0) return 1;
+  const double sum = s.keys[0].parameter + s.keys[n - 1].parameter;
+  // The user data sets travel with their keys, so they are taken out first.
+  ZvDynArray<CFCUserDataSet*> sets(n);
+  for (unsigned int i = 0; i < n; ++i) {
+    const CFCUserDataSet* set = GetUserDataSet(s.keys[i].parameter);
+    sets.Add(set ? new CFCUserDataSet(*set) : nullptr);
+  }
+  ZvAltDynArray<CFCStdKey> mirrored(n);
+  for (unsigned int j = 0; j < n; ++j) {
+    const unsigned int i = n - 1 - j;
+    const CFCStdKey& old = s.keys[i];
+    CFCStdKey k = old;
+    k.parameter = sum - old.parameter;
+    k.leftValue = old.rightValue;
+    k.rightValue = s.EffectiveLeftValue(i);
+    const double lx = sum - old.rightTangent.x, rx = sum - old.leftTangent.x;
+    k.leftTangent = {lx < k.parameter ? lx : k.parameter, old.rightTangent.y};
+    k.rightTangent = {rx > k.parameter ? rx : k.parameter,
+                      old.leftTangent.y + (k.rightValue - old.leftValue)};
+    k.segmentKind =
+        static_cast<unsigned char>(i > 0 ? s.keys[i - 1].segmentKind : s.firstSegmentKind);
+    mirrored.Add(k);
+  }
+  s.firstSegmentKind = s.keys[n - 1].segmentKind;
+  s.valueWhenNoKeys = s.keys[n - 1].rightValue;
+  s.keys = mirrored;
+  s.searchHint = 0;
+  RemoveAllKeyUserData();
+  for (unsigned int j = 0; j < n; ++j) {
+    CFCUserDataSet* set = sets[n - 1 - j];
+    if (set) SetUserDataSet(*set, s.keys[j].parameter);
+    delete set;
+  }
+  ReapplyHandleConstraint(s);
+  return 1;
+}

@@ -7,24 +7,6 @@
 
 // ---- Rasterising -------------------------------------------------------------------------------
 
-int ZvPath2f::Fill(const ZvGC&, ZvRaster<unsigned char>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::Fill(const ZvGC&, ZvRaster<float>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::Fill(const ZvGC&, ZvRaster<short>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::AAFill(const ZvGC&, ZvRaster<unsigned char>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::AAFill(const ZvGC&, ZvRaster<float>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
-int ZvPath2f::AAFill(const ZvGC&, ZvRaster<short>&, int (*)(), const IntBbox2l*) const {
-  return 0;
-}
 int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<unsigned char>&, int (*)()) const {
   return 0;
 }
@@ -32,9 +14,6 @@ int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<float>&, int (*)()) const {
   return 0;
 }
 int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<short>&, int (*)()) const {
-  return 0;
-}
-int ZvPath2f::Stroke(const ZvGC&, ZvRaster<unsigned char>&) const {
   return 0;
 }
 

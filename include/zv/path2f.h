@@ -35,6 +35,7 @@
 class ZvRect2f;
 class ZvOval2f;
 class ZvByteReader;
+class CFillContext;
 
 class ZV_API ZvPath2f : public ZvShape2f {
  public:
@@ -236,6 +237,20 @@ class ZV_API ZvPath2f : public ZvShape2f {
   int LockG1(unsigned int index);
   int UnlockG1(unsigned int index);
 
+  // ---- Rasterising (the fills above, and strokes into the other pixel types) ----------------
+  // Strokes of the unsigned char variant above into the other rasteriser types: the outline
+  // filled with full values, never antialiased.
+  int Stroke(const ZvGC& gc, ZvRaster<short>& raster) const;
+  int Stroke(const ZvGC& gc, ZvRaster<float>& raster) const;
+  // The shared front end of the fills: the pixel box (columns xMin..xMax-1, rows yMin..yMax-1)
+  // of the closed subpaths mapped by the context's transform, clipped to the raster and to
+  // `box` (whose last column and row stay outside, on purpose), and the edge tables of their
+  // polygon, flattened at max(0.25, tolerance) pixels and then scaled by `scale`. Answers 0 when
+  // there is nothing to fill.
+  int CalculateFillParameters(const ZvGC& gc, int rasterWidth, int rasterHeight, double scale,
+                              CFillContext& ctx, int& xMin, int& yMin, int& xMax, int& yMax,
+                              int& numVertices, const IntBbox2l* box) const;
+
  protected:
   // Builds the outline of a rectangle from the handles of `shape` read through GetPoint (corners
   // 2, 4, 6, 8), or of an oval from its handles 1..8 read through GetPoints. These carry the
@@ -248,6 +263,8 @@ class ZV_API ZvPath2f : public ZvShape2f {
   unsigned int currentSubpathOpen;
 
  private:
+  template <class T>
+  int StrokeImp(const ZvGC& gc, ZvRaster<T>& raster) const;
   friend class ZvPath2fMeasure;  // the measuring code reads the arrays directly
   friend ZvShape2f* ZvShape2f_CreateFromBuffer(const void*, std::size_t, unsigned int&);
   // The body reader behind ReadFromBufferBody and the bounded factory.

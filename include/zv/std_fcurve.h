@@ -19,9 +19,17 @@
 // the segment starts from where the last one ended. Every public operation takes the curve's
 // lock, queries included.
 //
-// Not available yet; these refuse with 0 (or null) and change nothing: SnapShot, Cut, Append,
-// Paste, ReduceNumKeys, EvalSequence, Flatten, FlattenFromTo, MirrorParameters,
-// ScaleAndOffsetParameters, GetBufferSize, WriteToBuffer, ReadFromBufferBody.
+// Flattening. Flatten and FlattenFromTo append a tagged polyline to the arrays (tags
+// ZvPointTag_First, _Continue, _Last per run; a jump in value is a vertical edge inside a run)
+// and return 1. Flatten covers the keys; FlattenFromTo covers the parameters that a box in
+// transformed space shows, with extrapolation, clipped to the box. EvalSequence samples that
+// polyline at regular steps and replaces the contents of its arrays. Under the cycle methods a
+// box showing more than a million periods is refused with 0.
+//
+// Persistence is not available yet: GetBufferSize, WriteToBuffer and ReadFromBufferBody refuse
+// with 0 and change nothing. ScaleAndOffsetParameters does what concerns every key (a scale, a
+// mirror, a shift of the whole curve) and refuses with 0 a change of part of the keys, which
+// needs the interactive key stretcher and mover.
 #ifndef ZV_STD_FCURVE_H
 #define ZV_STD_FCURVE_H
 
@@ -46,7 +54,21 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   // segment if they fold back. The first point must lie left of the last.
   ZvStdFCurve(const ZvPoint2<double>& p0, const ZvPoint2<double>& p1, const ZvPoint2<double>& p2,
               const ZvPoint2<double>& p3);
+  // One straight cubic segment from (startParameter, startValue) to (endParameter, endValue),
+  // handles at the thirds of the chord. The start must lie left of the end.
+  ZvStdFCurve(double startParameter, double startValue, double endParameter, double endValue);
+  // A curve through points in ascending parameter order. DPCatmullRom: cubic segments through
+  // every point, each tangent along the chord of the neighbours. DPCubicC2: the natural cubic
+  // spline through every point. DPLinearFitC0: lines, a key where a point leaves the current
+  // line by more than the tolerance. DPCubicFitG1: a cubic spline with continuous tangents that
+  // passes within the tolerance of every point, on as few keys as it needs. The last key takes
+  // `lastSegmentKind`. Points out of order, or not finite, give a curve without keys.
+  ZvStdFCurve(const ZvPoint2dArray& points, DPMethod method, double tolerance,
+              FSKind firstSegmentKind, FSKind lastSegmentKind);
   ZvStdFCurve(const ZvStdFCurve& other);
+  // The part of `source` from start to end: keys made at both ends without changing the shape,
+  // the keys outside gone with their user data, automatic handles at the cuts frozen.
+  ZvStdFCurve(const ZvStdFCurve& source, double start, double end);
   ~ZvStdFCurve() override;
   ZvStdFCurve& operator=(const ZvStdFCurve& other);
 
@@ -161,6 +183,15 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   // Creates a key, or sets the value of the key at the parameter. The kinds are those of the
   // segments left and right of the new key; 0 inherits the kind in force there.
   unsigned int CreateKey(double parameter, double value, FSKind left, FSKind right);
+  // Replaces the keys of the interval by one key, keeping the shape of the surviving
+  // neighbours' segments; kinds as in CreateKey.
+  unsigned int MergeAndCreateKey(double start, double end, double parameter, double value,
+                                 FSKind left, FSKind right, int excludeStart, int excludeEnd,
+                                 int keepAttributes);
+  // Removes keys; the segment left in their place takes `kind`, or with 0 the kind of the
+  // segment before them. Cubic neighbours are joined into one cubic of the same shape.
+  unsigned int RemoveKey(double parameter, FSKind kind, double tolerance);
+  unsigned int RemoveKeys(double start, double end, FSKind kind, int excludeStart, int excludeEnd);
   // The left limit at the parameter, with extrapolation.
   double EvalLeft(double parameter, int clamped) const;
   // The integral of the plain values from a to b (a <= b); the extrapolation does not enter.
@@ -170,6 +201,17 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
                              double tolerance, int clamped) const;
   unsigned int HasConstantValue() const;
 
+  // The kind in force at the parameter: that of the key at or before it, or the first kind.
+  FSKind GetSegmentKindAtParameter(double parameter) const;
+  unsigned int SetSegmentKindAtParameter(double parameter, FSKind kind);
+  // Appends the segment kind of every key, in key order; returns how many.
+  unsigned int GetSegmentKinds(ZvUByteArray& kinds) const;
+  unsigned int GetSegmentKindAtIndex(unsigned int index, FSKind& kind) const;
+  unsigned int SetSegmentKindAtIndex(unsigned int index, FSKind kind);
+  // Every segment takes the kind; segments turning cubic get valid handles.
+  unsigned int ConvertToUniformSegmentKind(FSKind kind);
+  // 1 with the kind when every key's segment has the same kind (0 without keys).
+  unsigned int HasUniformSegmentKind(FSKind& kind) const;
   unsigned int GetSegmentKind(double parameter, KeySide side, FSKind& kind, double tolerance) const;
   unsigned int SetSegmentKind(double parameter, KeySide side, FSKind kind, double tolerance);
   FSKind GetFirstSegmentKind() const;
@@ -187,6 +229,52 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
                                double tolerance);
   unsigned int SetKeyTgtHandles(double parameter, const ZvPoint2<double>& left,
                                 const ZvPoint2<double>& right, double tolerance);
+
+  // Appending after the last key (the point must lie right of it). A constant segment holds the
+  // last right value up to the point, where the new key takes the point's value; a linear one
+  // runs to the point. The cubic one takes the last key's right handle, the new key's left
+  // handle and the new key, absolute, and refuses handles that would fold the segment.
+  unsigned int AppendConstantSegment(const ZvPoint2<double>& point);
+  unsigned int AppendLinearSegment(const ZvPoint2<double>& point);
+  // Moves the last key to the point instead when the point continues the last linear segment
+  // within the tolerance (locked parameters or values stay, and that is still a success).
+  unsigned int AppendOrExtendLinearSegment(const ZvPoint2<double>& point, double tolerance);
+  unsigned int AppendBezierCubicSegment(const ZvPoint2<double>& right, const ZvPoint2<double>& left,
+                                        const ZvPoint2<double>& end);
+
+  // Tangent continuity: the two handles of a key stay collinear. Locking needs the handles to be
+  // collinear already on a key between two cubic segments. The found key's parameter is
+  // written back.
+  unsigned int LockTangentContinuity(double& parameter, double tolerance);
+  unsigned int UnlockTangentContinuity(double& parameter, double tolerance);
+  unsigned int IsTangentContinuityLocked(double& parameter, double tolerance) const;
+  // Locks continuity where the handles already agree or no cubic segment touches the key; making
+  // them agree takes the interactive tangent mover, which this does not run: such a key is
+  // refused with 0.
+  unsigned int UnifyAndLockTangentContinuity(double& parameter, KeySide side, double tolerance);
+  // Length continuity: both handles keep the same visual length, Y counted times `aspect`.
+  unsigned int LockTangentLengthContinuity(double& parameter, double tolerance, double aspect);
+  unsigned int UnlockTangentLengthContinuity(double& parameter, double tolerance);
+  unsigned int IsTangentLengthContinuityLocked(double& parameter, double tolerance) const;
+  // As UnifyAndLockTangentContinuity, for lengths.
+  unsigned int UnifyAndLockTangentLengthContinuity(double& parameter, KeySide side,
+                                                   double tolerance, double aspect);
+  unsigned int AreAnyTgtLengthsLockedInInterval(double start, double end, int excludeStart,
+                                                int excludeEnd) const;
+  unsigned int AreAnyTgtDirectionsLockedInInterval(double start, double end, int excludeStart,
+                                                   int excludeEnd) const;
+  // The evaluated handles of the interval's keys become their actual handles (at an excluded
+  // end only the inward one), and the passed automatic-handle constraints (FlatTangent,
+  // FlatAtExtremum, AutoTangent, CollapsedTangent, ChordTangent) are cleared on them.
+  unsigned int FreezeTangentsInInterval(double first, double last, int excludeFirst,
+                                        int excludeLast, KeyConstraint constraints);
+  unsigned int FreezeAllTangents(KeyConstraint constraints);
+  // The keys with AutoTangent at the parameter and next to it take their evaluated handles as
+  // actual handles, keeping the flag, so that they keep their shape once the flag goes. 0 on a
+  // read-only curve or without a key at the parameter.
+  unsigned int AdjustAdjacentAutomaticKeysTangents(double parameter);
+  unsigned int GetConstraintAtIndex(unsigned int index, KeyConstraint constraint, int& on) const;
+  unsigned int SetConstraintAtIndex(unsigned int index, KeyConstraint constraints, int on);
 
   // Is the curve's data consistent: ascending keys, known segment kinds, function segments,
   // ordered clamps, no NaN.

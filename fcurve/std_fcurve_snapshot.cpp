@@ -1,0 +1,182 @@
+// SnapShot: a new standard curve equal to this one over an interval, the extrapolated parts
+// made into keys. Under the cycle methods the interval is assembled from whole periods and the
+// pieces at its ends.
+#include <zv/std_fcurve.h>
+
+#include "fcurve/fcurve_lock.h"
+#include "fcurve/std_fcurve_impl.h"
+
+#include <cmath>
+#include <memory>
+#include <new>
+
+namespace {
+
+// An interval longer than this many periods is refused rather than built key by key.
+constexpr double kMaxSnapShotCycles = 1e5;
+
+using Curve = std::unique_ptr<ZvStdFCurve>;
+
+// The folded start of [lo, hi] in the keyed range [t0, tn] and its period number.
+double FoldStart(double lo, double t0, double tn, double& cycle) {
+  const double period = tn - t0;
+  const double r = (lo - t0) / period;
+  cycle = std::floor(r);
+  double folded;
+  if (t0 - lo <= 1e-9) {
+    const double f = (r - std::floor(r)) * period;
+    folded = std::fabs(f) <= 1e-9 ? t0 : t0 + f;
+  } else {
+    const double f = (std::ceil(r) - r) * period;
+    folded = std::fabs(f) <= 1e-9 ? t0 : tn - f;
+  }
+  return folded < t0 ? t0 : folded > tn ? tn : folded;
+}
+
+// The folded end, a whole number of periods sent to the end of the previous period.
+double FoldEnd(double hi, double t0, double tn, double& cycle) {
+  const double period = tn - t0;
+  const double q = (hi - t0) / period;
+  cycle = std::ceil(q) - 1.0;
+  double folded;
+  if (hi > t0) {
+    const double f = (q - std::floor(q)) * period;
+    folded = std::fabs(f) <= 1e-9 ? tn : t0 + f;
+  } else {
+    const double f = (std::ceil(q) - q) * period;
+    folded = std::fabs(f) <= 1e-9 ? tn : tn - f;
+  }
+  return folded < t0 ? t0 : folded > tn ? tn : folded;
+}
+
+// Moves a snapshot under construction along either axis. Its keys carry the source's locks,
+// which guard the source against edits, not the copies against being put in place.
+void MoveAlong(ZvStdFCurveImpl& s, ZvBaseFCurve& curve, double dx, double dy) {
+  for (unsigned int i = 0; i < s.keys.size; ++i) {
+    CFCStdKey& k = s.keys[i];
+    k.parameter += dx;
+    k.leftTangent.x += dx;
+    k.rightTangent.x += dx;
+    k.leftValue += dy;
+    k.rightValue += dy;
+    k.leftTangent.y += dy;
+    k.rightTangent.y += dy;
+  }
+  s.valueWhenNoKeys += dy;
+  if (dx != 0.0) curve.TranslateAllKeyUserData(dx);
+}
+
+}  // namespace
+
+ZvBaseFCurve* ZvStdFCurve::SnapShot(double start, double end, ExtrapolationMethod method) const {
+  if (!std::isfinite(start) || !std::isfinite(end)) return nullptr;
+  ZvFCurveLockGuard guard(*this);
+  const ZvStdFCurveImpl& s = *m_impl;
+  const double lo = start < end ? start : end, hi = start < end ? end : start;
+  auto right = [&s](double t) { return s.EvalRightUsingExtrapolationMethod(t); };
+  auto left = [&s](double t) { return s.EvalLeftUsingExtrapolationMethod(t); };
+  auto section = [this](double a, double b) { return Curve(new ZvStdFCurve(*this, a, b)); };
+  const unsigned int n = s.keys.size;
+  try {
+    Curve out;
+    if (n == 0) {
+      out = section(lo, hi);
+      out->m_impl->readOnly = 0;
+      out->CreateNonModifyingKey(lo, 1);
+      out->CreateNonModifyingKey(hi, 1);
+    } else if (std::fabs(lo - hi) <= 1e-15) {
+      const FSKind kind = GetSegmentKindAtParameter(lo);
+      out.reset(new ZvStdFCurve(lo, left(lo), right(lo), kind, kind));
+    } else if (n > 1 && (s.extrapolation == CycleExtrapolation ||
+                         s.extrapolation == CycleWithOffsetExtrapolation)) {
+      const double t0 = s.keys[0].parameter, tn = s.keys[n - 1].parameter;
+      const double offset = s.extrapolation == CycleWithOffsetExtrapolation
+                                ? s.keys[n - 1].rightValue - s.keys[0].leftValue
+                                : 0.0;
+      double a, b;
+      const double fs = FoldStart(lo, t0, tn, a), fe = FoldEnd(hi, t0, tn, b);
+      if (b - a > kMaxSnapShotCycles) return nullptr;
+      const double shift = lo - fs;
+      if (a >= b) {
+        // Within one period; deliberately without a value offset, also with the offset method.
+        out = section(fs, fe);
+        out->m_impl->readOnly = 0;
+      } else {
+        if (fs < tn) {
+          out = section(fs, tn);
+          out->m_impl->readOnly = 0;
+          MoveAlong(*out->m_impl, *out, 0.0, a * offset);
+        }
+        if (a + 1 < b) {
+          ZvStdFCurve whole(*this);
+          whole.m_impl->readOnly = 0;
+          MoveAlong(*whole.m_impl, whole, 0.0, (a + 1) * offset);
+          for (double c = a + 1; c < b; c += 1.0) {
+            if (out) {
+              out->Append(whole);
+            } else {
+              out.reset(new ZvStdFCurve(whole));
+            }
+            MoveAlong(*whole.m_impl, whole, 0.0, offset);
+          }
+        }
+        if (fe > t0) {
+          Curve last = section(t0, fe);
+          last->m_impl->readOnly = 0;
+          MoveAlong(*last->m_impl, *last, 0.0, b * offset);
+          if (out) {
+            out->Append(*last);
+          } else {
+            out = std::move(last);
+          }
+        }
+      }
+      if (!out) return nullptr;
+      MoveAlong(*out->m_impl, *out, shift, 0.0);
+    } else {
+      const double t0 = s.keys[0].parameter, tn = s.keys[n - 1].parameter;
+      const unsigned int ext = s.extrapolation;
+      // The extrapolation of this curve, made into a segment kind of the snapshot.
+      auto extend = [ext](ZvStdFCurve& c, double at) {
+        if (ext == ConstantExtrapolation) c.SetSegmentKindAtParameter(at, ConstantSegment);
+        if (ext == LinearExtrapolation) c.SetSegmentKindAtParameter(at, LinearSegment);
+      };
+      const FSKind first = static_cast<FSKind>(s.firstSegmentKind);
+      if (lo < t0 && hi > tn) {
+        out.reset(new ZvStdFCurve(*this));
+        out->m_impl->readOnly = 0;
+        out->CreateKey(lo, right(lo));
+        out->CreateKey(hi, right(hi));
+        extend(*out, lo);
+        extend(*out, tn);
+      } else if (lo < t0 && hi <= t0) {
+        out.reset(new ZvStdFCurve(lo, right(lo), right(lo), first, first));
+        extend(*out, lo);
+        out->CreateKey(hi, right(hi));
+      } else if (lo < t0) {
+        out = section(t0, hi);
+        out->m_impl->readOnly = 0;
+        out->CreateKey(lo, right(lo));
+        extend(*out, lo);
+      } else if (hi <= tn) {
+        out = section(lo, hi);
+      } else if (lo >= tn) {
+        const FSKind kind = static_cast<FSKind>(s.keys[n - 1].segmentKind);
+        out.reset(new ZvStdFCurve(lo, right(lo), right(lo), kind, kind));
+        out->CreateKey(hi, right(hi));
+        extend(*out, lo);
+        extend(*out, hi);
+      } else {
+        out = section(lo, tn);
+        out->m_impl->readOnly = 0;
+        extend(*out, tn);
+        out->CreateKey(hi, right(hi));
+      }
+    }
+    out->m_impl->readOnly = 0;
+    out->SetExtrapolationMethod(method);
+    return out.release();
+  } catch (const std::bad_alloc&) {
+    return nullptr;
+  }
+}

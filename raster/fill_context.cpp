@@ -1,0 +1,93 @@
+// Edge tables of a fill, built from flattened closed subpaths.
+#include "raster/fill_context.h"
+
+#include <algorithm>
+#include <cmath>
+#include <new>
+
+namespace {
+template <class Word>
+void FreeRows(Word* (&rows)[3], std::int32_t first) {
+  for (Word*& row : rows) {
+    if (row) delete[](row + first);
+    row = nullptr;
+  }
+}
+
+template <class Word>
+void AllocateRows(Word* (&rows)[3], int first, int end, bool three) {
+  const int count = end - first;
+  for (int i = 0; i < (three ? 3 : 1); ++i)
+    rows[i] = new Word[count]() - first;
+}
+}  // namespace
+
+CFillContext::~CFillContext() {
+  delete[] vertices;
+  delete[] sortedVertices;
+  delete[] activeEdges;
+  vertices = nullptr;
+  sortedVertices = nullptr;
+  activeEdges = nullptr;
+  FreeRows(abuffer, firstCell);
+  FreeRows(abuffer8, firstCell);
+  delete[] featherFilter;
+  delete[] cumulativeFeatherFilter;
+  delete[] static_cast<unsigned char*>(rowBuffer0);
+  delete[] static_cast<unsigned char*>(rowBuffer1);
+  featherFilter = nullptr;
+  cumulativeFeatherFilter = nullptr;
+  rowBuffer0 = nullptr;
+  rowBuffer1 = nullptr;
+}
+
+int CFillContext::BuildTables(const ZvPoint2dArray& points, const ZvPointTagArray& tags,
+                              double scale) {
+  const unsigned int count = points.size < tags.size ? points.size : tags.size;
+  if (count == 0) return 0;
+  vertices = new CFillVertex[count];
+  sortedVertices = new CFillSortedVertex[count];
+  activeEdges = new CFillActiveEdge[count];
+  int n = 0;
+  int subpathStart = 0;
+  for (unsigned int i = 0; i < count; ++i) {
+    if (tags[i] == ZvPointTag_Last) {
+      // The closing point repeats the first one: it only ties the ring.
+      if (n > subpathStart) {
+        sortedVertices[subpathStart].prev = n - 1;
+        sortedVertices[n - 1].next = subpathStart;
+      }
+      subpathStart = n;
+      continue;
+    }
+    vertices[n].x = points[i].x * scale;
+    vertices[n].y = points[i].y * scale;
+    // A non-finite coordinate has no place in the y order: such a polygon is not filled.
+    if (!std::isfinite(vertices[n].x) || !std::isfinite(vertices[n].y)) return 0;
+    sortedVertices[n] = CFillSortedVertex{n, n - 1, n + 1, vertices};
+    ++n;
+  }
+  // An unterminated last subpath is closed the same way, so no ring points past the table.
+  if (n > subpathStart) {
+    sortedVertices[subpathStart].prev = n - 1;
+    sortedVertices[n - 1].next = subpathStart;
+  }
+  // Rising y, with the comparator inlined rather than called through qsort.
+  std::sort(sortedVertices, sortedVertices + n,
+            [](const CFillSortedVertex& a, const CFillSortedVertex& b) {
+              return CompareIndices(&b, &a) > 0;
+            });
+  return n;
+}
+
+void CFillContext::AllocateCoverageRows4x4(int first, int end, bool three) {
+  firstCell = first;
+  endCell = end;
+  AllocateRows(abuffer, first, end, three);
+}
+
+void CFillContext::AllocateCoverageRows8x8(int first, int end, bool three) {
+  firstCell = first;
+  endCell = end;
+  AllocateRows(abuffer8, first, end, three);
+}

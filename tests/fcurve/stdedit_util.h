@@ -1,0 +1,85 @@
+// Helpers of the standard-curve editing tests: a full dump of a curve's keys and settings, so
+// that a refused edit can be checked to have changed nothing, and dense sampling for
+// shape-keeping edits.
+#ifndef ZV_TESTS_FCURVE_STDEDIT_UTIL_H
+#define ZV_TESTS_FCURVE_STDEDIT_UTIL_H
+
+#include <gtest/gtest.h>
+
+#include <zv/std_fcurve.h>
+
+#include <cstdio>
+#include <string>
+#include <vector>
+
+namespace stdedit {
+
+using C = ZvBaseFCurve;
+
+// Every stored number of every key, the flags and the curve-wide values, in full precision.
+inline std::string Dump(const ZvStdFCurve& curve) {
+  std::string out;
+  char line[512];
+  C::FCurveInfo info{};
+  info.mask = 127;
+  curve.GetFCurveInfo(&info);
+  double lo = 0, hi = 0;
+  curve.GetClampingValues(lo, hi);
+  std::snprintf(line, sizeof line, "n=%u v=%.17g first=%u ext=%u clamp=%.17g,%.17g ro=%u\n",
+                info.numKeys, info.valueWhenNoKeys, info.firstSegmentKind, info.extrapolation, lo,
+                hi, curve.IsReadOnly());
+  out += line;
+  for (unsigned int i = 0; i < curve.GetNumKeys(); ++i) {
+    C::KeyInfo k{};
+    k.mask = 511;
+    curve.GetKeyInfoFromIndex(i, &k);
+    ZvPoint2<double> l, r;
+    curve.GetActualKeyTgtHandles(k.parameter, l, r, 0.0);
+    unsigned int flags = 0;
+    for (unsigned int bit = 1; bit <= 4096; bit <<= 1) {
+      if (bit == C::WholeKeyLock) continue;  // a combination, not a bit of its own
+      double at = k.parameter;
+      int on = 0;
+      curve.GetConstraint(at, static_cast<C::KeyConstraint>(bit), on, 0.0);
+      if (on) flags |= bit;
+    }
+    std::snprintf(line, sizeof line,
+                  "%.17g %.17g %.17g L(%.17g,%.17g) R(%.17g,%.17g) kind=%u flags=%u\n", k.parameter,
+                  k.leftValue, k.rightValue, l.x, l.y, r.x, r.y,
+                  static_cast<unsigned int>(k.segmentKind), flags);
+    out += line;
+  }
+  return out;
+}
+
+inline std::vector<double> Sample(const ZvStdFCurve& curve, double a, double b, int count) {
+  std::vector<double> values;
+  for (int i = 0; i <= count; ++i)
+    values.push_back(curve.Eval(a + (b - a) * i / count, 0));
+  return values;
+}
+
+inline void ExpectSameShape(const std::vector<double>& a, const std::vector<double>& b,
+                            double tol) {
+  ASSERT_EQ(a.size(), b.size());
+  for (size_t i = 0; i < a.size(); ++i)
+    EXPECT_NEAR(a[i], b[i], tol) << "sample " << i;
+}
+
+// Keys of mixed kinds: a cubic run with continued tangents, a step, a line and a jump.
+inline ZvStdFCurve Mixed() {
+  ZvStdFCurve curve;
+  const double values[] = {0.0, 2.0, -1.0, 3.0, 1.0};
+  for (int i = 0; i < 5; ++i)
+    curve.CreateKey(i * 1.5, values[i]);
+  curve.CreateKey(7.0, 4.0, C::LinearSegment, C::ConstantSegment);
+  curve.CreateKey(8.0, -2.0);
+  curve.SetKeyValue(8.0, C::RightSide, 0.5, 0.0);
+  curve.CreateKey(9.5, 1.0);
+  curve.SetSegmentKind(8.0, C::RightSide, C::LinearSegment, 0.0);
+  return curve;
+}
+
+}  // namespace stdedit
+
+#endif

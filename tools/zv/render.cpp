@@ -1,0 +1,56 @@
+#include "render.h"
+
+#include <zv/gc.h>
+
+#include <algorithm>
+#include <vector>
+
+namespace {
+// A copy of the path with each open subpath closed by a line back to its start.
+ZvPath2f ClosedCopy(const ZvPath2f& path) {
+  ZvPath2f closed(path);
+  std::vector<unsigned int> lasts;
+  ZvPath2fIter it(closed);
+  unsigned int first = 0, last = 0;
+  while (it.GetNextSubPathIndices(first, last))
+    if (last > first && !closed.IsSubpathClosed(first)) lasts.push_back(last);
+  // From the end, so that the indices still to come do not move.
+  for (auto i = lasts.rbegin(); i != lasts.rend(); ++i)
+    closed.CloseSubpath(*i);
+  return closed;
+}
+
+void KeepMaximum(ZvRaster<unsigned char>& into, const ZvRaster<unsigned char>& layer) {
+  unsigned char* dst = into.GetRaster();
+  const unsigned char* src = layer.GetRaster();
+  for (int i = 0; i < into.GetSize(); ++i)
+    dst[i] = std::max(dst[i], src[i]);
+}
+}  // namespace
+
+void ZvRenderPath(const ZvPath2f& path, const ZvRenderOptions& options,
+                  ZvRaster<unsigned char>& raster) {
+  ZvGC gc;
+  gc.transform.Translate(options.translateX, options.translateY, 0.0);
+  gc.transform.Scale(options.scale, options.scale, 1.0);
+  gc.fillRule = options.fillRule;
+  gc.samplingRate = options.rate;
+  gc.featherRadius = options.feather;
+  gc.opacity = options.opacity;
+  gc.lineWidth = options.strokeWidth;
+  gc.joinStyle = options.join;
+  gc.capStyle = options.cap;
+  gc.miterLimit = options.miterLimit;
+  gc.taper = options.taper ? 1 : 0;
+  gc.flattenTolerance = 0.25;
+  ZvRaster<unsigned char> layer(raster.GetWidth(), raster.GetHeight(), 0);
+  if (options.fill) {
+    ClosedCopy(path).AAFill(gc, layer, nullptr, nullptr);
+    KeepMaximum(raster, layer);
+  }
+  if (options.strokeWidth > 0) {
+    layer.MemsetBuffer(0);
+    path.Stroke(gc, layer);
+    KeepMaximum(raster, layer);
+  }
+}
