@@ -150,23 +150,6 @@ Method GeomMethod() {
 }
 #endif
 
-P2 Eval(const std::vector<P2>& p, double t) {
-  std::vector<P2> w = p;
-  for (size_t level = w.size() - 1; level > 0; --level)
-    for (size_t i = 0; i < level; ++i)
-      w[i] = w[i] * (1.0 - t) + w[i + 1] * t;
-  return w[0];
-}
-
-double DistanceToSegment(const P2& q, const P2& a, const P2& b) {
-  const P2 ab = b - a, aq = q - a;
-  const double l2 = ZvDot(ab, ab);
-  double t = l2 > 0.0 ? ZvDot(aq, ab) / l2 : 0.0;
-  t = t < 0.0 ? 0.0 : (t > 1.0 ? 1.0 : t);
-  const P2 d = a + ab * t - q;
-  return std::sqrt(ZvDot(d, d));
-}
-
 struct Accuracy {
   double segmentsPerStroke = 0, meanMax = 0, maxMax = 0, overTolerance = 0;
 };
@@ -179,7 +162,7 @@ Accuracy Measure(const Method& m) {
     std::vector<P2> dense;
     for (const std::vector<P2>& c : chain)
       for (int k = 0; k <= 128; ++k)
-        dense.push_back(Eval(c, k / 128.0));
+        dense.push_back(EvalBezier(c.data(), static_cast<unsigned int>(c.size()) - 1, k / 128.0));
     double worst = 0.0;
     for (unsigned int i = 0; i < s.size; ++i) {
       const P2 q{s[i].x, s[i].y};

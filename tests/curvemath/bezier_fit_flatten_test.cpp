@@ -7,29 +7,11 @@
 #include <random>
 #include <vector>
 
+#include "tests/curvemath/bezier_fit_strokes.h"
+
 namespace {
 
 using P2d = ZvPoint2<double>;
-
-// De Casteljau, evaluated afresh at every parameter: the reference the walk is compared with.
-P2d Eval(const P2d* p, unsigned int degree, double t) {
-  P2d w[9];
-  for (unsigned int i = 0; i <= degree; ++i)
-    w[i] = p[i];
-  for (unsigned int level = degree; level > 0; --level)
-    for (unsigned int i = 0; i < level; ++i)
-      w[i] = w[i] * (1.0 - t) + w[i + 1] * t;
-  return w[0];
-}
-
-double DistanceToSegment(const P2d& q, const P2d& a, const P2d& b) {
-  const P2d ab = b - a, aq = q - a;
-  const double l2 = ZvDot(ab, ab);
-  double t = l2 > 0.0 ? ZvDot(aq, ab) / l2 : 0.0;
-  t = t < 0.0 ? 0.0 : (t > 1.0 ? 1.0 : t);
-  const P2d d = a + ab * t - q;
-  return std::sqrt(ZvDot(d, d));
-}
 
 double DistanceToPolyline(const P2d& q, const ZvPoint2dArray& poly) {
   double best = HUGE_VAL;
@@ -125,7 +107,7 @@ TEST(BezierFitFlatten, EveryDegreeFollowsItsCurve) {
       double t = 0.0;
       for (unsigned int i = 1; i + 1 < n; ++i) {
         auto dist2 = [&](double s) {
-          const P2d d = Eval(p.data(), degree, s) - poly[i];
+          const P2d d = EvalBezier(p.data(), degree, s) - poly[i];
           return ZvDot(d, d);
         };
         const double step = 1.0 / 256;
@@ -144,7 +126,7 @@ TEST(BezierFitFlatten, EveryDegreeFollowsItsCurve) {
       // The step count comes from the deviation across the chord of each piece: an estimate
       // of the distance to the curve, not a strict bound.
       for (int k = 0; k <= 200; ++k) {
-        const P2d q = Eval(p.data(), degree, k / 200.0);
+        const P2d q = EvalBezier(p.data(), degree, k / 200.0);
         worst = std::fmax(worst, DistanceToPolyline(q, poly) / tolerance);
       }
 

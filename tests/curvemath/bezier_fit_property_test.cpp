@@ -15,25 +15,6 @@ namespace {
 
 using P2d = ZvPoint2<double>;
 
-P2d Eval(const P2d* p, unsigned int degree, double t) {
-  P2d w[9];
-  for (unsigned int i = 0; i <= degree; ++i)
-    w[i] = p[i];
-  for (unsigned int level = degree; level > 0; --level)
-    for (unsigned int i = 0; i < level; ++i)
-      w[i] = w[i] * (1.0 - t) + w[i + 1] * t;
-  return w[0];
-}
-
-double DistanceToSegment(const P2d& q, const P2d& a, const P2d& b) {
-  const P2d ab = b - a, aq = q - a;
-  const double l2 = ZvDot(ab, ab);
-  double t = l2 > 0.0 ? ZvDot(aq, ab) / l2 : 0.0;
-  t = t < 0.0 ? 0.0 : (t > 1.0 ? 1.0 : t);
-  const P2d d = a + ab * t - q;
-  return std::sqrt(ZvDot(d, d));
-}
-
 // The corner rule, restated: turning back beyond a right angle with a squared cosine above
 // cornerCos2.
 bool IsCorner(const ZvPoint2fArray& q, unsigned int i, double cornerCos2) {
@@ -124,7 +105,7 @@ TEST(BezierFitProperty, EverySegmentFollowsItsStretchOfANoisyStroke) {
       // judged on).
       std::vector<P2d> dense;
       for (int t = 0; t <= 256; ++t)
-        dense.push_back(Eval(s.control.data(), d, t / 256.0));
+        dense.push_back(EvalBezier(s.control.data(), d, t / 256.0));
       for (unsigned int v = s.first; v <= s.last; ++v) {
         const P2d q{input[v].x, input[v].y};
         double best = HUGE_VAL;

@@ -1,9 +1,11 @@
-// Pen-like strokes for the fit tests and benchmark: a smooth random curve walked at a varying
-// speed, with Gaussian noise on every coordinate, from a fixed seed.
+// Pen-like strokes for the fit tests and benchmark (a smooth random curve walked at a varying
+// speed, with Gaussian noise on every coordinate, from a fixed seed), and the plain geometry
+// they check fits with.
 #ifndef ZV_TESTS_CURVEMATH_BEZIER_FIT_STROKES_H
 #define ZV_TESTS_CURVEMATH_BEZIER_FIT_STROKES_H
 
 #include <zv/arrays.h>
+#include <zv/point.h>
 
 #include <cmath>
 #include <random>
@@ -39,6 +41,27 @@ inline ZvPoint2fArray PenStroke(std::mt19937& rng, unsigned int count, double sp
     }
   }
   return out;
+}
+
+// De Casteljau, evaluated afresh at every parameter.
+inline ZvPoint2<double> EvalBezier(const ZvPoint2<double>* p, unsigned int degree, double t) {
+  ZvPoint2<double> w[9];
+  for (unsigned int i = 0; i <= degree; ++i)
+    w[i] = p[i];
+  for (unsigned int level = degree; level > 0; --level)
+    for (unsigned int i = 0; i < level; ++i)
+      w[i] = w[i] * (1.0 - t) + w[i + 1] * t;
+  return w[0];
+}
+
+inline double DistanceToSegment(const ZvPoint2<double>& q, const ZvPoint2<double>& a,
+                                const ZvPoint2<double>& b) {
+  const ZvPoint2<double> ab = b - a, aq = q - a;
+  const double l2 = ZvDot(ab, ab);
+  double t = l2 > 0.0 ? ZvDot(aq, ab) / l2 : 0.0;
+  t = t < 0.0 ? 0.0 : (t > 1.0 ? 1.0 : t);
+  const ZvPoint2<double> d = a + ab * t - q;
+  return std::sqrt(ZvDot(d, d));
 }
 
 #endif
