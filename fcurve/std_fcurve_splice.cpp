@@ -136,12 +136,12 @@ ZvStdFCurve::ZvStdFCurve(const ZvStdFCurve& source, double start, double end)
   if (start > t0) {
     for (unsigned int i = 0; i < s.keys.size && s.keys[i].parameter <= start + 1e-15; ++i)
       ClearBits(s.keys[i], locks);
-    RemoveHead(start);
+    ZvStdFCurve::RemoveHead(start);
   }
   if (end < tn) {
     for (unsigned int i = s.keys.size; i-- > 0 && s.keys[i].parameter >= end - 1e-15;)
       ClearBits(s.keys[i], locks);
-    RemoveTail(end);
+    ZvStdFCurve::RemoveTail(end);
   }
   s.readOnly = readOnly;
 }

@@ -8,17 +8,23 @@
 namespace {
 template <class Word>
 void FreeRows(Word* (&rows)[3], std::int32_t first) {
+  const std::int32_t origin = first < 0 ? first : 0;
   for (Word*& row : rows) {
-    if (row) delete[](row + first);
+    if (row) delete[](row + origin);
     row = nullptr;
   }
 }
 
+// Rows are indexed by cell. A block that starts at cell min(first, 0) keeps row pointers inside
+// their blocks (a pointer before a block's start is undefined), at the cost of the cells left of
+// a box that begins right of 0.
 template <class Word>
 void AllocateRows(Word* (&rows)[3], int first, int end, bool three) {
-  const int count = end - first;
-  for (int i = 0; i < (three ? 3 : 1); ++i)
-    rows[i] = new Word[count]() - first;
+  const int origin = first < 0 ? first : 0;
+  for (int i = 0; i < (three ? 3 : 1); ++i) {
+    Word* block = new Word[end - origin]();
+    rows[i] = block - origin;
+  }
 }
 }  // namespace
 

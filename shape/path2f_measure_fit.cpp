@@ -10,7 +10,8 @@ unsigned int ZvPath2f::AddFittedSamplesFromPath(const ZvGC& gc, const ZvPath2f& 
   ZvShapeLock guard(*this);
   ZvShapeLock guardSource(source);
   if (&source == this) {
-    const ZvPath2f copy(source);
+    // The fit appends to this path while reading the source: read from a snapshot.
+    const ZvPath2f copy(source);  // NOLINT(performance-unnecessary-copy-initialization)
     return AddFittedSamplesFromPath(gc, copy);
   }
   const unsigned int before = points.size;
