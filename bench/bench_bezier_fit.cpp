@@ -15,8 +15,10 @@
 // densely), and per stroke the largest. The table gives segments per stroke, the mean and the
 // maximum of the per-stroke largest distances, and time ratios against OpenFit with cubics.
 #include <benchmark/benchmark.h>
+
 #include <zv/bezier_fit.h>
 #include <zv/path2f.h>
+#include "median_reporter.h"
 
 #include <algorithm>
 #include <cmath>
@@ -181,36 +183,6 @@ Accuracy Measure(const Method& m) {
   return acc;
 }
 
-// Keeps the time per stroke of every repetition, or the medians when aggregates are reported.
-class CollectingReporter : public benchmark::ConsoleReporter {
- public:
-  std::map<std::string, std::vector<double>> runs;
-  std::map<std::string, double> medians;
-
-  void ReportRuns(const std::vector<Run>& reported) override {
-    for (const Run& r : reported) {
-      if (r.error_occurred) continue;
-      const double seconds = r.GetAdjustedCPUTime() / benchmark::GetTimeUnitMultiplier(r.time_unit);
-      const double us = seconds / kStrokes * 1e6;
-      if (r.run_type == Run::RT_Iteration) runs[r.run_name.str()].push_back(us);
-      if (r.run_type == Run::RT_Aggregate && r.aggregate_name == "median")
-        medians[r.run_name.str()] = us;
-    }
-    ConsoleReporter::ReportRuns(reported);
-  }
-
-  double UsPerStroke(const std::string& name) const {
-    const auto m = medians.find(name);
-    if (m != medians.end()) return m->second;
-    const auto it = runs.find(name);
-    if (it == runs.end() || it->second.empty()) return 0.0;
-    std::vector<double> v = it->second;
-    std::sort(v.begin(), v.end());
-    const size_t n = v.size();
-    return n % 2 ? v[n / 2] : 0.5 * (v[n / 2 - 1] + v[n / 2]);
-  }
-};
-
 }  // namespace
 
 int main(int argc, char** argv) {
@@ -231,7 +203,7 @@ int main(int argc, char** argv) {
   }
   benchmark::Initialize(&argc, argv);
   if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  CollectingReporter reporter;
+  ZvMedianReporter reporter;
   benchmark::RunSpecifiedBenchmarks(&reporter);
 
   std::printf(
@@ -242,10 +214,10 @@ int main(int argc, char** argv) {
       kStrokes, kPointsPerStroke, kTolerance, kTolerance * kTolerance);
   std::printf("%-16s %10s %10s %10s %10s %8s %10s %10s\n", "method", "us/stroke", "seg/stroke",
               "mean max", "max max", ">tol %", "time", "segments");
-  const double zvTime = reporter.UsPerStroke(methods[0].name);
+  const double zvTime = reporter.MedianSeconds(methods[0].name) / kStrokes * 1e6;
   const Accuracy zv = Measure(methods[0]);
   for (const Method& m : methods) {
-    const double us = reporter.UsPerStroke(m.name);
+    const double us = reporter.MedianSeconds(m.name) / kStrokes * 1e6;
     if (us == 0.0) continue;
     const Accuracy a = &m == &methods[0] ? zv : Measure(m);
     std::printf("%-16s %10.1f %10.2f %10.3f %10.3f %8.1f %9.2fx %9.2fx\n", m.name.c_str(), us,

@@ -13,7 +13,9 @@
 // The literal mapping, distance tolerance = tol, is measured as well ("agg-literal") to show
 // what the stricter reading costs. Cairo takes the tolerance as it is.
 #include <benchmark/benchmark.h>
+
 #include <zv/bezier_tool.h>
+#include "median_reporter.h"
 
 #include <algorithm>
 #include <cmath>
@@ -278,39 +280,6 @@ std::string Key(const std::string& method, double tolerance) {
   return buf;
 }
 
-// Keeps the time per cubic of every repetition (or the medians, when only aggregates are
-// reported) for the summary.
-class CollectingReporter : public benchmark::ConsoleReporter {
- public:
-  std::map<std::string, std::vector<double>> runs;
-  std::map<std::string, double> medians;
-
-  void ReportRuns(const std::vector<Run>& reported) override {
-    for (const Run& r : reported) {
-      if (r.error_occurred) continue;
-      const double seconds = r.GetAdjustedCPUTime() / benchmark::GetTimeUnitMultiplier(r.time_unit);
-      const double ns = seconds / kCubicCount * 1e9;
-      if (r.run_type == Run::RT_Iteration) runs[r.run_name.str()].push_back(ns);
-      if (r.run_type == Run::RT_Aggregate && r.aggregate_name == "median") {
-        medians[r.run_name.str()] = ns;
-      }
-    }
-    ConsoleReporter::ReportRuns(reported);
-  }
-
-  // Median CPU nanoseconds per cubic, or 0 when the benchmark did not run.
-  double NsPerCubic(const std::string& name) const {
-    const auto m = medians.find(name);
-    if (m != medians.end()) return m->second;
-    const auto it = runs.find(name);
-    if (it == runs.end() || it->second.empty()) return 0.0;
-    std::vector<double> v = it->second;
-    std::sort(v.begin(), v.end());
-    const size_t n = v.size();
-    return n % 2 ? v[n / 2] : 0.5 * (v[n / 2 - 1] + v[n / 2]);
-  }
-};
-
 }  // namespace
 
 int main(int argc, char** argv) {
@@ -334,7 +303,7 @@ int main(int argc, char** argv) {
   }
   benchmark::Initialize(&argc, argv);
   if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  CollectingReporter reporter;
+  ZvMedianReporter reporter;
   benchmark::RunSpecifiedBenchmarks(&reporter);
 
   std::printf(
@@ -347,9 +316,9 @@ int main(int argc, char** argv) {
   std::printf("%-12s %5s %10s %9s %10s %10s %10s %7s %12s\n", "method", "tol", "ns/cubic",
               "pts/cubic", "mean max", "p99 max", "max max", ">tol %", "ratio");
   for (double tol : kTolerances) {
-    const double zv = reporter.NsPerCubic(Key("zv", tol));
+    const double zv = reporter.MedianSeconds(Key("zv", tol)) / kCubicCount * 1e9;
     for (const Method& m : methods) {
-      const double ns = reporter.NsPerCubic(Key(m.name, tol));
+      const double ns = reporter.MedianSeconds(Key(m.name, tol)) / kCubicCount * 1e9;
       if (ns == 0.0) continue;
       const Accuracy a = Measure(m.make(tol), tol);
       std::printf("%-12s %5.2f %10.1f %9.2f %10.4f %10.4f %10.4f %7.2f %11.2fx\n", m.name.c_str(),

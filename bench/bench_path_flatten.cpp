@@ -12,9 +12,11 @@
 // back on the thread's CPU clock, and the table reports the median over the rounds of each
 // round's ratio.
 #include <benchmark/benchmark.h>
+
 #include <zv/bezier_tool.h>
 #include <zv/path2f.h>
 #include <zv/transfo4.h>
+#include "median_reporter.h"
 
 #include <algorithm>
 #include <cstdio>
@@ -119,39 +121,6 @@ std::vector<Method> Methods() {
   return m;
 }
 
-class CollectingReporter : public benchmark::ConsoleReporter {
- public:
-  std::map<std::string, std::vector<double>> runs;
-  std::map<std::string, double> medians;
-  std::map<std::string, double> points;
-
-  void ReportRuns(const std::vector<Run>& reported) override {
-    for (const Run& r : reported) {
-      if (r.error_occurred) continue;
-      const double ms =
-          r.GetAdjustedCPUTime() / benchmark::GetTimeUnitMultiplier(r.time_unit) * 1e3;
-      const auto it = r.counters.find("points");
-      const bool typical = r.run_type == Run::RT_Iteration || r.aggregate_name == "median";
-      if (it != r.counters.end() && typical) points[r.run_name.str()] = it->second;
-      if (r.run_type == Run::RT_Iteration) runs[r.run_name.str()].push_back(ms);
-      if (r.run_type == Run::RT_Aggregate && r.aggregate_name == "median")
-        medians[r.run_name.str()] = ms;
-    }
-    ConsoleReporter::ReportRuns(reported);
-  }
-
-  double Ms(const std::string& name) const {
-    const auto m = medians.find(name);
-    if (m != medians.end()) return m->second;
-    const auto it = runs.find(name);
-    if (it == runs.end() || it->second.empty()) return 0.0;
-    std::vector<double> v = it->second;
-    std::sort(v.begin(), v.end());
-    const size_t n = v.size();
-    return n % 2 ? v[n / 2] : 0.5 * (v[n / 2 - 1] + v[n / 2]);
-  }
-};
-
 double ThreadSeconds() {
   timespec ts;
   clock_gettime(CLOCK_THREAD_CPUTIME_ID, &ts);
@@ -212,7 +181,7 @@ int main(int argc, char** argv) {
   }
   benchmark::Initialize(&argc, argv);
   if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  CollectingReporter reporter;
+  ZvMedianReporter reporter;
   benchmark::RunSpecifiedBenchmarks(&reporter);
 
   constexpr int kRounds = 41;
@@ -224,12 +193,12 @@ int main(int argc, char** argv) {
       kCubics, kTolerance, kRounds);
   std::printf("%-32s %10s %10s %8s %8s\n", "method", "points", "ns/point", "ratio", "paired");
   const std::string ref = methods[0].name;
-  const double refNs = reporter.Ms(ref) * 1e6 / reporter.points[ref];
+  const double refNs = reporter.MedianSeconds(ref) * 1e3 * 1e6 / reporter.Counter(ref, "points");
   for (size_t k = 0; k < methods.size(); ++k) {
     const Method& m = methods[k];
-    const double ms = reporter.Ms(m.name);
+    const double ms = reporter.MedianSeconds(m.name) * 1e3;
     if (ms == 0.0) continue;
-    const double pts = reporter.points[m.name];
+    const double pts = reporter.Counter(m.name, "points");
     const double ns = ms * 1e6 / pts;
     std::printf("%-32s %10.0f %10.3f %7.2fx %7.3fx\n", m.name.c_str(), pts, ns, ns / refNs,
                 paired[k]);
