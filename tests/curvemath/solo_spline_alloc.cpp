@@ -4,57 +4,25 @@
 
 #include <gtest/gtest.h>
 
-#include <cstdlib>
-#include <new>
-
 #include "tests/curvemath/spline_samples.h"
+#include "tests/support/failing_allocator.h"
 
 namespace {
 
-long allocationsLeft = -1;  // -1: no limit
-
-void* Allocate(std::size_t n) {
-  if (allocationsLeft == 0) throw std::bad_alloc();
-  if (allocationsLeft > 0) --allocationsLeft;
-  if (void* p = std::malloc(n ? n : 1)) return p;
-  throw std::bad_alloc();
-}
-
-}  // namespace
-
-void* operator new(std::size_t n) {
-  return Allocate(n);
-}
-void* operator new[](std::size_t n) {
-  return Allocate(n);
-}
-void operator delete(void* p) noexcept {
-  std::free(p);
-}
-void operator delete[](void* p) noexcept {
-  std::free(p);
-}
-void operator delete(void* p, std::size_t) noexcept {
-  std::free(p);
-}
-void operator delete[](void* p, std::size_t) noexcept {
-  std::free(p);
-}
-
-namespace {
-
-// Runs op with a growing allocation budget until it succeeds; every failed run must report 0 and
-// leave `watched` as it was. Returns the number of failed runs.
+// Fails the k-th allocation of op for k = 0, 1, ... until op runs without the failure firing;
+// every failed run must report 0 and leave `watched` as it was. Returns the number of failures.
 template <class Op>
 int FailUntilSuccess(const ZvSpline2d& watched, Op op) {
   const ZvSpline2d before(watched);
-  for (long budget = 0;; ++budget) {
-    allocationsLeft = budget;
+  for (long k = 0;; ++k) {
+    zv_test::Arm(k);
     const int result = op();
-    allocationsLeft = -1;
-    if (result == 1) return static_cast<int>(budget);
+    if (!zv_test::Disarm()) {
+      EXPECT_EQ(result, 1);
+      return static_cast<int>(k);
+    }
     EXPECT_EQ(result, 0);
-    EXPECT_TRUE(SameSpline(watched, before)) << "budget " << budget;
+    EXPECT_TRUE(SameSpline(watched, before)) << "failing allocation " << k;
   }
 }
 

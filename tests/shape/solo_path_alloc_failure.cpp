@@ -8,60 +8,14 @@
 
 #include <gtest/gtest.h>
 
-#include <cstdlib>
 #include <functional>
-#include <new>
 #include <vector>
 
 #include "path_fixtures.h"
+#include "tests/support/failing_allocator.h"
 
-namespace {
-
-long g_countdown = -1;  // allocations left before the failure; -1 when disarmed
-bool g_fired = false;
-
-void* Allocate(std::size_t n) {
-  if (g_countdown == 0) {
-    g_countdown = -1;
-    g_fired = true;
-    throw std::bad_alloc();
-  }
-  if (g_countdown > 0) --g_countdown;
-  if (void* p = std::malloc(n ? n : 1)) return p;
-  throw std::bad_alloc();
-}
-
-void Arm(long k) {
-  g_fired = false;
-  g_countdown = k;
-}
-
-// Whether the armed failure fired; disarms.
-bool Disarm() {
-  g_countdown = -1;
-  return g_fired;
-}
-
-}  // namespace
-
-void* operator new(std::size_t n) {
-  return Allocate(n);
-}
-void* operator new[](std::size_t n) {
-  return Allocate(n);
-}
-void operator delete(void* p) noexcept {
-  std::free(p);
-}
-void operator delete[](void* p) noexcept {
-  std::free(p);
-}
-void operator delete(void* p, std::size_t) noexcept {
-  std::free(p);
-}
-void operator delete[](void* p, std::size_t) noexcept {
-  std::free(p);
-}
+using zv_test::Arm;
+using zv_test::Disarm;
 
 namespace {
 
