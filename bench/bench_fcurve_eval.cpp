@@ -4,6 +4,8 @@
 // lock and unlock of the curve costs on its own.
 #include <benchmark/benchmark.h>
 
+#include "median_reporter.h"
+
 #include <zv/std_fcurve.h>
 
 #if ZV_HAVE_GSL
@@ -123,20 +125,6 @@ void BM_GslRandom(benchmark::State& state) {
 }
 #endif
 
-// Keeps the median per evaluation of every benchmark for the closing summary.
-class SummaryReporter : public benchmark::ConsoleReporter {
- public:
-  void ReportRuns(const std::vector<Run>& runs) override {
-    ConsoleReporter::ReportRuns(runs);
-    for (const Run& run : runs) {
-      if (run.run_type == Run::RT_Aggregate && run.aggregate_name == "median") {
-        medians[run.run_name.function_name] = run.GetAdjustedCPUTime();
-      }
-    }
-  }
-  std::map<std::string, double> medians;
-};
-
 }  // namespace
 
 BENCHMARK(BM_ZvSequential)->Repetitions(5)->ReportAggregatesOnly(true);
@@ -155,14 +143,11 @@ int main(int argc, char** argv) {
   gsl_set_error_handler_off();
 #endif
   TheCurve();  // built outside the timings
-  SummaryReporter reporter;
+  ZvMedianReporter reporter;
   benchmark::RunSpecifiedBenchmarks(&reporter);
   benchmark::Shutdown();
 
-  auto median = [&](const char* name) {
-    const auto it = reporter.medians.find(name);
-    return it == reporter.medians.end() ? 0.0 : it->second;
-  };
+  auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name) * 1e9; };
   const double zvSeq = median("BM_ZvSequential"), zvRnd = median("BM_ZvRandom");
   const double lock = median("BM_ZvLockUnlock");
   const double sequence =

@@ -4,6 +4,8 @@
 // tolerance) in the same run. Reports medians and the ratio.
 #include <benchmark/benchmark.h>
 
+#include "median_reporter.h"
+
 #include <zv/std_fcurve.h>
 #include <zv/transfo4.h>
 
@@ -116,19 +118,6 @@ void BM_CairoCopyPathFlat(benchmark::State& state) {
 }
 #endif
 
-class SummaryReporter : public benchmark::ConsoleReporter {
- public:
-  void ReportRuns(const std::vector<Run>& runs) override {
-    ConsoleReporter::ReportRuns(runs);
-    for (const Run& run : runs) {
-      if (run.run_type == Run::RT_Aggregate && run.aggregate_name == "median") {
-        medians[run.run_name.function_name] = run.GetAdjustedCPUTime();
-      }
-    }
-  }
-  std::map<std::string, double> medians;
-};
-
 }  // namespace
 
 BENCHMARK(BM_ZvFlatten)->Unit(benchmark::kMillisecond)->Repetitions(5)->ReportAggregatesOnly(true);
@@ -147,19 +136,17 @@ int main(int argc, char** argv) {
   benchmark::Initialize(&argc, argv);
   if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
   TheCurve();  // built outside the timings
-  SummaryReporter reporter;
+  ZvMedianReporter reporter;
   benchmark::RunSpecifiedBenchmarks(&reporter);
   benchmark::Shutdown();
-  auto median = [&](const char* name) {
-    const auto it = reporter.medians.find(name);
-    return it == reporter.medians.end() ? 0.0 : it->second;
-  };
-  const double whole = median("BM_ZvFlatten"), box = median("BM_ZvFlattenFromTo100Keys");
+  auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name); };
+  const double whole = median("BM_ZvFlatten") * 1e3,
+               box = median("BM_ZvFlattenFromTo100Keys") * 1e6;
   std::printf("\nmedians, %d keys, tolerance %.2f\n", kKeys, kTolerance);
   std::printf("  zv Flatten whole curve      %8.3f ms (target well under 10 ms)\n", whole);
   std::printf("  zv FlattenFromTo, 100 keys  %8.1f us\n", box);
 #if ZV_HAVE_CAIRO
-  const double cairo = median("BM_CairoCopyPathFlat");
+  const double cairo = median("BM_CairoCopyPathFlat") * 1e3;
   std::printf("  cairo copy_path_flat        %8.3f ms   ratio zv / cairo %.2f\n", cairo,
               cairo > 0.0 ? whole / cairo : 0.0);
 #else

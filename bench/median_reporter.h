@@ -23,7 +23,10 @@ class ZvMedianReporter : public benchmark::ConsoleReporter {
           counters_[name][counter.first] = counter.second;
       }
       if (r.run_type == Run::RT_Iteration) runs_[name].push_back(seconds);
-      if (r.run_type == Run::RT_Aggregate && r.aggregate_name == "median") medians_[name] = seconds;
+      if (r.run_type == Run::RT_Aggregate && r.aggregate_name == "median") {
+        medians_[name] = seconds;
+        functionMedians_[r.run_name.function_name] = seconds;
+      }
     }
     ConsoleReporter::ReportRuns(reported);
   }
@@ -41,6 +44,12 @@ class ZvMedianReporter : public benchmark::ConsoleReporter {
     return n % 2 ? v[n / 2] : 0.5 * (v[n / 2 - 1] + v[n / 2]);
   }
 
+  // Median CPU seconds of a benchmark registered with its own repetitions, by function name.
+  double FunctionMedianSeconds(const std::string& function) const {
+    const auto m = functionMedians_.find(function);
+    return m == functionMedians_.end() ? 0.0 : m->second;
+  }
+
   // A counter of the benchmark's typical run, 0 when it has none.
   double Counter(const std::string& name, const std::string& counter) const {
     const auto it = counters_.find(name);
@@ -52,6 +61,7 @@ class ZvMedianReporter : public benchmark::ConsoleReporter {
  private:
   std::map<std::string, std::vector<double>> runs_;
   std::map<std::string, double> medians_;
+  std::map<std::string, double> functionMedians_;
   std::map<std::string, std::map<std::string, benchmark::Counter>> counters_;
 };
 
