@@ -292,7 +292,6 @@ int main(int argc, char** argv) {
         size_t points = 0;
         for (auto _ : state)
           points = m.timedPass(tol);
-        // Inverted rate of cubics per nanosecond.
         // Seconds per cubic, as an inverted rate.
         state.counters["t/cubic"] =
             benchmark::Counter(kCubicCount, benchmark::Counter::kIsIterationInvariantRate |

@@ -28,6 +28,18 @@ inline std::vector<int> Codes(const ZvPath2f& path, int mask = 63) {
 }
 
 // An open triangle, a closed cubic loop, and a lone start point.
+// A closed axis-aligned rectangle, drawn from (x0, y0) through (x1, y0) and (x1, y1).
+inline ZvPath2f ClosedSquare(float x0, float y0, float x1, float y1) {
+  ZvPath2f path;
+  path.Moveto(P(x0, y0));
+  path.Lineto(P(x1, y0));
+  path.Lineto(P(x1, y1));
+  path.Lineto(P(x0, y1));
+  path.Lineto(P(x0, y0));
+  path.Closeto();
+  return path;
+}
+
 inline ZvPath2f ThreeSubpaths() {
   ZvPath2f path(4);
   path.Moveto(P(0, 0));

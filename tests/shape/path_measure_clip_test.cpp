@@ -13,17 +13,6 @@ namespace {
 
 using E = ZvExtent2<double>;
 
-ZvPath2f ClosedSquare(float x0, float y0, float x1, float y1) {
-  ZvPath2f path;
-  path.Moveto(P(x0, y0));
-  path.Lineto(P(x1, y0));
-  path.Lineto(P(x1, y1));
-  path.Lineto(P(x0, y1));
-  path.Lineto(P(x0, y0));
-  path.Closeto();
-  return path;
-}
-
 // Signed area of the polygon out[first..first+count) (implicitly closed).
 double Area(const ZvPoint2dArray& a, unsigned int first, unsigned int count) {
   double s = 0.0;

@@ -24,17 +24,6 @@ ZvPath2f Arch(unsigned int degree) {
   return path;
 }
 
-ZvPath2f Square(float x0, float y0, float x1, float y1) {
-  ZvPath2f path;
-  path.Moveto(P(x0, y0));
-  path.Lineto(P(x1, y0));
-  path.Lineto(P(x1, y1));
-  path.Lineto(P(x0, y1));
-  path.Lineto(P(x0, y0));
-  path.Closeto();
-  return path;
-}
-
 TEST(PathMeasurePick, TightExtentsHugTheCurveForLinesAndCubicsOnly) {
   EF box, tight;
   Arch(3).GetExtent(box);
@@ -122,7 +111,7 @@ TEST(PathMeasurePick, NodeArcPositions) {
 }
 
 TEST(PathMeasurePick, OutlineAndInteriorHits) {
-  const ZvPath2f square = Square(0, 0, 100, 100);
+  const ZvPath2f square = ClosedSquare(0, 0, 100, 100);
   ZvGC gc;
   EXPECT_EQ(1, square.IsIntersectingExtent(gc, EF(-5, -5, 5, 5), 0));    // holds a node
   EXPECT_EQ(1, square.IsIntersectingExtent(gc, EF(40, -5, 60, 5), 0));   // crosses an edge
@@ -142,7 +131,8 @@ TEST(PathMeasurePick, OutlineAndInteriorHits) {
   square.Fill(plain, probe, nullptr, nullptr);
   if (probe.GetVal(0) == 0) GTEST_SKIP() << "no scanline fill on this build";
   EXPECT_EQ(1, square.IsInteriorIntersectingExtent(plain, EF(40, 40, 60, 60), 0));
-  EXPECT_EQ(0, Square(0, 0, 10, 10).IsInteriorIntersectingExtent(plain, EF(40, 40, 60, 60), 1));
+  EXPECT_EQ(0,
+            ClosedSquare(0, 0, 10, 10).IsInteriorIntersectingExtent(plain, EF(40, 40, 60, 60), 1));
 }
 
 TEST(PathMeasurePick, SamplesInsideAnExtentKeepTheirTags) {
