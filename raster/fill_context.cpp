@@ -2,6 +2,7 @@
 #include "raster/fill_context.h"
 
 #include "raster/fill_scratch.h"
+#include "raster/fill_vertex_order.h"
 
 #include <algorithm>
 #include <cmath>
@@ -91,11 +92,7 @@ int CFillContext::BuildTables(const ZvPoint2dArray& points, const ZvPointTagArra
     sortedVertices[subpathStart].prev = n - 1;
     sortedVertices[n - 1].next = subpathStart;
   }
-  // Rising y, with the comparator inlined rather than called through qsort.
-  std::sort(sortedVertices, sortedVertices + n,
-            [](const CFillSortedVertex& a, const CFillSortedVertex& b) {
-              return CompareIndices(&b, &a) > 0;
-            });
+  ZvOrderByRisingY(sortedVertices, n, vertices);
   return n;
 }
 

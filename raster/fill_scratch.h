@@ -20,6 +20,10 @@ enum ZvScratchSlot {
   ZvScratch_Vertices,
   ZvScratch_SortedVertices,
   ZvScratch_ActiveEdges,
+  ZvScratch_EdgeEnds,
+  ZvScratch_IncomingEdges,
+  ZvScratch_SortCounts,
+  ZvScratch_SortRecords,
   ZvScratch_Cells0,
   ZvScratch_Cells1,
   ZvScratch_Cells2,
@@ -30,6 +34,26 @@ enum ZvScratchSlot {
 void* ZvScratchTake(ZvScratchSlot slot, std::size_t bytes);
 // Returns a block from ZvScratchTake of the same slot (null is ignored).
 void ZvScratchGive(ZvScratchSlot slot, void* block);
+
+// A block of `count` elements of a plain type from the pool, for the lifetime of the object.
+template <class T>
+class ZvScratchArray {
+ public:
+  ZvScratchArray(ZvScratchSlot slot, int count)
+      : slot(slot),
+        data(static_cast<T*>(
+            ZvScratchTake(slot, sizeof(T) * static_cast<std::size_t>(count > 0 ? count : 1)))) {}
+  ~ZvScratchArray() { ZvScratchGive(slot, data); }
+  ZvScratchArray(const ZvScratchArray&) = delete;
+  ZvScratchArray& operator=(const ZvScratchArray&) = delete;
+
+  T& operator[](int i) const { return data[i]; }
+  T* get() const { return data; }
+
+ private:
+  ZvScratchSlot slot;
+  T* data;
+};
 
 // The flattened polygon of a fill: the thread's point and tag arrays for the lifetime of the
 // lease, emptied but with their capacity (fresh ones when the thread's are already lent).
