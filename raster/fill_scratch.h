@@ -22,6 +22,7 @@ enum ZvScratchSlot {
   ZvScratch_ActiveEdges,
   ZvScratch_EdgeEnds,
   ZvScratch_IncomingEdges,
+  ZvScratch_SpareEdges,
   ZvScratch_SortCounts,
   ZvScratch_SortRecords,
   ZvScratch_Cells0,

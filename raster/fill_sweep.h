@@ -20,37 +20,18 @@ class CFillSweep {
       : ctx(ctx),
         numVertices(numVertices),
         edgeEnds(ZvScratch_EdgeEnds, numVertices),
-        incoming(ZvScratch_IncomingEdges, numVertices) {}
+        incoming(ZvScratch_IncomingEdges, numVertices),
+        spare(ZvScratch_SpareEdges, numVertices),
+        edges(ctx.activeEdges),
+        other(spare.get()) {}
 
   // Brings the active edges to the sample line y + 0.5, ordered by x.
-  //
-  // The edges that end on this line go in one pass rather than one search each: an edge is
-  // retired at the first line that reaches its lower end, which is the line that takes that
-  // end's vertex. The edges that begin are ordered among themselves and merged in, after the
-  // ones already active, which keep their order: the table is the one that appending and a
-  // stable sort by x would give.
   void Advance(int y) {
     const double yc = y + 0.5;
-    const double yAbove = y - 0.5;
-    const CFillVertex* v = ctx.vertices;
-    int numIncoming = 0;
-    bool ending = false;
-    while (cursor < numVertices && v[ctx.sortedVertices[cursor].index].y <= yc) {
-      const CFillSortedVertex& s = ctx.sortedVertices[cursor++];
-      const CFillVertex& at = v[s.index];
-      // The edge arriving from prev goes upwards in path order when it starts here, the edge
-      // leaving towards next downwards.
-      Treat(at, v[s.prev], s.prev, -1, yc, yAbove, numIncoming, ending);
-      Treat(at, v[s.next], s.index, +1, yc, yAbove, numIncoming, ending);
-    }
-    if (ending) Retire(yc);
-    // Edges rarely swap between rows: a stable insertion sort is linear on the usual nearly
-    // ordered table.
-    InsertionSort(ctx.activeEdges, numActive);
-    if (numIncoming > 0) {
-      InsertionSort(incoming.get(), numIncoming);
-      Merge(numIncoming);
-    }
+    if (cursor < numVertices && ctx.vertices[ctx.sortedVertices[cursor].index].y <= yc)
+      TakeVertices(y);
+    else
+      InsertionSort(edges, numActive);
   }
 
   // Calls span(left, right) for each run of sample columns inside under the rule, clipped to
@@ -58,12 +39,12 @@ class CFillSweep {
   // on an edge is inside; a span of zero width is never written.
   template <bool NonZero, class Span>
   void Spans(int leftLimit, int rightExclusive, Span&& span) {
-    CFillActiveEdge* e = ctx.activeEdges;
+    CFillActiveEdge* e = edges;
     if (!NonZero) {
       for (int i = 0; i + 1 < numActive; i += 2) {
         const double xl = e[i].x;
         const double xr = e[i + 1].x;
-        if (xr > xl) Emit(xl, std::floor(xr), leftLimit, rightExclusive, span);
+        if (xr > xl) Emit(xl, xr, leftLimit, rightExclusive, span);
         e[i].x += e[i].dxdy;
         e[i + 1].x += e[i + 1].dxdy;
       }
@@ -77,48 +58,34 @@ class CFillSweep {
       e[i].x += e[i].dxdy;
       ++i;
       double xr = xl;
-      double right = rightExclusive - 1;
+      double end = HUGE_VAL;  // edges run out: the span reaches the right limit
       while (i < numActive) {
         xr = e[i].x;
         winding += e[i].direction;
         e[i].x += e[i].dxdy;
         ++i;
         if (winding == 0) {
-          right = std::floor(xr);
+          end = xr;
           break;
         }
       }
-      if (xr > xl) Emit(xl, right, leftLimit, rightExclusive, span);
+      if (xr > xl) Emit(xl, end, leftLimit, rightExclusive, span);
     }
   }
 
  private:
+  // The rows that reach vertices, out of line: most rows take none.
+  //
+  // Rather than one search per ending edge and one insertion per beginning edge, a single pass
+  // copies the table into the spare one: an edge is retired at the first line that reaches its
+  // lower end, which is the line that takes that end's vertex, and the edges that begin,
+  // ordered among themselves, are merged in after active edges of equal x.
+  void TakeVertices(int y);
   void Treat(const CFillVertex& at, const CFillVertex& other, int id, int direction, double yc,
-             double yAbove, int& numIncoming, bool& ending) {
-    if (other.y <= yAbove) {
-      ending = true;
-    } else if (other.y > yc) {
-      CFillActiveEdge& e = incoming[numIncoming++];
-      e.dxdy = (other.x - at.x) / (other.y - at.y);
-      e.x = (yc - at.y) * e.dxdy + at.x - 0.5;
-      e.id = id;
-      e.direction = direction;
-      edgeEnds[id] = other.y;
-    }
-  }
+             double yAbove, int& numIncoming, bool& ending);
 
-  // Drops the edges whose lower end the line yc has reached, keeping the order of the others.
-  void Retire(double yc) {
-    CFillActiveEdge* e = ctx.activeEdges;
-    int kept = 0;
-    for (int i = 0; i < numActive; ++i) {
-      if (edgeEnds[e[i].id] <= yc) continue;
-      if (kept != i) e[kept] = e[i];
-      ++kept;
-    }
-    numActive = kept;
-  }
-
+  // Edges rarely swap between rows: a stable insertion sort is linear on the usual nearly
+  // ordered table.
   static void InsertionSort(CFillActiveEdge* e, int count) {
     for (int i = 1; i < count; ++i) {
       if (CompareActiveEdges(&e[i - 1], &e[i]) < 0) continue;
@@ -130,36 +97,35 @@ class CFillSweep {
     }
   }
 
-  // Merges the ordered incoming edges into the ordered active ones from the back, in place; on
-  // equal x the active edge stays first.
-  void Merge(int numIncoming) {
-    CFillActiveEdge* e = ctx.activeEdges;
-    int i = numActive - 1;
-    int j = numIncoming - 1;
-    int to = numActive + numIncoming - 1;
-    while (j >= 0) {
-      if (i >= 0 && CompareActiveEdges(&e[i], &incoming[j]) > 0)
-        e[to--] = e[i--];
-      else
-        e[to--] = incoming[j--];
-    }
-    numActive += numIncoming;
-  }
-
-  // Clipping happens in double precision so that no far-off crossing is converted to int.
+  // Writes the columns from ceil(xl) to floor(xr), clipped to [leftLimit, rightExclusive). An xr
+  // of +infinity reaches the right limit. Clipping happens in double precision so that no
+  // far-off crossing is converted to int, and the roundings of the crossings left inside are
+  // done on the integers: a crossing between the limits fits in an int.
   template <class Span>
-  static void Emit(double xl, double right, int leftLimit, int rightExclusive, Span& span) {
-    double left = std::ceil(xl);
-    if (left < leftLimit) left = leftLimit;
-    if (right > rightExclusive - 1) right = rightExclusive - 1;
-    if (!(left <= right) || left >= rightExclusive) return;
-    span(static_cast<int>(left), static_cast<int>(right));
+  static void Emit(double xl, double xr, int leftLimit, int rightExclusive, Span& span) {
+    const int last = rightExclusive - 1;
+    if (!(xl <= last)) return;  // ceil(xl) past the last column, or NaN
+    int left = leftLimit;
+    if (xl > leftLimit) {
+      left = static_cast<int>(xl);  // towards zero, then up to the ceiling
+      left += left < xl;
+    }
+    if (!(xr >= left)) return;  // floor(xr) < left, or NaN
+    int right = last;
+    if (xr < last) {
+      right = static_cast<int>(xr);
+      right -= right > xr;
+    }
+    if (left <= right) span(left, right);  // false only for limits that leave no column
   }
 
   CFillContext& ctx;
   int numVertices;
-  ZvScratchArray<double> edgeEnds;            // lower end y of each started edge, by edge id
+  ZvScratchArray<double> edgeEnds;           // lower end y of each started edge, by edge id
   ZvScratchArray<CFillActiveEdge> incoming;  // the edges that begin on the current line
+  ZvScratchArray<CFillActiveEdge> spare;
+  CFillActiveEdge* edges;  // the active edges: the context's table or the spare one
+  CFillActiveEdge* other;
   int cursor = 0;
   int numActive = 0;
 };
