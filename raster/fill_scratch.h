@@ -14,7 +14,7 @@
 
 #include <cstddef>
 
-constexpr std::size_t kZvScratchKeepBytes = std::size_t(64) << 20;
+constexpr std::size_t kZvScratchKeepBytes = std::size_t(16) << 20;
 
 enum ZvScratchSlot {
   ZvScratch_Vertices,

@@ -23,18 +23,21 @@ void CFillSweep::TakeVertices(int y) {
     InsertionSort(edges, numActive);
     return;
   }
+  // Written without a branch on the retirement, which follows no pattern: every edge is copied
+  // and only a kept one counts. Incoming edges left of a retired one are also left of every
+  // later kept one.
   int n = 0;
   int j = 0;
   bool ordered = true;
   double previous = -HUGE_VAL;
   for (int i = 0; i < numActive; ++i) {
     const CFillActiveEdge& e = edges[i];
-    if (edgeEnds[e.id] <= yc) continue;
     ordered &= !(e.x < previous);
     previous = e.x;
     while (j < numIncoming && incoming[j].x < e.x)
       other[n++] = incoming[j++];
-    other[n++] = e;
+    other[n] = e;
+    n += edgeEnds[e.id] > yc;
   }
   while (j < numIncoming)
     other[n++] = incoming[j++];
