@@ -74,7 +74,7 @@ class CFillSweep {
   }
 
  private:
-  // The rows that reach vertices, out of line: most rows take none.
+  // The rows that reach vertices, out of line: in most shapes most rows take none.
   //
   // Rather than one search per ending edge and one insertion per beginning edge, a single pass
   // copies the table into the spare one: an edge is retired at the first line that reaches its
