@@ -152,13 +152,15 @@ TEST(AASweep, VertexOrderRisesOnTiesSkewAndExtremeRanges) {
 }
 
 namespace {
-// Blobs of cubics: many vertices over the whole raster, or a few in one corner.
-ZvPath2f Blobs(unsigned int seed, int count, float spread, float radius) {
+// Circles of cubics: a path of many vertices over the raster (seed 1) or a couple in a corner.
+ZvPath2f Circles(unsigned int seed) {
   std::mt19937 rng(seed);
   std::uniform_real_distribution<float> u(0.0f, 1.0f);
+  const int count = seed == 1 ? 60 : 2;
+  const float spread = seed == 1 ? 80.0f : 6.0f, size = seed == 1 ? 9.0f : 3.0f;
   ZvPath2f path;
   for (int b = 0; b < count; ++b) {
-    const float cx = 2 + u(rng) * spread, cy = 2 + u(rng) * spread, r = radius * (0.5f + u(rng));
+    const float cx = 2 + u(rng) * spread, cy = 2 + u(rng) * spread, r = size * (0.5f + u(rng));
     const float k = 0.5523f * r;
     path.Moveto({cx + r, cy});
     path.Curveto({cx + r, cy + k}, {cx + k, cy + r}, {cx, cy + r});
@@ -170,79 +172,51 @@ ZvPath2f Blobs(unsigned int seed, int count, float spread, float radius) {
   return path;
 }
 
-const ZvPath2f& Large() {
-  static const ZvPath2f path = Blobs(1, 60, 80.0f, 9.0f);
-  return path;
-}
-const ZvPath2f& Small() {
-  static const ZvPath2f path = Blobs(2, 2, 6.0f, 3.0f);
-  return path;
-}
-
 using Pixels = std::vector<unsigned char>;
 
-Pixels Render(const ZvPath2f& path, int rate, int (*callback)() = nullptr) {
+// Fill k of a path: aliased (0), 4x4 (1) or 8x8 with a radius (2).
+Pixels Render(const ZvPath2f& path, int k, int (*callback)() = nullptr) {
   ZvGC gc;
-  gc.samplingRate = rate;
-  gc.featherRadius = rate == 8 ? 3 : 0;
+  gc.samplingRate = 4 * k;
+  gc.featherRadius = k == 2 ? 3 : 0;
   ZvRaster<unsigned char> r(96, 96, 0);
-  if (rate)
+  if (k)
     path.AAFill(gc, r, callback, nullptr);
   else
     path.Fill(gc, r, callback, nullptr);
   return Pixels(r.GetRaster(), r.GetRaster() + 96 * 96);
 }
 
-// What each fill gives on a thread whose scratch memory is fresh.
-struct References {
-  Pixels large[3], small[3];  // aliased, 4x4, 8x8
-};
-const References& Fresh() {
-  static const References refs = [] {
-    References r;
-    std::thread([&r] {
-      for (int k = 0; k < 3; ++k) {
-        r.large[k] = Render(Large(), 4 * k);
-        r.small[k] = Render(Small(), 4 * k);
-      }
-    }).join();
-    return r;
-  }();
-  return refs;
-}
-
-Pixels nestedSmall;
+const ZvPath2f large = Circles(1), small = Circles(2);
+Pixels nested;
 int calls = 0;
 int FillSmallOnTenthRow() {
-  if (++calls == 10) nestedSmall = Render(Small(), 8);
+  if (++calls == 10) nested = Render(small, 2);
   return 0;
 }
 }  // namespace
 
 TEST(AASweep, ScratchMemoryIsReusedWithoutCarryingAnythingOver) {
-  const References& fresh = Fresh();
-  // A large fill, then small ones and large ones again, aliased and at both rates.
-  for (int round = 0; round < 2; ++round) {
-    for (int k = 0; k < 3; ++k) {
-      EXPECT_EQ(Render(Large(), 4 * k), fresh.large[k]) << round << " " << k;
-      EXPECT_EQ(Render(Small(), 4 * k), fresh.small[k]) << round << " " << k;
-    }
-  }
+  // What each fill gives on a thread whose scratch memory is fresh.
+  Pixels fresh[2][3];
+  std::thread([&fresh] {
+    for (int k = 0; k < 3; ++k)
+      fresh[0][k] = Render(large, k), fresh[1][k] = Render(small, k);
+  }).join();
+  // Large and small fills one after the other, twice over.
+  for (int i = 0; i < 12; ++i)
+    EXPECT_EQ(Render(i % 2 ? small : large, i % 3), fresh[i % 2][i % 3]) << i;
   // A fill started from another's callback, while that one holds the thread's blocks.
   calls = 0;
-  EXPECT_EQ(Render(Large(), 4, FillSmallOnTenthRow), fresh.large[1]);
-  EXPECT_EQ(nestedSmall, fresh.small[2]);
-  // Threads filling at the same time each with their own blocks.
+  EXPECT_EQ(Render(large, 1, FillSmallOnTenthRow), fresh[0][1]);
+  EXPECT_EQ(nested, fresh[1][2]);
+  // Threads filling at the same time, each with its own blocks.
   std::vector<std::thread> threads;
   std::vector<int> mismatches(4, 0);
   for (int t = 0; t < 4; ++t) {
     threads.emplace_back([t, &fresh, &mismatches] {
-      for (int i = 0; i < 12; ++i) {
-        const int k = (t + i) % 3;
-        const bool large = (t + i) % 2 == 0;
-        if (Render(large ? Large() : Small(), 4 * k) != (large ? fresh.large[k] : fresh.small[k]))
-          ++mismatches[t];
-      }
+      for (int i = t; i < t + 12; ++i)
+        mismatches[t] += Render(i % 2 ? small : large, i % 3) != fresh[i % 2][i % 3];
     });
   }
   for (std::thread& th : threads)
