@@ -28,8 +28,8 @@ template <class Word>
 void AllocateRows(Word* (&rows)[3], int first, int end, bool three) {
   const int origin = first < 0 ? first : 0;
   for (int i = 0; i < (three ? 3 : 1); ++i) {
-    Word* block = static_cast<Word*>(
-        ZvScratchTake(kCellSlots[i], sizeof(Word) * static_cast<std::size_t>(end - origin)));
+    Word* block = static_cast<Word*>(ZvScratchTake(
+        kCellSlots[i], ZvScratchBytes(static_cast<std::size_t>(end - origin), sizeof(Word))));
     rows[i] = block - origin;
     std::memset(static_cast<void*>(rows[i] + first), 0,
                 sizeof(Word) * static_cast<std::size_t>(end - first));
@@ -38,7 +38,7 @@ void AllocateRows(Word* (&rows)[3], int first, int end, bool three) {
 
 template <class T>
 T* Take(ZvScratchSlot slot, unsigned int count) {
-  return static_cast<T*>(ZvScratchTake(slot, sizeof(T) * count));
+  return static_cast<T*>(ZvScratchTake(slot, ZvScratchBytes(count, sizeof(T))));
 }
 }  // namespace
 
@@ -68,14 +68,16 @@ int CFillContext::BuildTables(const ZvPoint2dArray& points, const ZvPointTagArra
   vertices = Take<CFillVertex>(ZvScratch_Vertices, count);
   sortedVertices = Take<CFillSortedVertex>(ZvScratch_SortedVertices, count);
   activeEdges = Take<CFillActiveEdge>(ZvScratch_ActiveEdges, count);
+  // The records in vertex order, then sorted into the table.
+  ZvScratchArray<CFillSortedVertex> rings(ZvScratch_SortRecords, count);
   int n = 0;
   int subpathStart = 0;
   for (unsigned int i = 0; i < count; ++i) {
     if (tags[i] == ZvPointTag_Last) {
       // The closing point repeats the first one: it only ties the ring.
       if (n > subpathStart) {
-        sortedVertices[subpathStart].prev = n - 1;
-        sortedVertices[n - 1].next = subpathStart;
+        rings[subpathStart].prev = n - 1;
+        rings[n - 1].next = subpathStart;
       }
       subpathStart = n;
       continue;
@@ -84,15 +86,15 @@ int CFillContext::BuildTables(const ZvPoint2dArray& points, const ZvPointTagArra
     vertices[n].y = points[i].y * scale;
     // A non-finite coordinate has no place in the y order: such a polygon is not filled.
     if (!std::isfinite(vertices[n].x) || !std::isfinite(vertices[n].y)) return 0;
-    sortedVertices[n] = CFillSortedVertex{n, n - 1, n + 1, vertices};
+    rings[n] = CFillSortedVertex{n, n - 1, n + 1, vertices};
     ++n;
   }
   // An unterminated last subpath is closed the same way, so no ring points past the table.
   if (n > subpathStart) {
-    sortedVertices[subpathStart].prev = n - 1;
-    sortedVertices[n - 1].next = subpathStart;
+    rings[subpathStart].prev = n - 1;
+    rings[n - 1].next = subpathStart;
   }
-  ZvOrderByRisingY(sortedVertices, n, vertices);
+  ZvOrderByRisingY(rings.get(), sortedVertices, n, vertices);
   return n;
 }
 

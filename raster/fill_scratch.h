@@ -13,6 +13,7 @@
 #include <zv/arrays.h>
 
 #include <cstddef>
+#include <new>
 
 constexpr std::size_t kZvScratchKeepBytes = std::size_t(16) << 20;
 
@@ -33,6 +34,11 @@ enum ZvScratchSlot {
 
 // A block of at least `bytes` bytes, uninitialised, aligned for any scalar. Throws bad_alloc.
 void* ZvScratchTake(ZvScratchSlot slot, std::size_t bytes);
+// count * size, or bad_alloc when that overflows (as array new would refuse it).
+inline std::size_t ZvScratchBytes(std::size_t count, std::size_t size) {
+  if (count > static_cast<std::size_t>(-1) / size) throw std::bad_alloc();
+  return count * size;
+}
 // Returns a block from ZvScratchTake of the same slot (null is ignored).
 void ZvScratchGive(ZvScratchSlot slot, void* block);
 
@@ -40,10 +46,9 @@ void ZvScratchGive(ZvScratchSlot slot, void* block);
 template <class T>
 class ZvScratchArray {
  public:
-  ZvScratchArray(ZvScratchSlot slot, int count)
+  ZvScratchArray(ZvScratchSlot slot, std::size_t count)
       : slot(slot),
-        data(static_cast<T*>(
-            ZvScratchTake(slot, sizeof(T) * static_cast<std::size_t>(count > 0 ? count : 1)))) {}
+        data(static_cast<T*>(ZvScratchTake(slot, ZvScratchBytes(count ? count : 1, sizeof(T))))) {}
   ~ZvScratchArray() { ZvScratchGive(slot, data); }
   ZvScratchArray(const ZvScratchArray&) = delete;
   ZvScratchArray& operator=(const ZvScratchArray&) = delete;

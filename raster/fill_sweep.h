@@ -19,9 +19,9 @@ class CFillSweep {
   CFillSweep(CFillContext& ctx, int numVertices)
       : ctx(ctx),
         numVertices(numVertices),
-        edgeEnds(ZvScratch_EdgeEnds, numVertices),
-        incoming(ZvScratch_IncomingEdges, numVertices),
-        spare(ZvScratch_SpareEdges, numVertices),
+        edgeEnds(ZvScratch_EdgeEnds, Count(numVertices)),
+        incoming(ZvScratch_IncomingEdges, Count(numVertices)),
+        spare(ZvScratch_SpareEdges, Count(numVertices)),
         edges(ctx.activeEdges),
         other(spare.get()) {}
 
@@ -74,6 +74,8 @@ class CFillSweep {
   }
 
  private:
+  static std::size_t Count(int n) { return n > 0 ? static_cast<std::size_t>(n) : 0; }
+
   // The rows that reach vertices, out of line: in most shapes most rows take none.
   //
   // Rather than one search per ending edge and one insertion per beginning edge, a single pass

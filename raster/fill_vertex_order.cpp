@@ -33,9 +33,11 @@ void SortBucket(CFillSortedVertex* r, int count) {
 }
 }  // namespace
 
-void ZvOrderByRisingY(CFillSortedVertex* records, int n, const CFillVertex* vertices) {
+void ZvOrderByRisingY(const CFillSortedVertex* records, CFillSortedVertex* sorted, int n,
+                      const CFillVertex* vertices) {
   if (n < kFewVertices) {
-    std::sort(records, records + n, Before);
+    std::copy(records, records + n, sorted);
+    std::sort(sorted, sorted + n, Before);
     return;
   }
   double lo = vertices[0].y, hi = lo;
@@ -52,21 +54,19 @@ void ZvOrderByRisingY(CFillSortedVertex* records, int n, const CFillVertex* vert
     const int b = static_cast<int>((y - lo) * k);
     return b < buckets ? b : buckets - 1;
   };
-  ZvScratchArray<int> starts(ZvScratch_SortCounts, buckets + 1);
-  ZvScratchArray<CFillSortedVertex> spread(ZvScratch_SortRecords, n);
+  ZvScratchArray<int> starts(ZvScratch_SortCounts, static_cast<std::size_t>(buckets) + 1);
   std::fill(starts.get(), starts.get() + buckets + 1, 0);
   for (int i = 0; i < n; ++i)
     ++starts[key(vertices[i].y) + 1];
   for (int b = 0; b < buckets; ++b)
     starts[b + 1] += starts[b];
   for (int i = 0; i < n; ++i)
-    spread[starts[key(vertices[i].y)]++] = records[i];
+    sorted[starts[key(vertices[i].y)]++] = records[i];
   // starts[b] is now the end of bucket b.
   int begin = 0;
   for (int b = 0; b < buckets; ++b) {
     const int end = starts[b];
-    if (end - begin > 1) SortBucket(spread.get() + begin, end - begin);
+    if (end - begin > 1) SortBucket(sorted + begin, end - begin);
     begin = end;
   }
-  std::copy(spread.get(), spread.get() + n, records);
 }

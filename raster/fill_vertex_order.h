@@ -4,8 +4,10 @@
 
 #include "raster/fill_context.h"
 
-// Sorts records[0..n) by rising y of their vertices (the order of CompareIndices; vertices of
-// equal y in no particular order). The records must be in vertex order, records[i].index == i.
-void ZvOrderByRisingY(CFillSortedVertex* records, int n, const CFillVertex* vertices);
+// Writes records[0..n) into sorted[0..n) by rising y of their vertices (the order of
+// CompareIndices; vertices of equal y in no particular order). The records must be in vertex
+// order, records[i].index == i.
+void ZvOrderByRisingY(const CFillSortedVertex* records, CFillSortedVertex* sorted, int n,
+                      const CFillVertex* vertices);
 
 #endif

@@ -133,12 +133,12 @@ TEST(AASweep, VertexOrderRisesOnTiesSkewAndExtremeRanges) {
   for (const std::vector<double>& ys : cases) {
     const int n = static_cast<int>(ys.size());
     std::vector<CFillVertex> vertices(n);
-    std::vector<CFillSortedVertex> records(n);
+    std::vector<CFillSortedVertex> unsorted(n), records(n);
     for (int i = 0; i < n; ++i) {
       vertices[i] = {static_cast<double>(i), ys[i]};
-      records[i] = {i, i - 1, i + 1, vertices.data()};
+      unsorted[i] = {i, i - 1, i + 1, vertices.data()};
     }
-    ZvOrderByRisingY(records.data(), n, vertices.data());
+    ZvOrderByRisingY(unsorted.data(), records.data(), n, vertices.data());
     std::vector<int> seen(n, 0);
     for (int i = 0; i < n; ++i) {
       ++seen[records[i].index];
