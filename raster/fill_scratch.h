@@ -24,6 +24,7 @@ enum ZvScratchSlot {
   ZvScratch_EdgeEnds,
   ZvScratch_IncomingEdges,
   ZvScratch_SpareEdges,
+  ZvScratch_EdgeSlots,
   ZvScratch_SortCounts,
   ZvScratch_SortRecords,
   ZvScratch_Cells0,

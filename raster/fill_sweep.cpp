@@ -13,16 +13,21 @@ void CFillSweep::TakeVertices(int y) {
   while (cursor < numVertices && v[ctx.sortedVertices[cursor].index].y <= yc) {
     const CFillSortedVertex& s = ctx.sortedVertices[cursor++];
     const CFillVertex& at = v[s.index];
+    const CFillVertex& before = v[s.prev];
+    const CFillVertex& after = v[s.next];
     // The edge arriving from prev goes upwards in path order when it starts here, the edge
     // leaving towards next downwards.
-    Treat(at, v[s.prev], s.prev, -1, yc, yAbove, numIncoming, ending);
-    Treat(at, v[s.next], s.index, +1, yc, yAbove, numIncoming, ending);
+    if (before.y <= yAbove && after.y > yc && Replace(s.prev, at, after, s.index, +1, yc)) continue;
+    if (after.y <= yAbove && before.y > yc && Replace(s.index, at, before, s.prev, -1, yc))
+      continue;
+    Treat(at, before, s.prev, -1, yc, yAbove, numIncoming, ending);
+    Treat(at, after, s.index, +1, yc, yAbove, numIncoming, ending);
   }
-  InsertionSort(incoming.get(), numIncoming);
   if (!ending && numIncoming == 0) {
-    InsertionSort(edges, numActive);
+    OrderEdges();
     return;
   }
+  InsertionSort(incoming.get(), numIncoming);
   // Written without a branch on the retirement, which follows no pattern: every edge is copied
   // and only a kept one counts. Incoming edges left of a retired one are also left of every
   // later kept one.
@@ -35,17 +40,29 @@ void CFillSweep::TakeVertices(int y) {
     ordered &= !(e.x < previous);
     previous = e.x;
     while (j < numIncoming && incoming[j].x < e.x)
-      other[n++] = incoming[j++];
+      Place(incoming[j++], n++);
     other[n] = e;
-    n += edgeEnds[e.id] > yc;
+    const bool kept = edgeEnds[e.id] > yc;
+    slots[e.id] = kept ? n : -1;
+    n += kept;
   }
   while (j < numIncoming)
-    other[n++] = incoming[j++];
+    Place(incoming[j++], n++);
   std::swap(edges, other);
   numActive = n;
-  // Edges that crossed since the last row: the merge took them as ordered, the sort puts them
-  // right.
-  if (!ordered) InsertionSort(edges, numActive);
+  // Edges that crossed or were replaced since the last row: the merge took them as ordered, the
+  // sort puts them right.
+  if (!ordered) OrderEdges();
+}
+
+bool CFillSweep::Replace(int endId, const CFillVertex& at, const CFillVertex& other, int id,
+                         int direction, double yc) {
+  const int slot = slots[endId];
+  if (slot < 0) return false;  // never started: both its ends came on the same line
+  Start(edges[slot], at, other, id, direction, yc);
+  slots[endId] = -1;
+  slots[id] = slot;
+  return true;
 }
 
 void CFillSweep::Treat(const CFillVertex& at, const CFillVertex& other, int id, int direction,
@@ -53,11 +70,6 @@ void CFillSweep::Treat(const CFillVertex& at, const CFillVertex& other, int id, 
   if (other.y <= yAbove) {
     ending = true;
   } else if (other.y > yc) {
-    CFillActiveEdge& e = incoming[numIncoming++];
-    e.dxdy = (other.x - at.x) / (other.y - at.y);
-    e.x = (yc - at.y) * e.dxdy + at.x - 0.5;
-    e.id = id;
-    e.direction = direction;
-    edgeEnds[id] = other.y;
+    Start(incoming[numIncoming++], at, other, id, direction, yc);
   }
 }

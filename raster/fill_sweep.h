@@ -12,6 +12,7 @@
 #include "raster/fill_context.h"
 #include "raster/fill_scratch.h"
 
+#include <algorithm>
 #include <cmath>
 
 class CFillSweep {
@@ -22,8 +23,11 @@ class CFillSweep {
         edgeEnds(ZvScratch_EdgeEnds, Count(numVertices)),
         incoming(ZvScratch_IncomingEdges, Count(numVertices)),
         spare(ZvScratch_SpareEdges, Count(numVertices)),
+        slots(ZvScratch_EdgeSlots, Count(numVertices)),
         edges(ctx.activeEdges),
-        other(spare.get()) {}
+        other(spare.get()) {
+    std::fill(slots.get(), slots.get() + Count(numVertices), -1);
+  }
 
   // Brings the active edges to the sample line y + 0.5, ordered by x.
   void Advance(int y) {
@@ -31,7 +35,7 @@ class CFillSweep {
     if (cursor < numVertices && ctx.vertices[ctx.sortedVertices[cursor].index].y <= yc)
       TakeVertices(y);
     else
-      InsertionSort(edges, numActive);
+      OrderEdges();
   }
 
   // Calls span(left, right) for each run of sample columns inside under the rule, clipped to
@@ -78,13 +82,29 @@ class CFillSweep {
 
   // The rows that reach vertices, out of line: in most shapes most rows take none.
   //
-  // Rather than one search per ending edge and one insertion per beginning edge, a single pass
-  // copies the table into the spare one: an edge is retired at the first line that reaches its
-  // lower end, which is the line that takes that end's vertex, and the edges that begin,
-  // ordered among themselves, are merged in after active edges of equal x.
+  // A vertex inside a chain ends one edge and starts the next: the new edge takes the slot of
+  // the old one, found through the slot table, and the order is mended by the insertion sort.
+  // The other edges that end or begin are handled in one pass that copies the table into the
+  // spare one, rather than one search per ending edge and one insertion per beginning edge: an
+  // edge is retired at the first line that reaches its lower end, which is the line that takes
+  // that end's vertex, and the edges that begin, ordered among themselves, are merged in.
   void TakeVertices(int y);
+  bool Replace(int endId, const CFillVertex& at, const CFillVertex& other, int id, int direction,
+               double yc);
   void Treat(const CFillVertex& at, const CFillVertex& other, int id, int direction, double yc,
              double yAbove, int& numIncoming, bool& ending);
+  void Place(const CFillActiveEdge& e, int at) {
+    other[at] = e;
+    slots[e.id] = at;
+  }
+  void Start(CFillActiveEdge& e, const CFillVertex& at, const CFillVertex& other, int id,
+             int direction, double yc) {
+    e.dxdy = (other.x - at.x) / (other.y - at.y);
+    e.x = (yc - at.y) * e.dxdy + at.x - 0.5;
+    e.id = id;
+    e.direction = direction;
+    edgeEnds[id] = other.y;
+  }
 
   // Edges rarely swap between rows: a stable insertion sort is linear on the usual nearly
   // ordered table.
@@ -96,6 +116,21 @@ class CFillSweep {
       for (; j > 0 && CompareActiveEdges(&e[j - 1], &moving) > 0; --j)
         e[j] = e[j - 1];
       e[j] = moving;
+    }
+  }
+  // The same on the active table, keeping the slot table up to date.
+  void OrderEdges() {
+    CFillActiveEdge* e = edges;
+    for (int i = 1; i < numActive; ++i) {
+      if (CompareActiveEdges(&e[i - 1], &e[i]) < 0) continue;
+      const CFillActiveEdge moving = e[i];
+      int j = i;
+      for (; j > 0 && CompareActiveEdges(&e[j - 1], &moving) > 0; --j) {
+        e[j] = e[j - 1];
+        slots[e[j].id] = j;
+      }
+      e[j] = moving;
+      slots[moving.id] = j;
     }
   }
 
@@ -126,7 +161,8 @@ class CFillSweep {
   ZvScratchArray<double> edgeEnds;           // lower end y of each started edge, by edge id
   ZvScratchArray<CFillActiveEdge> incoming;  // the edges that begin on the current line
   ZvScratchArray<CFillActiveEdge> spare;
-  CFillActiveEdge* edges;  // the active edges: the context's table or the spare one
+  ZvScratchArray<int> slots;  // position of each active edge by edge id, -1 for the others
+  CFillActiveEdge* edges;     // the active edges: the context's table or the spare one
   CFillActiveEdge* other;
   int cursor = 0;
   int numActive = 0;
