@@ -19,6 +19,7 @@ struct ZvCells4x4 {
   static constexpr int N = 4;
   static constexpr int Shift = 2;
   static constexpr Word RowBits = 0xF;
+  static constexpr Word AllBits = 0xFFFF;
   static Word* (&Rows(CFillContext& ctx))[3] { return ctx.abuffer; }
   static void Allocate(CFillContext& ctx, int first, int end, bool three) {
     ctx.AllocateCoverageRows4x4(first, end, three);
@@ -31,6 +32,7 @@ struct ZvCells8x8 {
   static constexpr int N = 8;
   static constexpr int Shift = 3;
   static constexpr Word RowBits = 0xFF;
+  static constexpr Word AllBits = ~Word(0);
   static Word* (&Rows(CFillContext& ctx))[3] { return ctx.abuffer8; }
   static void Allocate(CFillContext& ctx, int first, int end, bool three) {
     ctx.AllocateCoverageRows8x8(first, end, three);

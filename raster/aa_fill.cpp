@@ -55,7 +55,6 @@ class AASweep {
       }
       if (radius == 0) {
         OutputOwnCells(cells, minCell, maxCell, Row(py));
-        Clear(cells, minCell, maxCell);
         continue;
       }
       rowMin[2] = minCell;
@@ -89,12 +88,19 @@ class AASweep {
       cells[x] = 0;
   }
 
-  void OutputOwnCells(const Word* cells, int lo, int hi, T* out) const {
+  // Writes the values of the touched cells and clears them for the next row. Inside a shape
+  // whole cells come in runs, and their value is known without counting.
+  void OutputOwnCells(Word* cells, int lo, int hi, T* out) const {
+    const T full = Pixel::Value(N * N, weight);
     for (int x = lo; x <= hi; ++x) {
+      const Word w = cells[x];
+      cells[x] = 0;
       if (Unity && N == 4 && std::is_same<T, unsigned char>::value)
-        out[x] = static_cast<T>(gc_oABTable[cells[x] & 0xFFFFu]);  // the table holds the value
+        out[x] = static_cast<T>(gc_oABTable[w & 0xFFFFu]);  // the table holds the value
+      else if (w == C::AllBits)
+        out[x] = full;
       else
-        out[x] = Pixel::Value(C::Count(cells[x]), weight);
+        out[x] = Pixel::Value(C::Count(w), weight);
     }
   }
 

@@ -1,37 +1,51 @@
 // Edge tables of a fill, built from flattened closed subpaths.
 #include "raster/fill_context.h"
 
+#include "raster/fill_scratch.h"
+#include "raster/fill_vertex_order.h"
+
 #include <algorithm>
 #include <cmath>
+#include <cstring>
 #include <new>
 
 namespace {
+const ZvScratchSlot kCellSlots[3] = {ZvScratch_Cells0, ZvScratch_Cells1, ZvScratch_Cells2};
+
 template <class Word>
 void FreeRows(Word* (&rows)[3], std::int32_t first) {
   const std::int32_t origin = first < 0 ? first : 0;
-  for (Word*& row : rows) {
-    if (row) delete[](row + origin);
-    row = nullptr;
+  for (int i = 0; i < 3; ++i) {
+    if (rows[i]) ZvScratchGive(kCellSlots[i], rows[i] + origin);
+    rows[i] = nullptr;
   }
 }
 
 // Rows are indexed by cell. A block that starts at cell min(first, 0) keeps row pointers inside
-// their blocks (a pointer before a block's start is undefined), at the cost of the cells left of
-// a box that begins right of 0.
+// their blocks (a pointer before a block's start is undefined); the cells left of a box that
+// begins right of 0 are never touched, so only first..end-1 are cleared.
 template <class Word>
 void AllocateRows(Word* (&rows)[3], int first, int end, bool three) {
   const int origin = first < 0 ? first : 0;
   for (int i = 0; i < (three ? 3 : 1); ++i) {
-    Word* block = new Word[end - origin]();
+    Word* block = static_cast<Word*>(ZvScratchTake(
+        kCellSlots[i], ZvScratchBytes(static_cast<std::size_t>(end - origin), sizeof(Word))));
     rows[i] = block - origin;
+    std::memset(static_cast<void*>(rows[i] + first), 0,
+                sizeof(Word) * static_cast<std::size_t>(end - first));
   }
+}
+
+template <class T>
+T* Take(ZvScratchSlot slot, unsigned int count) {
+  return static_cast<T*>(ZvScratchTake(slot, ZvScratchBytes(count, sizeof(T))));
 }
 }  // namespace
 
 CFillContext::~CFillContext() {
-  delete[] vertices;
-  delete[] sortedVertices;
-  delete[] activeEdges;
+  ZvScratchGive(ZvScratch_Vertices, vertices);
+  ZvScratchGive(ZvScratch_SortedVertices, sortedVertices);
+  ZvScratchGive(ZvScratch_ActiveEdges, activeEdges);
   vertices = nullptr;
   sortedVertices = nullptr;
   activeEdges = nullptr;
@@ -51,17 +65,19 @@ int CFillContext::BuildTables(const ZvPoint2dArray& points, const ZvPointTagArra
                               double scale) {
   const unsigned int count = points.size < tags.size ? points.size : tags.size;
   if (count == 0) return 0;
-  vertices = new CFillVertex[count];
-  sortedVertices = new CFillSortedVertex[count];
-  activeEdges = new CFillActiveEdge[count];
+  vertices = Take<CFillVertex>(ZvScratch_Vertices, count);
+  sortedVertices = Take<CFillSortedVertex>(ZvScratch_SortedVertices, count);
+  activeEdges = Take<CFillActiveEdge>(ZvScratch_ActiveEdges, count);
+  // The records in vertex order, then sorted into the table.
+  ZvScratchArray<CFillSortedVertex> rings(ZvScratch_SortRecords, count);
   int n = 0;
   int subpathStart = 0;
   for (unsigned int i = 0; i < count; ++i) {
     if (tags[i] == ZvPointTag_Last) {
       // The closing point repeats the first one: it only ties the ring.
       if (n > subpathStart) {
-        sortedVertices[subpathStart].prev = n - 1;
-        sortedVertices[n - 1].next = subpathStart;
+        rings[subpathStart].prev = n - 1;
+        rings[n - 1].next = subpathStart;
       }
       subpathStart = n;
       continue;
@@ -70,19 +86,15 @@ int CFillContext::BuildTables(const ZvPoint2dArray& points, const ZvPointTagArra
     vertices[n].y = points[i].y * scale;
     // A non-finite coordinate has no place in the y order: such a polygon is not filled.
     if (!std::isfinite(vertices[n].x) || !std::isfinite(vertices[n].y)) return 0;
-    sortedVertices[n] = CFillSortedVertex{n, n - 1, n + 1, vertices};
+    rings[n] = CFillSortedVertex{n, n - 1, n + 1, vertices};
     ++n;
   }
   // An unterminated last subpath is closed the same way, so no ring points past the table.
   if (n > subpathStart) {
-    sortedVertices[subpathStart].prev = n - 1;
-    sortedVertices[n - 1].next = subpathStart;
+    rings[subpathStart].prev = n - 1;
+    rings[n - 1].next = subpathStart;
   }
-  // Rising y, with the comparator inlined rather than called through qsort.
-  std::sort(sortedVertices, sortedVertices + n,
-            [](const CFillSortedVertex& a, const CFillSortedVertex& b) {
-              return CompareIndices(&b, &a) > 0;
-            });
+  ZvOrderByRisingY(rings.get(), sortedVertices, n, vertices);
   return n;
 }
 

@@ -3,8 +3,9 @@
 // A polygon (flattened closed subpaths, double precision) becomes three tables: the vertices,
 // one sorted-vertex record per vertex ordered by rising y with its ring neighbours, and the
 // active edges (capacity one per vertex). The antialiased fill adds three rows of coverage
-// cells; the soft fill its filter and row buffers. Everything is freed by the destructor, on
-// every way out of a fill.
+// cells; the soft fill its filter and row buffers. Everything is released by the destructor, on
+// every way out of a fill: the tables and coverage rows go back to the thread's scratch pool
+// (fill_scratch.h) for its next fill.
 #ifndef ZV_RASTER_FILL_CONTEXT_H
 #define ZV_RASTER_FILL_CONTEXT_H
 

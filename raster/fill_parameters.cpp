@@ -1,5 +1,6 @@
 // ZvPath2f::CalculateFillParameters: from a path to the pixel box and edge tables of a fill.
 #include "raster/fill_context.h"
+#include "raster/fill_scratch.h"
 
 #include <zv/fill.h>
 #include <zv/gc.h>
@@ -64,8 +65,9 @@ int ZvPath2f::CalculateFillParameters(const ZvGC& gc, int rasterWidth, int raste
   }
   if (xMin >= xMax || yMin >= yMax) return 0;
   const double tolerance = gc.flattenTolerance > 0.25 ? gc.flattenTolerance : 0.25;
-  ZvPoint2dArray points;
-  ZvPointTagArray tags;
+  ZvScratchPolygon polygon;
+  ZvPoint2dArray& points = polygon.points;
+  ZvPointTagArray& tags = polygon.tags;
   unsigned int subpaths;
   if (clipped) {
     const ZvExtent2<double> clip(xMin, yMin, xMax, yMax);

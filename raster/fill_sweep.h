@@ -10,38 +10,32 @@
 #define ZV_RASTER_FILL_SWEEP_H
 
 #include "raster/fill_context.h"
+#include "raster/fill_scratch.h"
 
+#include <algorithm>
 #include <cmath>
 
 class CFillSweep {
  public:
-  CFillSweep(CFillContext& ctx, int numVertices) : ctx(ctx), numVertices(numVertices) {}
+  CFillSweep(CFillContext& ctx, int numVertices)
+      : ctx(ctx),
+        numVertices(numVertices),
+        edgeEnds(ZvScratch_EdgeEnds, Count(numVertices)),
+        incoming(ZvScratch_IncomingEdges, Count(numVertices)),
+        spare(ZvScratch_SpareEdges, Count(numVertices)),
+        slots(ZvScratch_EdgeSlots, Count(numVertices)),
+        edges(ctx.activeEdges),
+        other(spare.get()) {
+    std::fill(slots.get(), slots.get() + Count(numVertices), -1);
+  }
 
   // Brings the active edges to the sample line y + 0.5, ordered by x.
   void Advance(int y) {
     const double yc = y + 0.5;
-    const double yAbove = y - 0.5;
-    const CFillVertex* v = ctx.vertices;
-    while (cursor < numVertices && v[ctx.sortedVertices[cursor].index].y <= yc) {
-      const CFillSortedVertex& s = ctx.sortedVertices[cursor++];
-      const CFillVertex& at = v[s.index];
-      // The edge arriving from prev goes upwards in path order when it starts here, the edge
-      // leaving towards next downwards.
-      Treat(at, v[s.prev], s.prev, -1, yc, yAbove);
-      Treat(at, v[s.next], s.index, +1, yc, yAbove);
-    }
-    // Edges rarely swap between rows: a stable insertion sort is linear on the usual nearly
-    // ordered table and keeps edges of equal x in the order a stable sort by CompareActiveEdges
-    // would.
-    CFillActiveEdge* e = ctx.activeEdges;
-    for (int i = 1; i < numActive; ++i) {
-      if (CompareActiveEdges(&e[i - 1], &e[i]) < 0) continue;
-      const CFillActiveEdge moving = e[i];
-      int j = i;
-      for (; j > 0 && CompareActiveEdges(&e[j - 1], &moving) > 0; --j)
-        e[j] = e[j - 1];
-      e[j] = moving;
-    }
+    if (cursor < numVertices && ctx.vertices[ctx.sortedVertices[cursor].index].y <= yc)
+      TakeVertices(y);
+    else
+      OrderEdges();
   }
 
   // Calls span(left, right) for each run of sample columns inside under the rule, clipped to
@@ -49,12 +43,12 @@ class CFillSweep {
   // on an edge is inside; a span of zero width is never written.
   template <bool NonZero, class Span>
   void Spans(int leftLimit, int rightExclusive, Span&& span) {
-    CFillActiveEdge* e = ctx.activeEdges;
+    CFillActiveEdge* e = edges;
     if (!NonZero) {
       for (int i = 0; i + 1 < numActive; i += 2) {
         const double xl = e[i].x;
         const double xr = e[i + 1].x;
-        if (xr > xl) Emit(xl, std::floor(xr), leftLimit, rightExclusive, span);
+        if (xr > xl) Emit(xl, xr, leftLimit, rightExclusive, span);
         e[i].x += e[i].dxdy;
         e[i + 1].x += e[i + 1].dxdy;
       }
@@ -68,55 +62,108 @@ class CFillSweep {
       e[i].x += e[i].dxdy;
       ++i;
       double xr = xl;
-      double right = rightExclusive - 1;
+      double end = HUGE_VAL;  // edges run out: the span reaches the right limit
       while (i < numActive) {
         xr = e[i].x;
         winding += e[i].direction;
         e[i].x += e[i].dxdy;
         ++i;
         if (winding == 0) {
-          right = std::floor(xr);
+          end = xr;
           break;
         }
       }
-      if (xr > xl) Emit(xl, right, leftLimit, rightExclusive, span);
+      if (xr > xl) Emit(xl, end, leftLimit, rightExclusive, span);
     }
   }
 
  private:
+  static std::size_t Count(int n) { return n > 0 ? static_cast<std::size_t>(n) : 0; }
+
+  // The rows that reach vertices, out of line: in most shapes most rows take none.
+  //
+  // A vertex inside a chain ends one edge and starts the next: the new edge takes the slot of
+  // the old one, found through the slot table, and the order is mended by the insertion sort.
+  // The other edges that end or begin are handled in one pass that copies the table into the
+  // spare one, rather than one search per ending edge and one insertion per beginning edge: an
+  // edge is retired at the first line that reaches its lower end, which is the line that takes
+  // that end's vertex, and the edges that begin, ordered among themselves, are merged in.
+  void TakeVertices(int y);
+  bool Replace(int endId, const CFillVertex& at, const CFillVertex& other, int id, int direction,
+               double yc);
   void Treat(const CFillVertex& at, const CFillVertex& other, int id, int direction, double yc,
-             double yAbove) {
-    if (other.y <= yAbove) {
-      CFillActiveEdge* e = ctx.activeEdges;
-      for (int i = 0; i < numActive; ++i) {
-        if (e[i].id == id) {
-          for (int j = i + 1; j < numActive; ++j)
-            e[j - 1] = e[j];
-          --numActive;
-          break;
-        }
+             double yAbove, int& numIncoming, bool& ending);
+  void Place(const CFillActiveEdge& e, int at) {
+    other[at] = e;
+    slots[e.id] = at;
+  }
+  void Start(CFillActiveEdge& e, const CFillVertex& at, const CFillVertex& other, int id,
+             int direction, double yc) {
+    e.dxdy = (other.x - at.x) / (other.y - at.y);
+    e.x = (yc - at.y) * e.dxdy + at.x - 0.5;
+    e.id = id;
+    e.direction = direction;
+    edgeEnds[id] = other.y;
+  }
+
+  // Edges rarely swap between rows: a stable insertion sort is linear on the usual nearly
+  // ordered table.
+  static void InsertionSort(CFillActiveEdge* e, int count) {
+    for (int i = 1; i < count; ++i) {
+      if (CompareActiveEdges(&e[i - 1], &e[i]) < 0) continue;
+      const CFillActiveEdge moving = e[i];
+      int j = i;
+      for (; j > 0 && CompareActiveEdges(&e[j - 1], &moving) > 0; --j)
+        e[j] = e[j - 1];
+      e[j] = moving;
+    }
+  }
+  // The same on the active table, keeping the slot table up to date.
+  void OrderEdges() {
+    CFillActiveEdge* e = edges;
+    for (int i = 1; i < numActive; ++i) {
+      if (CompareActiveEdges(&e[i - 1], &e[i]) < 0) continue;
+      const CFillActiveEdge moving = e[i];
+      int j = i;
+      for (; j > 0 && CompareActiveEdges(&e[j - 1], &moving) > 0; --j) {
+        e[j] = e[j - 1];
+        slots[e[j].id] = j;
       }
-    } else if (other.y > yc) {
-      CFillActiveEdge& e = ctx.activeEdges[numActive++];
-      e.dxdy = (other.x - at.x) / (other.y - at.y);
-      e.x = (yc - at.y) * e.dxdy + at.x - 0.5;
-      e.id = id;
-      e.direction = direction;
+      e[j] = moving;
+      slots[moving.id] = j;
     }
   }
 
-  // Clipping happens in double precision so that no far-off crossing is converted to int.
+  // Writes the columns from ceil(xl) to floor(xr), clipped to [leftLimit, rightExclusive). An xr
+  // of +infinity reaches the right limit. Clipping happens in double precision so that no
+  // far-off crossing is converted to int, and the roundings of the crossings left inside are
+  // done on the integers: a crossing between the limits fits in an int.
   template <class Span>
-  static void Emit(double xl, double right, int leftLimit, int rightExclusive, Span& span) {
-    double left = std::ceil(xl);
-    if (left < leftLimit) left = leftLimit;
-    if (right > rightExclusive - 1) right = rightExclusive - 1;
-    if (!(left <= right) || left >= rightExclusive) return;
-    span(static_cast<int>(left), static_cast<int>(right));
+  static void Emit(double xl, double xr, int leftLimit, int rightExclusive, Span& span) {
+    const int last = rightExclusive - 1;
+    if (!(xl <= last)) return;  // ceil(xl) past the last column, or NaN
+    int left = leftLimit;
+    if (xl > leftLimit) {
+      left = static_cast<int>(xl);  // towards zero, then up to the ceiling
+      left += left < xl;
+    }
+    if (!(xr >= left)) return;  // floor(xr) < left, or NaN
+    int right = last;
+    if (xr < last) {
+      right = static_cast<int>(xr);
+      right -= right > xr;
+    }
+    if (left <= right) span(left, right);  // false only for limits that leave no column
   }
 
   CFillContext& ctx;
   int numVertices;
+  ZvScratchArray<double> edgeEnds;           // lower end y of each started edge, by edge id
+  ZvScratchArray<CFillActiveEdge> incoming;  // the edges that begin on the current line
+  ZvScratchArray<CFillActiveEdge> spare;
+  ZvScratchArray<int> slots;  // position of each active edge by edge id, -1 for the others
+  CFillActiveEdge* edges;     // the active edges: the context's table or the spare one
+  CFillActiveEdge* other;
   int cursor = 0;
   int numActive = 0;
 };

@@ -1,0 +1,72 @@
+// Sorting the vertices of a fill by y: distribution into as many buckets as there are vertices
+// over the range of y, then each bucket sorted on its own. Bucket keys rise with y, so the result
+// is the full order; a polygon's vertices spread over its height, so a bucket holds one or two
+// and the whole costs a few linear passes rather than n log n comparisons through the vertex
+// table.
+#include "raster/fill_vertex_order.h"
+
+#include "raster/fill_scratch.h"
+
+#include <algorithm>
+
+namespace {
+bool Before(const CFillSortedVertex& a, const CFillSortedVertex& b) {
+  return CompareIndices(&b, &a) > 0;  // a.y < b.y
+}
+
+// Below this count, and within a bucket above it, a comparison sort is cheaper.
+constexpr int kFewVertices = 64;
+constexpr int kInsertionLimit = 16;
+
+void SortBucket(CFillSortedVertex* r, int count) {
+  if (count > kInsertionLimit) {
+    std::sort(r, r + count, Before);
+    return;
+  }
+  for (int i = 1; i < count; ++i) {
+    const CFillSortedVertex moving = r[i];
+    int j = i;
+    for (; j > 0 && Before(moving, r[j - 1]); --j)
+      r[j] = r[j - 1];
+    r[j] = moving;
+  }
+}
+}  // namespace
+
+void ZvOrderByRisingY(const CFillSortedVertex* records, CFillSortedVertex* sorted, int n,
+                      const CFillVertex* vertices) {
+  if (n < kFewVertices) {
+    std::copy(records, records + n, sorted);
+    std::sort(sorted, sorted + n, Before);
+    return;
+  }
+  double lo = vertices[0].y, hi = lo;
+  for (int i = 1; i < n; ++i) {
+    lo = std::min(lo, vertices[i].y);
+    hi = std::max(hi, vertices[i].y);
+  }
+  // Keys are floor((y - lo) * k): subtracting, scaling by a positive factor and flooring never
+  // reverse an order. A range too thin for the factor puts everything into one bucket.
+  const int buckets = n;
+  double k = (buckets - 1) / (hi - lo);
+  if (!(k < 1e300)) k = 0.0;
+  auto key = [&](double y) {
+    const int b = static_cast<int>((y - lo) * k);
+    return b < buckets ? b : buckets - 1;
+  };
+  ZvScratchArray<int> starts(ZvScratch_SortCounts, static_cast<std::size_t>(buckets) + 1);
+  std::fill(starts.get(), starts.get() + buckets + 1, 0);
+  for (int i = 0; i < n; ++i)
+    ++starts[key(vertices[i].y) + 1];
+  for (int b = 0; b < buckets; ++b)
+    starts[b + 1] += starts[b];
+  for (int i = 0; i < n; ++i)
+    sorted[starts[key(vertices[i].y)]++] = records[i];
+  // starts[b] is now the end of bucket b.
+  int begin = 0;
+  for (int b = 0; b < buckets; ++b) {
+    const int end = starts[b];
+    if (end - begin > 1) SortBucket(sorted + begin, end - begin);
+    begin = end;
+  }
+}
