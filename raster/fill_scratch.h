@@ -15,7 +15,9 @@
 #include <cstddef>
 #include <new>
 
-constexpr std::size_t kZvScratchKeepBytes = std::size_t(16) << 20;
+// A megabyte a slot holds the tables of shapes up to tens of thousands of vertices, which is where
+// fresh memory costs most against the sweep; a thread keeps at most about 13 MB.
+constexpr std::size_t kZvScratchKeepBytes = std::size_t(1) << 20;
 
 enum ZvScratchSlot {
   ZvScratch_Vertices,
