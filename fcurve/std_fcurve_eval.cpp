@@ -286,15 +286,19 @@ double ZvStdFCurveImpl::EvalLeftUsingExtrapolationMethod(double t) const {
 
 int ZvStdFCurveImpl::EvalClearOfKeys(double t, double& v) const {
   const unsigned int n = keys.size;
+  const unsigned int hint = searchHint;
   int found;
   const unsigned int at = LocateParameter(t, found);
   // Unless found, the located keys bracket t and every other key lies farther. Clear of both by
   // twice the snap tolerance, t is not within the parameter epsilon of any key, nor is t minus
   // the snap tolerance: every search then gives this same answer and leaves the same hint,
   // whatever hint it starts from, so the snap leaves t alone and the evaluation's own search
-  // repeats this one.
-  if (at > 0 && !(t - keys[at - 1].parameter > 2.0 * kCFCSnapTolerance)) return -1;
-  if (at < n && !(keys[at].parameter - t > 2.0 * kCFCSnapTolerance)) return -1;
+  // repeats this one. Near a key the snap must search from the hint it was given.
+  if ((at > 0 && !(t - keys[at - 1].parameter > 2.0 * kCFCSnapTolerance)) ||
+      (at < n && !(keys[at].parameter - t > 2.0 * kCFCSnapTolerance))) {
+    searchHint = hint;
+    return -1;
+  }
   const unsigned int method = extrapolation;
   if (method == ZvBaseFCurve::CycleWithOffsetExtrapolation) return 0;
   if (at > 0 && at < n) {
@@ -312,8 +316,6 @@ int ZvStdFCurveImpl::EvalClearOfKeys(double t, double& v) const {
   return 1;
 }
 
-// The nearest-key search runs only near a key, where the first search of EvalClearOfKeys has
-// already moved the hint.
 double ZvStdFCurveImpl::EvalRightSnapped(double t) const {
   if (keys.size == 0) return valueWhenNoKeys;
   double v;

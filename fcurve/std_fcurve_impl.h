@@ -144,7 +144,8 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
   double EvalCubicSegment(double t, unsigned int i) const;
   // Away from every key, one search answers for the snap and for the evaluation, and the side
   // of the limit does not matter. 1 with the value in v; 0 when t needs no snap but the method
-  // must fold it; -1 when t lies near a key and must be snapped first.
+  // must fold it; -1, with the hint as it was, when t lies near a key and must be snapped
+  // first.
   int EvalClearOfKeys(double t, double& v) const;
 
   // The last cubic segment evaluated whose handles are the stored ones, with copies of the
@@ -152,6 +153,13 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
   // so no editing path has to know about it; consecutive parameters mostly fall into one
   // segment, which then skips the setup of its arithmetic.
   struct PlainSegmentMemo {
+    PlainSegmentMemo() = default;
+    // A copied store starts without: what is kept belongs to the store it was built for.
+    PlainSegmentMemo(const PlainSegmentMemo&) {}
+    PlainSegmentMemo& operator=(const PlainSegmentMemo&) {
+      filled = false;
+      return *this;
+    }
     bool filled = false;
     std::uint64_t inputs[8];
     ZvCubicFunctionSegment segment;
