@@ -14,10 +14,9 @@
 struct ZvCubicXInverse {
   double x0, x3;
   double a, b, c;  // X(u) = ((a u + b) u + c) u + x0
-  double a3, b2;   // 3a and 2b, the derivative's coefficients
-  // The first round of the iteration starts at u = 1/2 in the bracket [0, 1]: the polynomial
-  // without its constant, the slope there, and the slope times the distances to both ends.
-  double halfway, slope0, lowArm0, highArm0;
+  // The first round starts at u = 1/2: the polynomial there without its constant, and the
+  // slope there.
+  double halfway, slope0;
 
   ZvCubicXInverse() = default;
   ZvCubicXInverse(double p0, double p1, double p2, double p3) {
@@ -26,13 +25,9 @@ struct ZvCubicXInverse {
     a = 3.0 * p1 + p3 - 3.0 * p2 - p0;
     b = 3.0 * (p0 - 2.0 * p1 + p2);
     c = 3.0 * (p1 - p0);
-    a3 = 3.0 * a;
-    b2 = 2.0 * b;
     const double u = 0.5;
     halfway = ((a * u + b) * u + c) * u;
-    slope0 = (a3 * u + b2) * u + c;
-    lowArm0 = (0.0 - u) * slope0;
-    highArm0 = (1.0 - u) * slope0;
+    slope0 = (3.0 * a * u + 2.0 * b) * u + c;
   }
 
   // Newton steps while they stay inside the bracket, else a halving toward the anchor, the end
@@ -46,7 +41,8 @@ struct ZvCubicXInverse {
     double f = halfway + d;
     double low = 0.0, high = 1.0;
     double anchor = f < 0.0 ? 1.0 : 0.0;
-    double slope = slope0, lowArm = lowArm0, highArm = highArm0;
+    const double a3 = 3.0 * a, b2 = 2.0 * b;
+    double slope = slope0, lowArm = (low - u) * slope, highArm = (high - u) * slope;
     for (int round = 0;;) {
       // Newton only while its step stays inside the bracket.
       const double step = (lowArm + f) * (highArm + f) < 0.0 ? f / slope : (u - anchor) * 0.5;

@@ -22,7 +22,7 @@ std::uint64_t Bits(double v) {
 
 }  // namespace
 
-double ZvStdFCurveImpl::EvalCubicSegment(double t, unsigned int i) const {
+double ZvStdFCurveImpl::EvalCubicSegment(double t, unsigned int i, bool keep) const {
   const CFCStdKey& k = keys[i];
   const CFCStdKey& next = keys[i + 1];
   if ((k.flags | next.flags) & kComputedHandleFlags) {
@@ -39,16 +39,22 @@ double ZvStdFCurveImpl::EvalCubicSegment(double t, unsigned int i) const {
   std::uint64_t differ = memo.filled ? 0 : 1;
   for (int j = 0; j < 8; ++j)
     differ |= Bits(in[j]) ^ memo.inputs[j];
-  if (differ) {
+  if (!differ) return memo.segment.Eval(t);
+  const ZvCubicFunctionSegment segment(in[0], in[1], in[2], in[3], in[4], in[5], in[6], in[7]);
+  if (keep) {
     for (int j = 0; j < 8; ++j)
       memo.inputs[j] = Bits(in[j]);
-    memo.segment = ZvCubicFunctionSegment(in[0], in[1], in[2], in[3], in[4], in[5], in[6], in[7]);
+    memo.segment = segment;
     memo.filled = true;
   }
-  return memo.segment.Eval(t);
+  return segment.Eval(t);
 }
 
 double ZvStdFCurveImpl::EvalJustAfterIndex(double t, unsigned int i) const {
+  return EvalSegment(t, i, true);
+}
+
+double ZvStdFCurveImpl::EvalSegment(double t, unsigned int i, bool keep) const {
   const CFCStdKey& k = keys[i];
   switch (k.segmentKind) {
     case ZvBaseFCurve::ConstantSegment:
@@ -59,7 +65,7 @@ double ZvStdFCurveImpl::EvalJustAfterIndex(double t, unsigned int i) const {
              (next.leftValue - k.rightValue) * (t - k.parameter) / (next.parameter - k.parameter);
     }
     case ZvBaseFCurve::CubicSegment:
-      return EvalCubicSegment(t, i);
+      return EvalCubicSegment(t, i, keep);
     default:
       return 0.0;  // unknown kind: a hole in the data, not an error
   }
@@ -287,23 +293,35 @@ double ZvStdFCurveImpl::EvalLeftUsingExtrapolationMethod(double t) const {
 int ZvStdFCurveImpl::EvalClearOfKeys(double t, double& v) const {
   const unsigned int n = keys.size;
   const unsigned int hint = searchHint;
-  int found;
-  const unsigned int at = LocateParameter(t, found);
-  // Unless found, the located keys bracket t and every other key lies farther. Clear of both by
-  // twice the snap tolerance, t is not within the parameter epsilon of any key, nor is t minus
-  // the snap tolerance: every search then gives this same answer and leaves the same hint,
-  // whatever hint it starts from, so the snap leaves t alone and the evaluation's own search
-  // repeats this one. Near a key the snap must search from the hint it was given.
-  if ((at > 0 && !(t - keys[at - 1].parameter > 2.0 * kCFCSnapTolerance)) ||
-      (at < n && !(keys[at].parameter - t > 2.0 * kCFCSnapTolerance))) {
-    searchHint = hint;
-    return -1;
+  const double clearance = 2.0 * kCFCSnapTolerance;
+  // Clear of both keys that bracket it by twice the snap tolerance, t is not within the
+  // parameter epsilon of any key, nor is t minus the snap tolerance: every search then finds
+  // these two keys and leaves the hint on the lower one, whatever hint it starts from, so the
+  // snap leaves t alone and the evaluation's own search repeats this one. Sequential
+  // parameters mostly fall between the two keys at the hint, which needs no search at all.
+  unsigned int at;
+  const bool sweep = hint < n - 1 && t - keys[hint].parameter > clearance &&
+                     keys[hint + 1].parameter - t > clearance;
+  if (sweep) {
+    at = hint + 1;
+  } else {
+    int found;
+    at = LocateParameter(t, found);
+    // Unless found, the located keys bracket t and every other key lies farther. Near a key
+    // the snap must search from the hint it was given.
+    if ((at > 0 && !(t - keys[at - 1].parameter > clearance)) ||
+        (at < n && !(keys[at].parameter - t > clearance))) {
+      searchHint = hint;
+      return -1;
+    }
   }
   const unsigned int method = extrapolation;
   if (method == ZvBaseFCurve::CycleWithOffsetExtrapolation) return 0;
   if (at > 0 && at < n) {
-    // Strictly inside the keyed range the cycle's fold leaves t as it is.
-    v = EvalJustAfterIndex(t, at - 1);
+    // Strictly inside the keyed range the cycle's fold leaves t as it is. Only a parameter
+    // between the same keys as the search before keeps its segment: a sweep uses it for its
+    // next steps, scattered parameters would only pay for keeping it.
+    v = EvalSegment(t, at - 1, sweep);
     return 1;
   }
   if (method == ZvBaseFCurve::CycleExtrapolation) return 0;

@@ -141,7 +141,9 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
 
  private:
   double EvaluatedRightX(unsigned int i) const;
-  double EvalCubicSegment(double t, unsigned int i) const;
+  // EvalJustAfterIndex; with `keep` a cubic segment built anew replaces the one kept.
+  double EvalSegment(double t, unsigned int i, bool keep) const;
+  double EvalCubicSegment(double t, unsigned int i, bool keep) const;
   // Away from every key, one search answers for the snap and for the evaluation, and the side
   // of the limit does not matter. 1 with the value in v; 0 when t needs no snap but the method
   // must fold it; -1, with the hint as it was, when t lies near a key and must be snapped
