@@ -290,7 +290,7 @@ double ZvStdFCurveImpl::EvalLeftUsingExtrapolationMethod(double t) const {
   }
 }
 
-int ZvStdFCurveImpl::EvalClearOfKeys(double t, double& v) const {
+inline int ZvStdFCurveImpl::EvalClearOfKeys(double t, double& v) const {
   const unsigned int n = keys.size;
   const unsigned int hint = searchHint;
   const double clearance = 2.0 * kCFCSnapTolerance;
