@@ -149,8 +149,6 @@ class RandomCurves {
     for (unsigned int i = 0; i < n; ++i)
       RandomHandles(s, i);
     s.extrapolation = static_cast<unsigned char>(1 + Below(4));
-    s.minClamp = -1.0;
-    s.maxClamp = 1.0;
     return s;
   }
 
