@@ -273,3 +273,20 @@ TEST(StdCurveEvalReference, EvaluationMatchesThePlainPathBitForBit) {
 }
 
 }  // namespace
+
+// The snap searches from the hint the previous call left. t - 1e-12 rounds to one ulp above
+// key 5: the neighbourhood of a near hint finds key 5 there within the parameter epsilon and
+// snaps t onto it, while the exact bisection from a far hint finds no key within the
+// tolerance, t being a little more than 1e-12 above the key.
+TEST(StdCurveEvalReference, SnapSearchesFromTheHintOfThePreviousCall) {
+  ZvStdFCurve curve(0.0, C::LinearSegment);
+  for (int i = 0; i < 20; ++i)
+    curve.CreateKey(i, i * i);
+  const double t = std::nextafter(5.0 + 1e-12, 6.0);
+  curve.Eval(5.3, 0);
+  EXPECT_EQ(curve.Eval(t, 0), 25.0);
+  curve.Eval(15.5, 0);
+  const double unsnapped = curve.Eval(t, 0);
+  EXPECT_GT(unsnapped, 25.0);
+  EXPECT_LT(unsnapped, 25.0 + 1e-10);
+}
