@@ -300,9 +300,8 @@ inline int ZvStdFCurveImpl::EvalClearOfKeys(double t, double& v) const {
   // snap leaves t alone and the evaluation's own search repeats this one. Sequential
   // parameters mostly fall between the two keys at the hint, which needs no search at all.
   unsigned int at;
-  const bool sweep = hint < n - 1 && t - keys[hint].parameter > clearance &&
-                     keys[hint + 1].parameter - t > clearance;
-  if (sweep) {
+  if (hint < n - 1 && t - keys[hint].parameter > clearance &&
+      keys[hint + 1].parameter - t > clearance) {
     at = hint + 1;
   } else {
     int found;
@@ -318,10 +317,11 @@ inline int ZvStdFCurveImpl::EvalClearOfKeys(double t, double& v) const {
   const unsigned int method = extrapolation;
   if (method == ZvBaseFCurve::CycleWithOffsetExtrapolation) return 0;
   if (at > 0 && at < n) {
-    // Strictly inside the keyed range the cycle's fold leaves t as it is. Only a parameter
-    // between the same keys as the search before keeps its segment: a sweep uses it for its
-    // next steps, scattered parameters would only pay for keeping it.
-    v = EvalSegment(t, at - 1, sweep);
+    // Strictly inside the keyed range the cycle's fold leaves t as it is. Only a parameter in
+    // the segment of the search before or next to it keeps its segment: a sweep uses it for
+    // its next steps, scattered parameters would only pay for keeping it.
+    const unsigned int segment = at - 1;
+    v = EvalSegment(t, segment, segment == hint || segment == hint + 1 || segment + 1 == hint);
     return 1;
   }
   if (method == ZvBaseFCurve::CycleExtrapolation) return 0;
