@@ -1,8 +1,8 @@
 // The evaluation path of the standard curve, which shares searches and keeps the setup of the
-// last segment, against a plain evaluation that searches as told and builds every segment
-// anew. Random curves with every handle flag, segment kind and extrapolation method, key counts
-// on both sides of the neighbourhood search, keys closer than the snap tolerance, and edits
-// between evaluations; the two must agree to the bit.
+// last segment, against a plain evaluation that snaps with the nearest-key search alone and
+// builds every segment anew. Random curves with every handle flag, segment kind and
+// extrapolation method, key counts on both sides of the neighbourhood search, keys closer than
+// the snap tolerance, and edits between evaluations; the two must agree to the bit.
 #include <gtest/gtest.h>
 
 #include <zv/std_fcurve.h>
