@@ -192,31 +192,20 @@ class RandomCurves {
     double* const fields[] = {&k.parameter,      i == near ? &k.rightValue : &k.leftValue,
                               &k.rightTangent.x, &k.rightTangent.y,
                               &k.leftTangent.x,  &k.leftTangent.y};
-    switch (Below(8)) {
-      case 0:
-      case 1:
-      case 2:
-      case 3: {
-        double& v = *fields[i == near ? Below(4) : (Below(4) + 4) % 6];
-        v = std::nextafter(v, Below(2) ? 1e300 : -1e300);
-        break;
-      }
-      case 4:
-        k.flags = RandomFlags();
-        break;
-      case 5:
-        k.segmentKind = static_cast<unsigned char>(1 + Below(3));
-        break;
-      case 6:
-        if (n > 2) s.DropKeys(i, i);
-        break;
-      default:
-        if (i + 1 < n) {
-          const double at = 0.5 * (k.parameter + s.keys[i + 1].parameter);
-          s.InsertKey(i + 1, at, Uniform(-2.0, 2.0));
-          s.keys[i + 1].segmentKind = C::CubicSegment;
-          RandomHandles(s, i + 1);
-        }
+    const unsigned int what = Below(8);
+    if (what < 4) {
+      double& v = *fields[i == near ? Below(4) : (Below(4) + 4) % 6];
+      v = std::nextafter(v, Below(2) ? 1e300 : -1e300);
+    } else if (what == 4) {
+      k.flags = RandomFlags();
+    } else if (what == 5) {
+      k.segmentKind = static_cast<unsigned char>(1 + Below(3));
+    } else if (what == 6 && n > 2) {
+      s.DropKeys(i, i);
+    } else if (what == 7 && i + 1 < n) {
+      s.InsertKey(i + 1, 0.5 * (k.parameter + s.keys[i + 1].parameter), Uniform(-2.0, 2.0));
+      s.keys[i + 1].segmentKind = C::CubicSegment;
+      RandomHandles(s, i + 1);
     }
     s.extrapolation = static_cast<unsigned char>(1 + Below(4));
   }
@@ -272,8 +261,6 @@ TEST(StdCurveEvalReference, EvaluationMatchesThePlainPathBitForBit) {
   }
 }
 
-}  // namespace
-
 // The snap searches from the hint the previous call left. t - 1e-12 rounds to one ulp above
 // key 5: the neighbourhood of a near hint finds key 5 there within the parameter epsilon and
 // snaps t onto it, while the exact bisection from a far hint finds no key within the
@@ -290,3 +277,5 @@ TEST(StdCurveEvalReference, SnapSearchesFromTheHintOfThePreviousCall) {
   EXPECT_GT(unsnapped, 25.0);
   EXPECT_LT(unsnapped, 25.0 + 1e-10);
 }
+
+}  // namespace
