@@ -71,16 +71,16 @@ class CFCKeySearch : public Store {
     }
     while (high - low > 1) {
       const unsigned int mid = (low + high) / 2;
-      if (t > k[mid].parameter) {
-        low = mid;
-      } else {
-        high = mid;
-        if (t >= k[mid].parameter) {  // exact equality, on purpose
-          this->searchHint = mid;
-          found = 1;
-          return mid + 1;
-        }
+      const double p = k[mid].parameter;
+      if (!(t > p) && t >= p) {  // exact equality, on purpose
+        this->searchHint = mid;
+        found = 1;
+        return mid + 1;
       }
+      // Which half is as good as random: chosen without a branch that would be mispredicted.
+      const bool above = t > p;
+      low = above ? mid : low;
+      high = above ? high : mid;
     }
     this->searchHint = low;
     found = 0;

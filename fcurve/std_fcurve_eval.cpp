@@ -4,8 +4,57 @@
 #include "fcurve/std_fcurve_impl.h"
 
 #include <cmath>
+#include <cstdint>
+#include <cstring>
+
+namespace {
+
+// Flags under which a key's handles on the evaluation path differ from the stored ones.
+constexpr unsigned short kComputedHandleFlags = CFCFlag_FlatTangent | CFCFlag_FlatAtExtremum |
+                                                CFCFlag_AutoTangent | CFCFlag_CollapsedTangent |
+                                                CFCFlag_ChordTangent;
+
+std::uint64_t Bits(double v) {
+  std::uint64_t b;
+  std::memcpy(&b, &v, sizeof b);
+  return b;
+}
+
+}  // namespace
+
+double ZvStdFCurveImpl::EvalCubicSegment(double t, unsigned int i, bool keep) const {
+  const CFCStdKey& k = keys[i];
+  const CFCStdKey& next = keys[i + 1];
+  if ((k.flags | next.flags) & kComputedHandleFlags) {
+    ZvPoint2<double> p[4];
+    GetSegmentControls(i, p);
+    return ZvCubicFunctionSegment(p[0].x, p[1].x, p[2].x, p[3].x, p[0].y, p[1].y, p[2].y, p[3].y)
+        .Eval(t);
+  }
+  // The fields a segment between keys with stored handles is built from, compared to the bit:
+  // a NaN matches itself, 0 and -0 differ.
+  const double in[8] = {k.parameter,  k.rightTangent.x, next.leftTangent.x, next.parameter,
+                        k.rightValue, k.rightTangent.y, next.leftTangent.y, next.leftValue};
+  PlainSegmentMemo& memo = m_plainSegment;
+  std::uint64_t differ = memo.filled ? 0 : 1;
+  for (int j = 0; j < 8; ++j)
+    differ |= Bits(in[j]) ^ memo.inputs[j];
+  if (!differ) return memo.segment.Eval(t);
+  const ZvCubicFunctionSegment segment(in[0], in[1], in[2], in[3], in[4], in[5], in[6], in[7]);
+  if (keep) {
+    for (int j = 0; j < 8; ++j)
+      memo.inputs[j] = Bits(in[j]);
+    memo.segment = segment;
+    memo.filled = true;
+  }
+  return segment.Eval(t);
+}
 
 double ZvStdFCurveImpl::EvalJustAfterIndex(double t, unsigned int i) const {
+  return EvalSegment(t, i, true);
+}
+
+double ZvStdFCurveImpl::EvalSegment(double t, unsigned int i, bool keep) const {
   const CFCStdKey& k = keys[i];
   switch (k.segmentKind) {
     case ZvBaseFCurve::ConstantSegment:
@@ -15,16 +64,8 @@ double ZvStdFCurveImpl::EvalJustAfterIndex(double t, unsigned int i) const {
       return k.rightValue +
              (next.leftValue - k.rightValue) * (t - k.parameter) / (next.parameter - k.parameter);
     }
-    case ZvBaseFCurve::CubicSegment: {
-      ZvPoint2<double> p[4];
-      GetSegmentControls(i, p);
-      const double u = InvertParamCubic(t, p[0].x, p[1].x, p[2].x, p[3].x);
-      const double y0 = p[0].y, y1 = p[1].y, y2 = p[2].y, y3 = p[3].y;
-      return (((y3 - y0 - 3.0 * (y2 - y1)) * u + 3.0 * (y2 - y1) - 3.0 * (y1 - y0)) * u +
-              3.0 * (y1 - y0)) *
-                 u +
-             y0;
-    }
+    case ZvBaseFCurve::CubicSegment:
+      return EvalCubicSegment(t, i, keep);
     default:
       return 0.0;  // unknown kind: a hole in the data, not an error
   }
@@ -247,4 +288,72 @@ double ZvStdFCurveImpl::EvalLeftUsingExtrapolationMethod(double t) const {
     default:
       return EvalLeft(t);
   }
+}
+
+inline int ZvStdFCurveImpl::EvalClearOfKeys(double t, double& v) const {
+  const unsigned int n = keys.size;
+  const unsigned int hint = searchHint;
+  const double clearance = 2.0 * kCFCSnapTolerance;
+  // Clear of both keys that bracket it by twice the snap tolerance, t is not within the
+  // parameter epsilon of any key, nor is t minus the snap tolerance: every search then finds
+  // these two keys and leaves the hint on the lower one, whatever hint it starts from, so the
+  // snap leaves t alone and the evaluation's own search repeats this one. Sequential
+  // parameters mostly fall between the two keys at the hint, which needs no search at all.
+  unsigned int at;
+  if (hint < n - 1 && t - keys[hint].parameter > clearance &&
+      keys[hint + 1].parameter - t > clearance) {
+    at = hint + 1;
+  } else {
+    int found;
+    at = LocateParameter(t, found);
+    // Unless found, the located keys bracket t and every other key lies farther. Near a key
+    // the snap must search from the hint it was given.
+    if ((at > 0 && !(t - keys[at - 1].parameter > clearance)) ||
+        (at < n && !(keys[at].parameter - t > clearance))) {
+      searchHint = hint;
+      return -1;
+    }
+  }
+  const unsigned int method = extrapolation;
+  if (method == ZvBaseFCurve::CycleWithOffsetExtrapolation) return 0;
+  if (at > 0 && at < n) {
+    // Strictly inside the keyed range the cycle's fold leaves t as it is. Only a parameter in
+    // the segment of the search before or next to it keeps its segment: a sweep uses it for
+    // its next steps, scattered parameters would only pay for keeping it.
+    const unsigned int segment = at - 1;
+    v = EvalSegment(t, segment, segment == hint || segment == hint + 1 || segment + 1 == hint);
+    return 1;
+  }
+  if (method == ZvBaseFCurve::CycleExtrapolation) return 0;
+  const bool linear = method == ZvBaseFCurve::LinearExtrapolation;
+  if (at >= n) {
+    v = linear ? GetValueAfterLastKeyWhenLinear(t) : keys[n - 1].rightValue;
+  } else {
+    v = linear ? GetValueBeforeFirstKeyWhenLinear(t) : keys[0].leftValue;
+  }
+  return 1;
+}
+
+double ZvStdFCurveImpl::EvalRightSnapped(double t) const {
+  if (keys.size == 0) return valueWhenNoKeys;
+  double v;
+  const int clear = EvalClearOfKeys(t, v);
+  if (clear > 0) return v;
+  unsigned int i;
+  if (clear < 0 && GetClosestKeyIndexInCenteredInterval(t, kCFCSnapTolerance, i)) {
+    t = keys[i].parameter;
+  }
+  return EvalRightUsingExtrapolationMethod(t);
+}
+
+double ZvStdFCurveImpl::EvalLeftSnapped(double t) const {
+  if (keys.size == 0) return valueWhenNoKeys;
+  double v;
+  const int clear = EvalClearOfKeys(t, v);
+  if (clear > 0) return v;
+  unsigned int i;
+  if (clear < 0 && GetClosestKeyIndexInCenteredInterval(t, kCFCSnapTolerance, i)) {
+    t = keys[i].parameter;
+  }
+  return EvalLeftUsingExtrapolationMethod(t);
 }

@@ -4,36 +4,15 @@
 #include "fcurve/fcurve_lock.h"
 #include "fcurve/std_fcurve_impl.h"
 
-namespace {
-
-// A parameter within the snap tolerance of a key evaluates as on the key. Most parameters lie
-// well away from every key: one hinted search tells, and the exact nearest-key search runs
-// only near a key. The search also leaves the hint where the evaluation will look.
-void SnapToKey(const ZvStdFCurveImpl& s, double& t) {
-  const unsigned int n = s.keys.size;
-  if (n == 0) return;
-  int found;
-  const unsigned int at = s.LocateParameter(t, found);
-  const bool nearBelow = at > 0 && !(t - s.keys[at - 1].parameter > 2.0 * kCFCSnapTolerance);
-  const bool nearAbove = at < n && !(s.keys[at].parameter - t > 2.0 * kCFCSnapTolerance);
-  if (!nearBelow && !nearAbove) return;
-  unsigned int i;
-  if (s.GetClosestKeyIndexInCenteredInterval(t, kCFCSnapTolerance, i)) t = s.keys[i].parameter;
-}
-
-}  // namespace
-
 double ZvStdFCurve::Eval(double parameter, int clamped) const {
   ZvFCurveLockGuard guard(*this);
-  SnapToKey(*m_impl, parameter);
-  const double v = m_impl->EvalRightUsingExtrapolationMethod(parameter);
+  const double v = m_impl->EvalRightSnapped(parameter);
   return clamped ? m_impl->Clamp(v) : v;
 }
 
 double ZvStdFCurve::EvalLeft(double parameter, int clamped) const {
   ZvFCurveLockGuard guard(*this);
-  SnapToKey(*m_impl, parameter);
-  const double v = m_impl->EvalLeftUsingExtrapolationMethod(parameter);
+  const double v = m_impl->EvalLeftSnapped(parameter);
   return clamped ? m_impl->Clamp(v) : v;
 }
 

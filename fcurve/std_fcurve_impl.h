@@ -9,6 +9,9 @@
 #include <zv/std_fcurve.h>
 
 #include "fcurve/cfc_base_impl.h"
+#include "fcurve/cubic_segment.h"
+
+#include <cstdint>
 
 class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<double, CFCStdKey>> {
  public:
@@ -40,6 +43,11 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
   double EvalLeft(double t) const;
   double EvalRightUsingExtrapolationMethod(double t) const;
   double EvalLeftUsingExtrapolationMethod(double t) const;
+  // Snap t to a key within the snap tolerance, then the right-continuous value or the left
+  // limit with extrapolation: the whole of the curve's Eval and EvalLeft but the lock and the
+  // clamp.
+  double EvalRightSnapped(double t) const;
+  double EvalLeftSnapped(double t) const;
   // Brings t into the keyed range for the cycle with offset and counts the periods (two keys or
   // more). The right version sends a whole number of periods to the last key, the left version
   // to the first.
@@ -133,6 +141,32 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
 
  private:
   double EvaluatedRightX(unsigned int i) const;
+  // EvalJustAfterIndex; with `keep` a cubic segment built anew replaces the one kept.
+  double EvalSegment(double t, unsigned int i, bool keep) const;
+  double EvalCubicSegment(double t, unsigned int i, bool keep) const;
+  // Away from every key, one search answers for the snap and for the evaluation, and the side
+  // of the limit does not matter. 1 with the value in v; 0 when t needs no snap but the method
+  // must fold it; -1, with the hint as it was, when t lies near a key and must be snapped
+  // first.
+  int EvalClearOfKeys(double t, double& v) const;
+
+  // The last cubic segment evaluated whose handles are the stored ones, with copies of the
+  // key fields it was built from. It is used only while those fields are the same to the bit,
+  // so no editing path has to know about it; consecutive parameters mostly fall into one
+  // segment, which then skips the setup of its arithmetic.
+  struct PlainSegmentMemo {
+    PlainSegmentMemo() = default;
+    // A copied store starts without: what is kept belongs to the store it was built for.
+    PlainSegmentMemo(const PlainSegmentMemo&) {}
+    PlainSegmentMemo& operator=(const PlainSegmentMemo&) {
+      filled = false;
+      return *this;
+    }
+    bool filled = false;
+    std::uint64_t inputs[8];
+    ZvCubicFunctionSegment segment;
+  };
+  mutable PlainSegmentMemo m_plainSegment;
 };
 
 #endif

@@ -3,46 +3,13 @@
 #include <zv/std_fcurve.h>
 
 #include "core/vec.h"
+#include "fcurve/cubic_segment.h"
 #include "fcurve/std_fcurve_bezier.h"
 
 #include <cmath>
 
 double InvertParamCubic(double x, double x0, double x1, double x2, double x3) {
-  if (x - x0 < 1e-20) return 0.0;
-  if (x3 - x < 1e-20) return 1.0;
-  const double a = 3.0 * x1 + x3 - 3.0 * x2 - x0;
-  const double b = 3.0 * (x0 - 2.0 * x1 + x2);
-  const double c = 3.0 * (x1 - x0);
-  const double d = x0 - x;
-  double u = 0.5;
-  double f = ((a * u + b) * u + c) * u + d;
-  double low = 0.0, high = 1.0;
-  // The bisection halves toward the anchor, the end of the bracket that the root lies toward.
-  double anchor = f < 0.0 ? 1.0 : 0.0;
-  for (int round = 0; round < 100; ++round) {
-    const double slope = (3.0 * a * u + 2.0 * b) * u + c;
-    double step;
-    // Newton only while its step stays inside the bracket.
-    if (((low - u) * slope + f) * ((high - u) * slope + f) < 0.0) {
-      step = f / slope;
-    } else {
-      step = (u - anchor) * 0.5;
-    }
-    u -= step;
-    if (step >= -1e-9 && 1e-9 >= step) break;
-    f = ((a * u + b) * u + c) * u + d;
-    if (std::fabs(f) <= 1e-29) break;
-    if (f >= 0.0) {
-      anchor = low;
-      high = u;
-    } else {
-      anchor = high;
-      low = u;
-    }
-  }
-  if (u < 0.0) u = 0.0;
-  if (u > 1.0) u = 1.0;
-  return u;
+  return ZvCubicXInverse(x0, x1, x2, x3).Solve(x);
 }
 
 namespace {
