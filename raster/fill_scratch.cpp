@@ -31,10 +31,21 @@ void SwapArrays(Array& a, Array& b) {
 // destructible, so it stays readable through the whole thread exit.
 thread_local int tPoolState = 0;
 
+template <class Array>
+std::size_t Bytes(const Array& a) {
+  return std::size_t(a.capacity) * sizeof(a.data[0]);
+}
+
 struct Pool {
   void* blocks[ZvScratch_SlotCount] = {};
+  std::size_t blockBytes = 0;  // capacity of the blocks above
   ZvPoint2dArray points;
   ZvPointTagArray tags;
+  std::size_t PolygonBytes() const { return Bytes(points) + Bytes(tags); }
+  // Whether the pool stays within its budget when blocks of `held` bytes give way to `offered`.
+  bool Affords(std::size_t held, std::size_t offered) const {
+    return blockBytes + PolygonBytes() - held + offered <= kZvScratchKeepBytes;
+  }
   ~Pool() {
     for (void*& block : blocks) {
       Release(block);
@@ -58,6 +69,7 @@ void* ZvScratchTake(ZvScratchSlot slot, std::size_t bytes) {
     void* block = pool->blocks[slot];
     if (block && Capacity(block) >= bytes) {
       pool->blocks[slot] = nullptr;
+      pool->blockBytes -= Capacity(block);
       return block;
     }
   }
@@ -70,18 +82,20 @@ void* ZvScratchTake(ZvScratchSlot slot, std::size_t bytes) {
 void ZvScratchGive(ZvScratchSlot slot, void* block) {
   if (!block) return;
   Pool* pool = ThreadPool();
-  if (!pool || Capacity(block) > kZvScratchKeepBytes) {
+  if (!pool) {
     Release(block);
     return;
   }
-  // The slot keeps the larger of its block and this one.
   void*& kept = pool->blocks[slot];
-  if (kept && Capacity(kept) >= Capacity(block)) {
+  const std::size_t held = kept ? Capacity(kept) : 0, offered = Capacity(block);
+  // The slot keeps the larger of its block and this one, as long as the pool stays in budget.
+  if (offered <= held || !pool->Affords(held, offered)) {
     Release(block);
     return;
   }
   Release(kept);
   kept = block;
+  pool->blockBytes += offered - held;
 }
 
 ZvScratchPolygon::ZvScratchPolygon() {
@@ -96,10 +110,9 @@ ZvScratchPolygon::ZvScratchPolygon() {
 ZvScratchPolygon::~ZvScratchPolygon() {
   Pool* pool = ThreadPool();
   if (!pool) return;
-  const std::size_t bytes =
-      points.capacity * sizeof(points.data[0]) + tags.capacity * sizeof(tags.data[0]);
-  if (bytes > kZvScratchKeepBytes) return;
   // The pool keeps the larger pair; whichever is left here is freed by the arrays' destructors.
-  if (points.capacity > pool->points.capacity) SwapArrays(points, pool->points);
-  if (tags.capacity > pool->tags.capacity) SwapArrays(tags, pool->tags);
+  const std::size_t held = pool->PolygonBytes(), offered = Bytes(points) + Bytes(tags);
+  if (offered <= held || !pool->Affords(held, offered)) return;
+  SwapArrays(points, pool->points);
+  SwapArrays(tags, pool->tags);
 }

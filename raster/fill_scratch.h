@@ -6,7 +6,8 @@
 // thread keeps the blocks of its last fill for the next. A block leaves its thread's pool for
 // the length of a fill: a fill started from another fill's callback on the same thread finds the
 // slot empty and allocates its own, and no block is ever seen by two threads at once. Blocks
-// larger than kZvScratchKeepBytes go back to the system rather than stay with an idle thread.
+// beyond the budget kZvScratchKeepBytes go back to the system rather than stay with an idle
+// thread.
 #ifndef ZV_RASTER_FILL_SCRATCH_H
 #define ZV_RASTER_FILL_SCRATCH_H
 
@@ -15,9 +16,9 @@
 #include <cstddef>
 #include <new>
 
-// A megabyte a slot holds the tables of shapes up to tens of thousands of vertices, which is where
-// fresh memory costs most against the sweep; a thread keeps at most about 13 MB.
-constexpr std::size_t kZvScratchKeepBytes = std::size_t(1) << 20;
+// What one thread keeps in all: enough for the tables of a path of a few hundred thousand
+// vertices (a page of text in one fill), where fresh memory costs as much as the sweep.
+constexpr std::size_t kZvScratchKeepBytes = std::size_t(32) << 20;
 
 enum ZvScratchSlot {
   ZvScratch_Vertices,
