@@ -334,7 +334,7 @@ inline int ZvStdFCurveImpl::EvalClearOfKeys(double t, double& v) const {
   return 1;
 }
 
-double ZvStdFCurveImpl::EvalRightSnapped(double t) const {
+double ZvStdFCurveImpl::EvalSnapped(double t, bool left) const {
   if (keys.size == 0) return valueWhenNoKeys;
   double v;
   const int clear = EvalClearOfKeys(t, v);
@@ -343,17 +343,5 @@ double ZvStdFCurveImpl::EvalRightSnapped(double t) const {
   if (clear < 0 && GetClosestKeyIndexInCenteredInterval(t, kCFCSnapTolerance, i)) {
     t = keys[i].parameter;
   }
-  return EvalRightUsingExtrapolationMethod(t);
-}
-
-double ZvStdFCurveImpl::EvalLeftSnapped(double t) const {
-  if (keys.size == 0) return valueWhenNoKeys;
-  double v;
-  const int clear = EvalClearOfKeys(t, v);
-  if (clear > 0) return v;
-  unsigned int i;
-  if (clear < 0 && GetClosestKeyIndexInCenteredInterval(t, kCFCSnapTolerance, i)) {
-    t = keys[i].parameter;
-  }
-  return EvalLeftUsingExtrapolationMethod(t);
+  return left ? EvalLeftUsingExtrapolationMethod(t) : EvalRightUsingExtrapolationMethod(t);
 }

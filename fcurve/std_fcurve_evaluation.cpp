@@ -6,13 +6,13 @@
 
 double ZvStdFCurve::Eval(double parameter, int clamped) const {
   ZvFCurveLockGuard guard(*this);
-  const double v = m_impl->EvalRightSnapped(parameter);
+  const double v = m_impl->EvalSnapped(parameter, false);
   return clamped ? m_impl->Clamp(v) : v;
 }
 
 double ZvStdFCurve::EvalLeft(double parameter, int clamped) const {
   ZvFCurveLockGuard guard(*this);
-  const double v = m_impl->EvalLeftSnapped(parameter);
+  const double v = m_impl->EvalSnapped(parameter, true);
   return clamped ? m_impl->Clamp(v) : v;
 }
 

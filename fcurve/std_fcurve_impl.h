@@ -43,11 +43,10 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
   double EvalLeft(double t) const;
   double EvalRightUsingExtrapolationMethod(double t) const;
   double EvalLeftUsingExtrapolationMethod(double t) const;
-  // Snap t to a key within the snap tolerance, then the right-continuous value or the left
-  // limit with extrapolation: the whole of the curve's Eval and EvalLeft but the lock and the
-  // clamp.
-  double EvalRightSnapped(double t) const;
-  double EvalLeftSnapped(double t) const;
+  // Snap t to a key within the snap tolerance, then the right-continuous value (or with `left`
+  // the left limit) with extrapolation: the whole of the curve's Eval and EvalLeft but the lock
+  // and the clamp.
+  double EvalSnapped(double t, bool left) const;
   // Brings t into the keyed range for the cycle with offset and counts the periods (two keys or
   // more). The right version sends a whole number of periods to the last key, the left version
   // to the first.

@@ -239,7 +239,7 @@ TEST(StdCurveEvalReference, EvaluationMatchesThePlainPathBitForBit) {
       const bool left = (round + edit) % 2 == 1;
       for (double next : r.Parameters(fast, t)) {
         t = next;
-        const double got = left ? fast.EvalLeftSnapped(t) : fast.EvalRightSnapped(t);
+        const double got = fast.EvalSnapped(t, left);
         const double want = PlainEval(plain, t, left);
         ASSERT_TRUE(SameBits(got, want))
             << "round " << round << " edit " << edit << " left " << left << " method "
