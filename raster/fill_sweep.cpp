@@ -27,7 +27,7 @@ void CFillSweep::TakeVertices(int y) {
     OrderEdges();
     return;
   }
-  InsertionSort(incoming.get(), numIncoming);
+  zvInsertionSort(incoming.get(), numIncoming, After);
   // Written without a branch on the retirement, which follows no pattern: every edge is copied
   // and only a kept one counts. Incoming edges left of a retired one are also left of every
   // later kept one.

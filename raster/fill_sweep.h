@@ -11,6 +11,7 @@
 
 #include "raster/fill_context.h"
 #include "raster/fill_scratch.h"
+#include "raster/insertion_sort.h"
 
 #include <algorithm>
 #include <cmath>
@@ -106,32 +107,15 @@ class CFillSweep {
     edgeEnds[id] = other.y;
   }
 
-  // Edges rarely swap between rows: a stable insertion sort is linear on the usual nearly
+  // Edges rarely swap between rows, so the insertion sort is linear on the usual nearly
   // ordered table.
-  static void InsertionSort(CFillActiveEdge* e, int count) {
-    for (int i = 1; i < count; ++i) {
-      if (CompareActiveEdges(&e[i - 1], &e[i]) < 0) continue;
-      const CFillActiveEdge moving = e[i];
-      int j = i;
-      for (; j > 0 && CompareActiveEdges(&e[j - 1], &moving) > 0; --j)
-        e[j] = e[j - 1];
-      e[j] = moving;
-    }
+  static bool After(const CFillActiveEdge& a, const CFillActiveEdge& b) {
+    return CompareActiveEdges(&a, &b) > 0;
   }
-  // The same on the active table, keeping the slot table up to date.
+  // The active table's order, keeping the slot table up to date.
   void OrderEdges() {
     CFillActiveEdge* e = edges;
-    for (int i = 1; i < numActive; ++i) {
-      if (CompareActiveEdges(&e[i - 1], &e[i]) < 0) continue;
-      const CFillActiveEdge moving = e[i];
-      int j = i;
-      for (; j > 0 && CompareActiveEdges(&e[j - 1], &moving) > 0; --j) {
-        e[j] = e[j - 1];
-        slots[e[j].id] = j;
-      }
-      e[j] = moving;
-      slots[moving.id] = j;
-    }
+    zvInsertionSort(e, numActive, After, [&](int at) { slots[e[at].id] = at; });
   }
 
   // Writes the columns from ceil(xl) to floor(xr), clipped to [leftLimit, rightExclusive). An xr

@@ -6,6 +6,7 @@
 #include "raster/fill_vertex_order.h"
 
 #include "raster/fill_scratch.h"
+#include "raster/insertion_sort.h"
 
 #include <algorithm>
 
@@ -21,14 +22,10 @@ constexpr int kInsertionLimit = 16;
 void SortBucket(CFillSortedVertex* r, int count) {
   if (count > kInsertionLimit) {
     std::sort(r, r + count, Before);
-    return;
-  }
-  for (int i = 1; i < count; ++i) {
-    const CFillSortedVertex moving = r[i];
-    int j = i;
-    for (; j > 0 && Before(moving, r[j - 1]); --j)
-      r[j] = r[j - 1];
-    r[j] = moving;
+  } else {
+    zvInsertionSort(r, count, [](const CFillSortedVertex& a, const CFillSortedVertex& b) {
+      return Before(b, a);
+    });
   }
 }
 }  // namespace
