@@ -174,14 +174,14 @@ double ZvStdFCurveImpl::EvalLeft(double t) const {
   return EvalJustAfterIndex(t, at - 1);
 }
 
-double ZvStdFCurveImpl::CycleOffsetFold(double t, int& cycles, bool left) const {
+double ZvStdFCurveImpl::CycleOffsetFold(double t, double& cycles, bool left) const {
   const unsigned int n = keys.size;
   const double first = keys[0].parameter, last = keys[n - 1].parameter;
   const double period = last - first;
   const double r = (t - first) / period;
   double folded;
   if (left) {
-    cycles = static_cast<int>(std::floor(r));
+    cycles = std::floor(r);
     if (first - t <= 1e-9) {
       const double w = period * (r - std::floor(r));
       folded = std::fabs(w) <= 1e-9 ? first : first + w;
@@ -190,7 +190,7 @@ double ZvStdFCurveImpl::CycleOffsetFold(double t, int& cycles, bool left) const 
       folded = std::fabs(w) <= 1e-9 ? first : last - w;
     }
   } else {
-    cycles = static_cast<int>(std::ceil(r) - 1.0);
+    cycles = std::ceil(r) - 1.0;
     if (t > first) {
       const double w = period * (r - std::floor(r));
       folded = std::fabs(w) <= 1e-9 ? last : first + w;
@@ -230,7 +230,7 @@ double ZvStdFCurveImpl::EvalRightUsingExtrapolationMethod(double t) const {
     }
     case ZvBaseFCurve::CycleWithOffsetExtrapolation: {
       const double delta = keys[n - 1].rightValue - keys[0].rightValue;
-      int cycles = 0;
+      double cycles = 0.0;
       if (n >= 2) t = CycleOffsetFold(t, cycles, false);
       const unsigned int at = LocateParameter(t, found);
       if (found) {
@@ -273,7 +273,7 @@ double ZvStdFCurveImpl::EvalLeftUsingExtrapolationMethod(double t) const {
     case ZvBaseFCurve::CycleWithOffsetExtrapolation: {
       // The offset runs from the first left value here, not from the first right value.
       const double delta = keys[n - 1].rightValue - keys[0].leftValue;
-      int cycles = 0;
+      double cycles = 0.0;
       if (n >= 2) t = CycleOffsetFold(t, cycles, true);
       const unsigned int at = LocateParameter(t, found);
       if (found) {

@@ -242,7 +242,7 @@ unsigned int ZvStdFCurve::ReduceNumKeys(double start, double end, double toleran
   if (n < 2) return 1;
   const double first = s.keys[0].parameter, last = s.keys[n - 1].parameter;
   if (s.extrapolation == CycleExtrapolation || s.extrapolation == CycleWithOffsetExtrapolation) {
-    int startCycle, endCycle;
+    double startCycle, endCycle;
     const double foldedStart = s.CycleOffsetFold(start, startCycle, true);
     const double foldedEnd = s.CycleOffsetFold(end, endCycle, false);
     if (startCycle == endCycle) {

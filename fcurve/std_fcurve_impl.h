@@ -47,10 +47,10 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
   // the left limit) with extrapolation: the whole of the curve's Eval and EvalLeft but the lock
   // and the clamp.
   double EvalSnapped(double t, bool left) const;
-  // Brings t into the keyed range for the cycle with offset and counts the periods (two keys or
+  // Brings t into the keyed range for the cycle methods and counts the periods (two keys or
   // more). The right version sends a whole number of periods to the last key, the left version
   // to the first.
-  double CycleOffsetFold(double t, int& cycles, bool left) const;
+  double CycleOffsetFold(double t, double& cycles, bool left) const;
   double Clamp(double v) const {
     if (v <= minClamp) return minClamp;
     if (v >= maxClamp) return maxClamp;

@@ -17,38 +17,6 @@ constexpr double kMaxSnapShotCycles = 1e5;
 
 using Curve = std::unique_ptr<ZvStdFCurve>;
 
-// The folded start of [lo, hi] in the keyed range [t0, tn] and its period number.
-double FoldStart(double lo, double t0, double tn, double& cycle) {
-  const double period = tn - t0;
-  const double r = (lo - t0) / period;
-  cycle = std::floor(r);
-  double folded;
-  if (t0 - lo <= 1e-9) {
-    const double f = (r - std::floor(r)) * period;
-    folded = std::fabs(f) <= 1e-9 ? t0 : t0 + f;
-  } else {
-    const double f = (std::ceil(r) - r) * period;
-    folded = std::fabs(f) <= 1e-9 ? t0 : tn - f;
-  }
-  return folded < t0 ? t0 : folded > tn ? tn : folded;
-}
-
-// The folded end, a whole number of periods sent to the end of the previous period.
-double FoldEnd(double hi, double t0, double tn, double& cycle) {
-  const double period = tn - t0;
-  const double q = (hi - t0) / period;
-  cycle = std::ceil(q) - 1.0;
-  double folded;
-  if (hi > t0) {
-    const double f = (q - std::floor(q)) * period;
-    folded = std::fabs(f) <= 1e-9 ? tn : t0 + f;
-  } else {
-    const double f = (std::ceil(q) - q) * period;
-    folded = std::fabs(f) <= 1e-9 ? tn : tn - f;
-  }
-  return folded < t0 ? t0 : folded > tn ? tn : folded;
-}
-
 // Moves a snapshot under construction along either axis. Its keys carry the source's locks,
 // which guard the source against edits, not the copies against being put in place.
 void MoveAlong(ZvStdFCurveImpl& s, ZvBaseFCurve& curve, double dx, double dy) {
@@ -94,7 +62,7 @@ ZvBaseFCurve* ZvStdFCurve::SnapShot(double start, double end, ExtrapolationMetho
                                 ? s.keys[n - 1].rightValue - s.keys[0].leftValue
                                 : 0.0;
       double a, b;
-      const double fs = FoldStart(lo, t0, tn, a), fe = FoldEnd(hi, t0, tn, b);
+      const double fs = s.CycleOffsetFold(lo, a, true), fe = s.CycleOffsetFold(hi, b, false);
       if (b - a > kMaxSnapShotCycles) return nullptr;
       const double shift = lo - fs;
       if (a >= b) {

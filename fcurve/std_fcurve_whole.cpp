@@ -105,7 +105,7 @@ unsigned int ZvStdFCurve::ResampleSequence(double start, double end, double step
     return Engine::ResampleKeys(s, start, end, step, keepExistingKeys, *this);
   }
   const double first = s.keys[0].parameter, last = s.keys[n - 1].parameter;
-  int startCycle, endCycle;
+  double startCycle, endCycle;
   const double foldedStart = s.CycleOffsetFold(start, startCycle, true);
   const double foldedEnd = s.CycleOffsetFold(end, endCycle, false);
   if (startCycle == endCycle) {
