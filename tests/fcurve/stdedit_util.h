@@ -66,6 +66,25 @@ inline void ExpectSameShape(const std::vector<double>& a, const std::vector<doub
     EXPECT_NEAR(a[i], b[i], tol) << "sample " << i;
 }
 
+// The key parameters in order, for comparing with a list at once.
+inline std::vector<double> KeyParams(const ZvBaseFCurve& curve) {
+  ZvDoubleArray params;
+  curve.GetAllKeyParameters(params);
+  return std::vector<double>(params.data, params.data + params.size);
+}
+
+// Whether a constraint is on at the key at exactly t.
+inline int HasFlag(const ZvBaseFCurve& curve, double t, C::KeyConstraint constraint) {
+  int on = 0;
+  curve.GetConstraint(t, constraint, on, 0.0);
+  return on;
+}
+
+// Sets a constraint on the key at exactly t.
+inline unsigned int SetFlag(ZvBaseFCurve& curve, double t, C::KeyConstraint constraint, int on) {
+  return curve.SetConstraint(t, constraint, on, 0.0);
+}
+
 // Keys of mixed kinds: a cubic run with continued tangents, a step, a line and a jump.
 inline ZvStdFCurve Mixed() {
   ZvStdFCurve curve;
