@@ -158,7 +158,7 @@ TEST(StdCurveKeys, HandlesAndSegmentKinds) {
 
 TEST(StdCurveKeys, BadInputIsRefusedAndChangesNothing) {
   ZvStdFCurve curve = Wave();
-  const std::vector<double> before = Sample(curve, -1.0, 8.5, 100);
+  const std::string before = stdedit::Dump(curve);
   const double nan = std::nan(""), inf = HUGE_VAL;
   EXPECT_EQ(curve.CreateKey(1.0, nan), 0u);
   EXPECT_EQ(curve.CreateKey(inf, 1.0), 0u);
@@ -176,9 +176,7 @@ TEST(StdCurveKeys, BadInputIsRefusedAndChangesNothing) {
   EXPECT_EQ(curve.SetClampingValues(nan, 1.0), 0u);
   double found;
   EXPECT_EQ(curve.EvalInverse(nan, found, 0), 0u);
-  EXPECT_EQ(curve.GetNumKeys(), 6u);
-  EXPECT_EQ(curve.IsValid(), 1u);
-  ExpectSameShape(before, Sample(curve, -1.0, 8.5, 100), 0.0);
+  EXPECT_EQ(stdedit::Dump(curve), before);
 }
 
 TEST(StdCurveKeys, RandomEditsKeepTheCurveValid) {
