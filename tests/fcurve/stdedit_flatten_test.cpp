@@ -90,18 +90,16 @@ TEST(StdEditFlatten, TransformedPointsMapBackOntoTheCurve) {
 }
 
 TEST(StdEditFlatten, EmptyCurveIsAHorizontalPieceAndOneKeyItsStep) {
-  ZvStdFCurve key(2.0, 1.0, 3.0, C::CubicSegment, C::CubicSegment);
-  Polyline step;
-  ASSERT_EQ(key.Flatten(ZvTransfo4(), 0.1, step.points, step.tags, 0), 1u);
-  ASSERT_EQ(step.points.size, 2u);
-  EXPECT_EQ((V{step.points[0].y, step.points[1].y}), (V{1.0, 3.0}));
-
-  ZvStdFCurve curve(3.5);
-  Polyline out;
-  ASSERT_EQ(curve.Flatten(ZvTransfo4(), 0.1, out.points, out.tags, 0), 1u);
-  ASSERT_EQ(out.points.size, 2u);
-  EXPECT_EQ((V{out.points[0].y, out.points[1].y}), (V{3.5, 3.5}));
-  EXPECT_EQ(out.tags[1], ZvPointTag_Last);
+  const ZvStdFCurve curves[] = {ZvStdFCurve(2.0, 1.0, 3.0, C::CubicSegment, C::CubicSegment),
+                                ZvStdFCurve(3.5)};
+  const V expected[] = {{1.0, 3.0}, {3.5, 3.5}};
+  for (int i = 0; i < 2; ++i) {
+    Polyline out;
+    ASSERT_EQ(curves[i].Flatten(ZvTransfo4(), 0.1, out.points, out.tags, 0), 1u);
+    ASSERT_EQ(out.points.size, 2u);
+    EXPECT_EQ((V{out.points[0].y, out.points[1].y}), expected[i]) << i;
+    EXPECT_EQ(out.tags[1], ZvPointTag_Last);
+  }
 }
 
 TEST(StdEditFlatten, ClampingCutsRunsAtTheLimits) {
