@@ -7,6 +7,7 @@
 
 #include "fcurve/cfc_base_impl.h"
 #include "fcurve/std_fcurve_impl.h"
+#include "stdedit_util.h"
 
 #include <vector>
 
@@ -227,20 +228,15 @@ TEST(KeystoreEdit, RedrawBoxesCoverTheStepsAroundAKey) {
 }
 
 TEST(KeystoreEdit, SmoothingConvolvesThroughTheOwner) {
-  ZvStdFCurve curve(0.0, ZvBaseFCurve::LinearSegment);
-  curve.CreateKey(0.0, 1.0);
-  curve.CreateKey(1.0, 10.0);
+  ZvStdFCurve curve = stdedit::Polyline({{0, 1}, {1, 10}});
   // Two keys and five taps: only the taps around the centre reach a sample.
   const double wide[5] = {1000.0, 1.0, 2.0, 3.0, 1000.0};
   EXPECT_EQ(curve.SmoothSequence(0.0, 1.0, wide, 5), 1u);
   EXPECT_DOUBLE_EQ(curve.Eval(0.0, 0), 2.0 * 1.0 + 3.0 * 10.0);
   EXPECT_DOUBLE_EQ(curve.Eval(1.0, 0), 1.0 * 1.0 + 2.0 * 10.0);
 
-  ZvStdFCurve five(0.0, ZvBaseFCurve::LinearSegment);
-  for (int i = 0; i < 5; ++i)
-    five.CreateKey(i, i * i);
-  double at = 2.0;
-  five.SetConstraint(at, ZvBaseFCurve::ValueLock, 1, 0.0);
+  ZvStdFCurve five = stdedit::Polyline({{0, 0}, {1, 1}, {2, 4}, {3, 9}, {4, 16}});
+  stdedit::SetFlag(five, 2.0, ZvBaseFCurve::ValueLock, 1);
   const double box[3] = {1.0, 1.0, 1.0};
   EXPECT_EQ(five.SmoothSequence(0.0, 4.0, box, 3), 1u);
   EXPECT_DOUBLE_EQ(five.Eval(0.0, 0), 0.0 + 1.0 + 1.0);  // mirrored about the sample itself

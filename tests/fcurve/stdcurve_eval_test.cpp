@@ -6,6 +6,7 @@
 
 #include "fcurve/std_fcurve_bezier.h"
 #include "fcurve/std_fcurve_impl.h"
+#include "stdedit_util.h"
 
 #include <cmath>
 #include <random>
@@ -13,7 +14,8 @@
 
 namespace {
 
-using C = ZvBaseFCurve;
+using stdedit::C;
+using stdedit::Polyline;
 using V = std::vector<double>;
 
 V XY(const ZvPoint2<double>& p) {
@@ -21,14 +23,6 @@ V XY(const ZvPoint2<double>& p) {
 }
 V Corners(const ZvExtent2<double>& box) {
   return {box.xmin, box.ymin, box.xmax, box.ymax};
-}
-
-ZvStdFCurve Polyline(std::initializer_list<std::pair<double, double>> points,
-                     C::FSKind kind = C::LinearSegment) {
-  ZvStdFCurve curve(0.0, kind);
-  for (const auto& p : points)
-    curve.CreateKey(p.first, p.second);
-  return curve;
 }
 
 // A store with keys placed by hand, for the handle rules.

@@ -18,6 +18,7 @@ using stdedit::C;
 using stdedit::ExpectSameShape;
 using stdedit::HasFlag;
 using stdedit::KeyParams;
+using stdedit::Polyline;
 using stdedit::Sample;
 using stdedit::SetFlag;
 
@@ -79,9 +80,7 @@ TEST(StdCurveKeys, KeysBeforeTheFirstTakeOverTheValueLeftOfTheCurve) {
 }
 
 TEST(StdCurveKeys, RemovalKeepsKindsAndValues) {
-  ZvStdFCurve curve(0.0, C::LinearSegment);
-  for (int i = 0; i < 4; ++i)
-    curve.CreateKey(i, i * i);
+  ZvStdFCurve curve = Polyline({{0, 0}, {1, 1}, {2, 4}, {3, 9}});
   EXPECT_EQ(curve.RemoveKey(1.0, 0.0), 1u);
   EXPECT_DOUBLE_EQ(curve.Eval(1.0, 0), 2.0);  // the line from 0 to 4 at 1
   EXPECT_EQ(curve.RemoveKey(0.2, 0.1), 0u);
@@ -96,10 +95,7 @@ TEST(StdCurveKeys, RemovalKeepsKindsAndValues) {
   EXPECT_EQ(curve.GetFirstSegmentKind(), C::LinearSegment);
   EXPECT_EQ(curve.RemoveKey(0.0, 1.0), 1u);  // nothing to remove is no failure
 
-  ZvStdFCurve jump(0.0, C::LinearSegment);
-  jump.CreateKey(0.0, 0.0);
-  jump.CreateKey(1.0, 1.0);
-  jump.CreateKey(2.0, 5.0);
+  ZvStdFCurve jump = Polyline({{0, 0}, {1, 1}, {2, 5}});
   jump.SetKeyValue(1.0, C::RightSide, 3.0, 0.0);
   EXPECT_EQ(jump.RemoveHead(1.0), 1u);  // the head goes; the jump closes on the right value
   EXPECT_EQ(jump.GetNumKeys(), 2u);
@@ -110,9 +106,7 @@ TEST(StdCurveKeys, RemovalKeepsKindsAndValues) {
 }
 
 TEST(StdCurveKeys, MergeReplacesAnIntervalAndKeepsTheNearestFlags) {
-  ZvStdFCurve curve(0.0, C::LinearSegment);
-  for (int i = 0; i < 5; ++i)
-    curve.CreateKey(i, i);
+  ZvStdFCurve curve = Polyline({{0, 0}, {1, 1}, {2, 2}, {3, 3}, {4, 4}});
   SetFlag(curve, 2.0, C::FlatTangent, 1);
   EXPECT_EQ(curve.MergeAndCreateKey(1.5, 3.5, 2.2, 10.0, 0, 0, 1), 1u);
   EXPECT_EQ(KeyParams(curve), (std::vector<double>{0.0, 1.0, 2.2, 4.0}));
@@ -142,9 +136,7 @@ TEST(StdCurveKeys, HandlesAndSegmentKinds) {
 
   // A linear segment turned cubic keeps stored handles that make a function: here flat ones
   // a third of the way in, as appending the keys left them.
-  ZvStdFCurve line(0.0, C::LinearSegment);
-  line.CreateKey(0.0, 0.0);
-  line.CreateKey(3.0, 3.0);
+  ZvStdFCurve line = Polyline({{0, 0}, {3, 3}});
   EXPECT_EQ(line.SetSegmentKind(0.0, C::RightSide, C::CubicSegment, 0.0), 1u);
   EXPECT_EQ(line.IsValid(), 1u);
   C::FSKind kind;
@@ -245,9 +237,7 @@ TEST(StdCurveKeys, CopiesAreIndependent) {
 }
 
 TEST(StdCurveKeys, KeyQueries) {
-  ZvStdFCurve curve(0.0, C::LinearSegment);
-  for (int i = 0; i < 4; ++i)
-    curve.CreateKey(i, 10 * i);
+  ZvStdFCurve curve = Polyline({{0, 0}, {1, 10}, {2, 20}, {3, 30}});
   double p = -1;
   EXPECT_EQ(curve.GetNearestKeyParameter(1.5, p), 1u);
   EXPECT_EQ(p, 2.0);  // midway: the later key

@@ -17,6 +17,7 @@ using stdedit::C;
 using stdedit::Dump;
 using stdedit::ExpectSameShape;
 using stdedit::KeyParams;
+using stdedit::Polyline;
 using stdedit::Sample;
 using stdedit::SetFlag;
 using V = std::vector<double>;
@@ -70,9 +71,7 @@ TEST(StdEditWhole, RefusedCutsAndPastesChangeNothing) {
 }
 
 TEST(StdEditWhole, PasteReplacesAnInterval) {
-  ZvStdFCurve curve(0.0, C::LinearSegment);
-  curve.CreateKey(0.0, 0.0);
-  curve.CreateKey(10.0, 10.0);
+  ZvStdFCurve curve = Polyline({{0, 0}, {10, 10}});
   const ZvStdFCurve bump({0, 0}, {1, 3}, {2, 3}, {3, 0});
   ASSERT_EQ(curve.Paste(bump, 2.0, 6.0), 1u);  // 4 units out, 3 in: the tail moves left by 1
   EXPECT_EQ(curve.IsValid(), 1u);
@@ -83,13 +82,8 @@ TEST(StdEditWhole, PasteReplacesAnInterval) {
 }
 
 TEST(StdEditWhole, AppendStartsAtTheLastKey) {
-  ZvStdFCurve curve(0.0, C::LinearSegment);
-  curve.CreateKey(0.0, 0.0);
-  curve.CreateKey(1.0, 1.0);
-  ZvStdFCurve tail(0.0, C::LinearSegment);
-  tail.CreateKey(5.0, 2.0);
-  tail.CreateKey(6.0, 3.0);
-  tail.CreateKey(8.0, 0.0);
+  ZvStdFCurve curve = Polyline({{0, 0}, {1, 1}});
+  ZvStdFCurve tail = Polyline({{5, 2}, {6, 3}, {8, 0}});
   Tag(tail, 6.0, 3);
   ASSERT_EQ(curve.Append(tail), 1u);
   EXPECT_EQ(KeyParams(curve), (V{0.0, 1.0, 2.0, 4.0}));
@@ -164,9 +158,17 @@ TEST(StdEditWhole, SnapShotMatchesTheCurveOnItsInterval) {
 }
 
 TEST(StdEditWhole, ReduceThinsLinesAndRefitsCubics) {
-  ZvStdFCurve lines(0.0, C::LinearSegment);
-  for (int i = 0; i <= 10; ++i)
-    lines.CreateKey(i, i < 6 ? 2.0 * i : 10.0);
+  ZvStdFCurve lines = Polyline({{0, 0},
+                                {1, 2},
+                                {2, 4},
+                                {3, 6},
+                                {4, 8},
+                                {5, 10},
+                                {6, 10},
+                                {7, 10},
+                                {8, 10},
+                                {9, 10},
+                                {10, 10}});
   ASSERT_EQ(lines.ReduceNumKeys(0.0, 10.0, 0.0), 1u);
   EXPECT_EQ(lines.GetNumKeys(), 3u);  // the corner at 5 stays
   EXPECT_EQ(lines.Eval(2.5, 0), 5.0);
