@@ -87,6 +87,7 @@ TEST(StdCurveEval, ExtrapolationMethods) {
   EXPECT_DOUBLE_EQ(ramp.Eval(2.0, 0), 2.0);
   EXPECT_DOUBLE_EQ(ramp.EvalLeft(2.0, 0), 2.0);
   EXPECT_DOUBLE_EQ(ramp.EvalLeft(-1.0, 0), -1.0);
+  EXPECT_DOUBLE_EQ(ramp.EvalLeft(1.75, 0), 1.75);
 }
 
 TEST(StdCurveEval, DiscontinuityAndSnapping) {
