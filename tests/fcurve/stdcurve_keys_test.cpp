@@ -168,6 +168,7 @@ TEST(StdCurveKeys, BadInputIsRefusedAndChangesNothing) {
   EXPECT_EQ(curve.SetClampingValues(nan, 1.0), 0u);
   double found;
   EXPECT_EQ(curve.EvalInverse(nan, found, 0), 0u);
+  EXPECT_EQ(curve.GetFCurveInfo(nullptr), 0u);
   EXPECT_EQ(stdedit::Dump(curve), before);
 }
 
