@@ -160,12 +160,7 @@ TEST(BaseFCurve, WholeKeySetsAndCopies) {
 }
 
 TEST(BaseFCurve, HasKeyUserDataNeedsAKey) {
-  TestFCurve curve({1.0});
-  double t = 1.0;
-  curve.SetKeyUserData(t, MakeUID(1), Bytes("a"), 1, 0.0);
-  EXPECT_EQ(curve.HasUserData(1.0), 1u);
-  curve.RemoveKey(1.0, 0.0);  // removes the key's set too
-  EXPECT_EQ(curve.GetUserDataSet(1.0), nullptr);
+  TestFCurve curve;
   CFCUserDataSet set;
   set.SetUserData(MakeUID(1), Bytes("a"), 1);
   curve.SetUserDataSet(set, 1.0);

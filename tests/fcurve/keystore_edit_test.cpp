@@ -7,6 +7,9 @@
 
 #include "fcurve/cfc_base_impl.h"
 #include "fcurve/std_fcurve_impl.h"
+#include "stdedit_util.h"
+
+#include <vector>
 
 namespace {
 
@@ -28,6 +31,17 @@ struct Owner {
   bool HasTag(double parameter) const { return curve.GetUserDataSet(parameter) != nullptr; }
 };
 
+// The parameters of a store's keys in order.
+template <class Store>
+std::vector<double> Params(const Store& s) {
+  std::vector<double> out;
+  for (unsigned int i = 0; i < s.keys.size; ++i)
+    out.push_back(s.keys[i].parameter);
+  return out;
+}
+
+using V = std::vector<double>;
+
 IntStore MakeInts(std::initializer_list<std::pair<double, int>> keys) {
   IntStore s;
   unsigned int i = 0;
@@ -43,11 +57,10 @@ TEST(KeystoreEdit, CreateKeyKeepsTheValueBeforeTheFirstKey) {
   EXPECT_EQ(s.valueWhenNoKeys, 5);
   EXPECT_EQ(s.valueBeforeFirstKey, 5);
   EXPECT_EQ(s.CreateKey(1.0, 3, owner.curve), 1);  // before the first key
-  EXPECT_EQ(s.keys[0].parameter, 1.0);
   EXPECT_EQ(s.valueBeforeFirstKey, 3);
   EXPECT_EQ(s.CreateKey(4.0, 9, owner.curve), 1);
   EXPECT_EQ(s.CreateKey(3.0, 7, owner.curve), 1);
-  ASSERT_EQ(s.keys.size, 4u);
+  ASSERT_EQ(Params(s), (V{1.0, 2.0, 3.0, 4.0}));
   EXPECT_EQ(s.keys[2].value, 7);
   EXPECT_EQ(s.flags.size, 4u);
   s.SetConstraint(2, ZvBaseFCurve::ValueLock, 1);
@@ -107,8 +120,7 @@ TEST(KeystoreEdit, MergeKeepsTheNearestKeysAttributes) {
   s.SetConstraint(1, ZvBaseFCurve::ParameterLock, 1);
   owner.Tag(2.0, 42);
   EXPECT_EQ(s.MergeAndCreateKey(1.5, 3.5, 2.4, 9, owner.curve, 0, 0, 1), 1);
-  ASSERT_EQ(s.keys.size, 3u);
-  EXPECT_EQ(s.keys[1].parameter, 2.4);
+  ASSERT_EQ(Params(s), (V{1.0, 2.4, 4.0}));
   EXPECT_EQ(s.keys[1].value, 9);
   EXPECT_EQ(s.GetKeyFlags(1), CFCFlag_ParameterLock);
   EXPECT_TRUE(owner.HasTag(2.4));
@@ -117,26 +129,22 @@ TEST(KeystoreEdit, MergeKeepsTheNearestKeysAttributes) {
   // Without attributes the new key starts clean; an interval reaching past the first key
   // replaces the head.
   EXPECT_EQ(s.MergeAndCreateKey(0.0, 2.5, 0.5, 7, owner.curve, 0, 0, 0), 1);
-  ASSERT_EQ(s.keys.size, 2u);
-  EXPECT_EQ(s.keys[0].parameter, 0.5);
+  ASSERT_EQ(Params(s), (V{0.5, 4.0}));
   EXPECT_EQ(s.GetKeyFlags(0), 0);
   EXPECT_EQ(s.valueBeforeFirstKey, 7);
   // One key inside, on the parameter: a plain value change.
   EXPECT_EQ(s.MergeAndCreateKey(3.0, 5.0, 4.0, 8, owner.curve, 0, 0, 1), 1);
-  ASSERT_EQ(s.keys.size, 2u);
+  ASSERT_EQ(Params(s), (V{0.5, 4.0}));
   EXPECT_EQ(s.keys[1].value, 8);
 }
 
 TEST(KeystoreEdit, CutClosesTheGap) {
   Owner owner;
   IntStore s = MakeInts({{0.0, 10}, {1.0, 20}, {2.0, 30}, {3.0, 40}});
+  IntStore locked = s;
   EXPECT_EQ(s.Cut(1.0, 2.0, owner.curve), 1);
-  ASSERT_EQ(s.keys.size, 3u);
-  EXPECT_EQ(s.keys[1].parameter, 1.0);
+  ASSERT_EQ(Params(s), (V{0.0, 1.0, 2.0}));
   EXPECT_EQ(s.keys[1].value, 30);
-  EXPECT_EQ(s.keys[2].parameter, 2.0);
-
-  IntStore locked = MakeInts({{0.0, 10}, {1.0, 20}, {2.0, 30}, {3.0, 40}});
   locked.SetConstraint(1, ZvBaseFCurve::ValueLock, 1);
   EXPECT_EQ(locked.Cut(1.0, 2.0, owner.curve), 0);
 }
@@ -146,8 +154,7 @@ TEST(KeystoreEdit, TranslationAsksForUserDataByIndex) {
   IntStore s = MakeInts({{0.0, 0}, {5.0, 1}, {10.0, 2}, {15.0, 3}});
   owner.Tag(5.0, 1);  // at key 1's parameter: does not follow, no data sits at 1.0
   EXPECT_EQ(s.TranslateParamsAfterExistingKey(0, 6.0, 1.0, owner.curve), 1);
-  EXPECT_EQ(s.keys[1].parameter, 6.0);
-  EXPECT_EQ(s.keys[3].parameter, 16.0);
+  EXPECT_EQ(Params(s), (V{0.0, 6.0, 11.0, 16.0}));
   EXPECT_TRUE(owner.HasTag(5.0));
   EXPECT_FALSE(owner.HasTag(6.0));
 
@@ -155,9 +162,7 @@ TEST(KeystoreEdit, TranslationAsksForUserDataByIndex) {
   IntStore stuck = MakeInts({{0.0, 0}, {1.0, 1}, {2.0, 2}, {3.0, 3}});
   stuck.SetConstraint(3, ZvBaseFCurve::ParameterLock, 1);
   EXPECT_EQ(stuck.TranslateParamsAfterExistingKey(0, 1.5, 1.5, owner.curve), 0);
-  EXPECT_EQ(stuck.keys[1].parameter, 1.5);
-  EXPECT_EQ(stuck.keys[2].parameter, 3.5);
-  EXPECT_EQ(stuck.keys[3].parameter, 3.0);
+  EXPECT_EQ(Params(stuck), (V{0.0, 1.5, 3.5, 3.0}));
 }
 
 TEST(KeystoreEdit, ReduceDropsRepeatedUnlockedValues) {
@@ -166,11 +171,8 @@ TEST(KeystoreEdit, ReduceDropsRepeatedUnlockedValues) {
   s.SetConstraint(2, ZvBaseFCurve::ParameterLock, 1);
   owner.Tag(1.0, 5);
   EXPECT_EQ(s.ReduceNumKeys(0, 5, 0.0, owner.curve), 2u);
-  ASSERT_EQ(s.keys.size, 4u);
-  EXPECT_EQ(s.keys[1].parameter, 2.0);
+  ASSERT_EQ(Params(s), (V{0.0, 2.0, 3.0, 5.0}));
   EXPECT_EQ(s.GetKeyFlags(1), CFCFlag_ParameterLock);  // flags travel with their keys
-  EXPECT_EQ(s.keys[2].parameter, 3.0);
-  EXPECT_EQ(s.keys[3].parameter, 5.0);
   EXPECT_FALSE(owner.HasTag(1.0));
   IntStore two = MakeInts({{0, 1}, {1, 1}});
   EXPECT_EQ(two.ReduceNumKeys(0, 1, 0.0, owner.curve), 0u);
@@ -185,10 +187,7 @@ TEST(KeystoreEdit, RawAndStandardStoresThinAlongLines) {
   // Keys 1, 2 and 3 lie on the line from key 0 within 0.1; key 4 too, but key 5 leaves it,
   // so key 4 stays and the line restarts there.
   EXPECT_EQ(raw.ReduceNumKeys(0, 6, 0.1, owner.curve), 3u);
-  ASSERT_EQ(raw.keys.size, 4u);
-  EXPECT_EQ(raw.keys[1].parameter, 4.0);
-  EXPECT_EQ(raw.keys[2].parameter, 5.0);
-  EXPECT_EQ(raw.keys[3].parameter, 6.0);
+  EXPECT_EQ(Params(raw), (V{0.0, 4.0, 5.0, 6.0}));
 
   ZvStdFCurveImpl line(0.0, ZvBaseFCurve::LinearSegment);
   for (unsigned int i = 0; i < 5; ++i) {
@@ -198,25 +197,19 @@ TEST(KeystoreEdit, RawAndStandardStoresThinAlongLines) {
   line.SetConstraint(1, ZvBaseFCurve::ValueLock, 1);
   line.keys[3].segmentKind = ZvBaseFCurve::CubicSegment;      // key 3 starts a cubic: it stays
   EXPECT_EQ(line.ReduceNumKeys(0, 4, 0.0, owner.curve), 1u);  // only key 2 goes
-  ASSERT_EQ(line.keys.size, 4u);
-  EXPECT_EQ(line.keys[1].parameter, 1.0);
-  EXPECT_EQ(line.keys[2].parameter, 3.0);
+  EXPECT_EQ(Params(line), (V{0.0, 1.0, 3.0, 4.0}));
 }
 
 TEST(KeystoreEdit, ResampleWithALongStepKeepsOnlyTheEnds) {
   Owner owner;
   IntStore s = MakeInts({{0.0, 10}, {1.0, 20}, {2.0, 30}});
   EXPECT_EQ(IntStore::ResampleKeys(s, 0.5, 1.5, 5.0, 0, owner.curve), 1);
-  ASSERT_EQ(s.keys.size, 4u);
-  EXPECT_EQ(s.keys[1].parameter, 0.5);
-  EXPECT_EQ(s.keys[2].parameter, 1.5);
+  ASSERT_EQ(Params(s), (V{0.0, 0.5, 1.5, 2.0}));
   EXPECT_EQ(s.keys[2].value, 20);
 
   IntStore grid = MakeInts({{0.0, 1}, {0.3, 2}, {1.0, 3}});
   EXPECT_EQ(IntStore::ResampleKeys(grid, 0.0, 1.0, 0.25, 0, owner.curve), 1);
-  ASSERT_EQ(grid.keys.size, 5u);
-  for (unsigned int i = 0; i < 5; ++i)
-    EXPECT_DOUBLE_EQ(grid.keys[i].parameter, 0.25 * i);
+  ASSERT_EQ(Params(grid), (V{0.0, 0.25, 0.5, 0.75, 1.0}));
   EXPECT_EQ(grid.keys[1].value, 1);
   EXPECT_EQ(grid.keys[2].value, 2);  // the step of the removed key at 0.3
 }
@@ -226,33 +219,24 @@ TEST(KeystoreEdit, RedrawBoxesCoverTheStepsAroundAKey) {
   s.valueBeforeFirstKey = -2;
   ZvExtent2<double> box;
   ASSERT_EQ(s.ComputeKeyExtent(1, box), 1);
-  EXPECT_EQ(box.xmin, 0.0);
-  EXPECT_EQ(box.xmax, 3.0);
-  EXPECT_EQ(box.ymin, 1.0);
-  EXPECT_EQ(box.ymax, 8.0);
+  EXPECT_EQ((V{box.xmin, box.ymin, box.xmax, box.ymax}), (V{0.0, 1.0, 3.0, 8.0}));
   ASSERT_EQ(s.ComputeNeighboringKeysExtent(-1.0, box), 1);
   EXPECT_EQ(box.ymin, -2.0);  // the step into the first key
   ASSERT_EQ(s.ComputeNeighboringKeysExtent(2.5, box), 1);
-  EXPECT_EQ(box.xmin, 0.0);
-  EXPECT_EQ(box.xmax, 3.0);
+  EXPECT_EQ((V{box.xmin, box.xmax}), (V{0.0, 3.0}));
   EXPECT_EQ(s.ComputeKeyExtent(3, box), 0);
 }
 
 TEST(KeystoreEdit, SmoothingConvolvesThroughTheOwner) {
-  ZvStdFCurve curve(0.0, ZvBaseFCurve::LinearSegment);
-  curve.CreateKey(0.0, 1.0);
-  curve.CreateKey(1.0, 10.0);
+  ZvStdFCurve curve = stdedit::Polyline({{0, 1}, {1, 10}});
   // Two keys and five taps: only the taps around the centre reach a sample.
   const double wide[5] = {1000.0, 1.0, 2.0, 3.0, 1000.0};
   EXPECT_EQ(curve.SmoothSequence(0.0, 1.0, wide, 5), 1u);
   EXPECT_DOUBLE_EQ(curve.Eval(0.0, 0), 2.0 * 1.0 + 3.0 * 10.0);
   EXPECT_DOUBLE_EQ(curve.Eval(1.0, 0), 1.0 * 1.0 + 2.0 * 10.0);
 
-  ZvStdFCurve five(0.0, ZvBaseFCurve::LinearSegment);
-  for (int i = 0; i < 5; ++i)
-    five.CreateKey(i, i * i);
-  double at = 2.0;
-  five.SetConstraint(at, ZvBaseFCurve::ValueLock, 1, 0.0);
+  ZvStdFCurve five = stdedit::Polyline({{0, 0}, {1, 1}, {2, 4}, {3, 9}, {4, 16}});
+  stdedit::SetFlag(five, 2.0, ZvBaseFCurve::ValueLock, 1);
   const double box[3] = {1.0, 1.0, 1.0};
   EXPECT_EQ(five.SmoothSequence(0.0, 4.0, box, 3), 1u);
   EXPECT_DOUBLE_EQ(five.Eval(0.0, 0), 0.0 + 1.0 + 1.0);  // mirrored about the sample itself

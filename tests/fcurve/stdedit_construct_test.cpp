@@ -112,23 +112,16 @@ TEST(StdEditConstruct, CubicFitIsSmoothAndWithinTheTolerance) {
 
 TEST(StdEditConstruct, PartOfACurve) {
   ZvStdFCurve curve = stdedit::Mixed();
-  for (double t : {1.5, 3.0}) {
-    double at = t;
-    curve.SetConstraint(at, C::AutoTangent, 1, 0.0);
-  }
-  double at = 0.0;
-  curve.SetConstraint(at, C::WholeKeyLock, 1, 0.0);
-  at = 4.5;
+  for (double t : {1.5, 3.0})
+    stdedit::SetFlag(curve, t, C::AutoTangent, 1);
+  stdedit::SetFlag(curve, 0.0, C::WholeKeyLock, 1);
+  double at = 4.5;
   curve.SetKeyUserData(at, MakeUID(2), Bytes("d"), 1, 0.0);
   curve.SetReadOnlyConstraint(1);
   const ZvStdFCurve part(curve, 2.0, 7.5);
   EXPECT_EQ(part.IsValid(), 1u);
   EXPECT_EQ(part.IsReadOnly(), 1u);
-  double first, last;
-  part.GetSmallestKeyParameter(first);
-  part.GetLargestKeyParameter(last);
-  EXPECT_EQ(first, 2.0);
-  EXPECT_EQ(last, 7.5);
+  EXPECT_EQ(stdedit::KeyParams(part), (std::vector<double>{2.0, 3.0, 4.5, 6.0, 7.0, 7.5}));
   for (double t = 2.0; t < 7.5; t += 0.01)
     EXPECT_NEAR(part.Eval(t, 0), curve.Eval(t, 0), 1e-9) << t;
   EXPECT_EQ(part.HasUserData(4.5), 1u);

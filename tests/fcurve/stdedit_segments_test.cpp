@@ -11,6 +11,8 @@ namespace {
 
 using stdedit::C;
 using stdedit::Dump;
+using stdedit::KeyParams;
+using V = std::vector<double>;
 
 TEST(StdEditSegments, KindsByIndexAndParameter) {
   ZvStdFCurve curve = stdedit::Mixed();
@@ -84,23 +86,17 @@ TEST(StdEditSegments, ExtendingALineMovesItsLastKey) {
   double at = 1.0;
   curve.SetKeyUserData(at, MakeUID(1), Bytes("k"), 1, 0.0);
   ASSERT_EQ(curve.AppendOrExtendLinearSegment({2.0, 4.05}, 0.1), 1u);
-  ASSERT_EQ(curve.GetNumKeys(), 2u);
-  double last;
-  curve.GetLargestKeyParameter(last);
-  EXPECT_EQ(last, 2.0);
+  EXPECT_EQ(KeyParams(curve), (V{0.0, 2.0}));
   EXPECT_EQ(curve.Eval(2.0, 0), 4.0);  // on the line, not at the point
   EXPECT_EQ(curve.HasUserData(2.0), 1u);
   EXPECT_EQ(curve.HasUserData(1.0), 0u);
   // Off the line: a new key.
   ASSERT_EQ(curve.AppendOrExtendLinearSegment({3.0, 0.0}, 0.1), 1u);
-  EXPECT_EQ(curve.GetNumKeys(), 3u);
+  EXPECT_EQ(KeyParams(curve), (V{0.0, 2.0, 3.0}));
   // A parameter-locked last key stays, and that is still a success.
-  at = 3.0;
-  curve.SetConstraint(at, C::ParameterLock, 1, 0.0);
+  stdedit::SetFlag(curve, 3.0, C::ParameterLock, 1);
   ASSERT_EQ(curve.AppendOrExtendLinearSegment({4.0, -4.0}, 0.1), 1u);
-  EXPECT_EQ(curve.GetNumKeys(), 3u);
-  curve.GetLargestKeyParameter(last);
-  EXPECT_EQ(last, 3.0);
+  EXPECT_EQ(KeyParams(curve), (V{0.0, 2.0, 3.0}));
   EXPECT_EQ(curve.Eval(3.0, 0), -4.0);  // the value moved, the key did not
 }
 

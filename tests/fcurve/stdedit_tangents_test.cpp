@@ -10,6 +10,8 @@ namespace {
 
 using stdedit::C;
 using stdedit::Dump;
+using stdedit::HasFlag;
+using stdedit::SetFlag;
 
 // Three cubic keys; the middle one has a kink.
 ZvStdFCurve Kinked() {
@@ -45,8 +47,7 @@ TEST(StdEditTangents, ContinuityNeedsCollinearHandlesBetweenCubics) {
 
   // Locked tangents and read-only curves refuse.
   ZvStdFCurve locked = Kinked();
-  at = 3.0;
-  locked.SetConstraint(at, C::TangentDirectionLock, 1, 0.0);
+  SetFlag(locked, 3.0, C::TangentDirectionLock, 1);
   EXPECT_EQ(locked.UnifyAndLockTangentContinuity(at, C::LeftSide, 0.0), 0u);
   locked.SetReadOnlyConstraint(1);
   const std::string before = Dump(locked);
@@ -78,37 +79,26 @@ TEST(StdEditTangents, LengthContinuityComparesVisualLengths) {
 
 TEST(StdEditTangents, FreezingKeepsTheShapeAndDropsAutomaticHandles) {
   ZvStdFCurve curve = stdedit::Mixed();
-  for (double t : {1.5, 3.0, 4.5}) {
-    double at = t;
-    curve.SetConstraint(at, C::AutoTangent, 1, 0.0);
-  }
-  double at = 6.0;
-  curve.SetConstraint(at, C::FlatTangent, 1, 0.0);
+  for (double t : {1.5, 3.0, 4.5})
+    SetFlag(curve, t, C::AutoTangent, 1);
+  SetFlag(curve, 6.0, C::FlatTangent, 1);
   const std::vector<double> before = stdedit::Sample(curve, -1.0, 10.0, 500);
   ASSERT_EQ(curve.FreezeTangentsInInterval(1.5, 4.5, 0, 0, C::AutoTangent), 1u);
   stdedit::ExpectSameShape(before, stdedit::Sample(curve, -1.0, 10.0, 500), 1e-12);
-  for (double t : {1.5, 3.0, 4.5}) {
-    int on = 1;
-    double p = t;
-    curve.GetConstraint(p, C::AutoTangent, on, 0.0);
-    EXPECT_EQ(on, 0) << t;
-  }
+  for (double t : {1.5, 3.0, 4.5})
+    EXPECT_EQ(HasFlag(curve, t, C::AutoTangent), 0) << t;
   // Freezing the flat key without clearing its flag keeps the flag; then clearing it through
   // FreezeAll keeps the shape too.
   ASSERT_EQ(curve.FreezeAllTangents(C::FlatTangent), 1u);
   stdedit::ExpectSameShape(before, stdedit::Sample(curve, -1.0, 10.0, 500), 1e-12);
-  int on = 1;
-  at = 6.0;
-  curve.GetConstraint(at, C::FlatTangent, on, 0.0);
-  EXPECT_EQ(on, 0);
+  EXPECT_EQ(HasFlag(curve, 6.0, C::FlatTangent), 0);
   ZvStdFCurve empty;
   EXPECT_EQ(empty.FreezeAllTangents(C::AutoTangent), 0u);
 }
 
 TEST(StdEditTangents, ExcludedEndsFreezeOnlyTheInwardHandle) {
   ZvStdFCurve curve = stdedit::Mixed();
-  double at = 3.0;
-  curve.SetConstraint(at, C::AutoTangent, 1, 0.0);
+  SetFlag(curve, 3.0, C::AutoTangent, 1);
   ZvPoint2<double> leftBefore, rightBefore, left, right;
   curve.GetActualKeyTgtHandles(3.0, leftBefore, rightBefore, 0.0);
   ZvPoint2<double> evalLeft, evalRight;
@@ -123,10 +113,8 @@ TEST(StdEditTangents, ExcludedEndsFreezeOnlyTheInwardHandle) {
 
 TEST(StdEditTangents, AdjustingAutomaticNeighboursKeepsTheirShape) {
   ZvStdFCurve curve = stdedit::Mixed();
-  for (double t : {1.5, 3.0, 4.5}) {
-    double at = t;
-    curve.SetConstraint(at, C::AutoTangent, 1, 0.0);
-  }
+  for (double t : {1.5, 3.0, 4.5})
+    SetFlag(curve, t, C::AutoTangent, 1);
   const std::vector<double> before = stdedit::Sample(curve, 0.0, 6.0, 300);
   ASSERT_EQ(curve.AdjustAdjacentAutomaticKeysTangents(3.0), 1u);
   ZvPoint2<double> actualL, actualR, evalL, evalR;
@@ -134,11 +122,8 @@ TEST(StdEditTangents, AdjustingAutomaticNeighboursKeepsTheirShape) {
     curve.GetActualKeyTgtHandles(t, actualL, actualR, 0.0);
     curve.GetEvaluatedKeyTgtHandles(t, evalL, evalR, 0.0);
     EXPECT_NEAR(actualR.y, evalR.y, 1e-12) << t;
-    double at = t;
-    int on = 0;
-    curve.GetConstraint(at, C::AutoTangent, on, 0.0);
-    EXPECT_EQ(on, 1);
-    curve.SetConstraint(at, C::AutoTangent, 0, 0.0);
+    EXPECT_EQ(HasFlag(curve, t, C::AutoTangent), 1) << t;
+    SetFlag(curve, t, C::AutoTangent, 0);
   }
   // With the flags gone the shape stays.
   stdedit::ExpectSameShape(before, stdedit::Sample(curve, 0.0, 6.0, 300), 1e-12);

@@ -9,7 +9,9 @@
 #include <zv/std_fcurve.h>
 
 #include <cstdio>
+#include <initializer_list>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace stdedit {
@@ -64,6 +66,34 @@ inline void ExpectSameShape(const std::vector<double>& a, const std::vector<doub
   ASSERT_EQ(a.size(), b.size());
   for (size_t i = 0; i < a.size(); ++i)
     EXPECT_NEAR(a[i], b[i], tol) << "sample " << i;
+}
+
+// Keys through the points, every segment of one kind.
+inline ZvStdFCurve Polyline(std::initializer_list<std::pair<double, double>> points,
+                            C::FSKind kind = C::LinearSegment) {
+  ZvStdFCurve curve(0.0, kind);
+  for (const auto& p : points)
+    curve.CreateKey(p.first, p.second);
+  return curve;
+}
+
+// The key parameters in order, for comparing with a list at once.
+inline std::vector<double> KeyParams(const ZvBaseFCurve& curve) {
+  ZvDoubleArray params;
+  curve.GetAllKeyParameters(params);
+  return std::vector<double>(params.data, params.data + params.size);
+}
+
+// Whether a constraint is on at the key at exactly t.
+inline int HasFlag(const ZvBaseFCurve& curve, double t, C::KeyConstraint constraint) {
+  int on = 0;
+  curve.GetConstraint(t, constraint, on, 0.0);
+  return on;
+}
+
+// Sets a constraint on the key at exactly t.
+inline unsigned int SetFlag(ZvBaseFCurve& curve, double t, C::KeyConstraint constraint, int on) {
+  return curve.SetConstraint(t, constraint, on, 0.0);
 }
 
 // Keys of mixed kinds: a cubic run with continued tangents, a step, a line and a jump.

@@ -7,6 +7,7 @@
 #include "stdedit_util.h"
 #include "uid.h"
 
+#include <algorithm>
 #include <cmath>
 #include <memory>
 
@@ -15,7 +16,11 @@ namespace {
 using stdedit::C;
 using stdedit::Dump;
 using stdedit::ExpectSameShape;
+using stdedit::KeyParams;
+using stdedit::Polyline;
 using stdedit::Sample;
+using stdedit::SetFlag;
+using V = std::vector<double>;
 
 void Tag(ZvStdFCurve& curve, double t, unsigned int id) {
   curve.SetKeyUserData(t, MakeUID(id), Bytes("x"), 1, 0.0);
@@ -30,11 +35,7 @@ TEST(StdEditWhole, CutClosesTheGapAndPasteRestoresIt) {
   ASSERT_EQ(curve.Cut(2.2, 5.2, piece), 1u);
   EXPECT_EQ(curve.IsValid(), 1u);
   EXPECT_EQ(piece.IsValid(), 1u);
-  double first, last;
-  piece.GetSmallestKeyParameter(first);
-  piece.GetLargestKeyParameter(last);
-  EXPECT_EQ(first, 2.2);
-  EXPECT_EQ(last, 5.2);
+  EXPECT_EQ(KeyParams(piece), (V{2.2, 3.0, 4.5, 5.2}));
   EXPECT_EQ(piece.HasUserData(3.0), 1u);  // the cut key's data went with it
   EXPECT_EQ(curve.HasUserData(4.0), 1u);  // the data of 7 moved left with its key
   // The curve after the cut is the old one shifted left by the width.
@@ -51,8 +52,7 @@ TEST(StdEditWhole, CutClosesTheGapAndPasteRestoresIt) {
 
 TEST(StdEditWhole, RefusedCutsAndPastesChangeNothing) {
   ZvStdFCurve curve = stdedit::Mixed();
-  double at = 7.0;
-  curve.SetConstraint(at, C::ParameterLock, 1, 0.0);
+  SetFlag(curve, 7.0, C::ParameterLock, 1);
   const std::string before = Dump(curve);
   ZvStdFCurve piece;
   EXPECT_EQ(curve.Cut(6.5, 7.5, piece), 0u);  // a locked key inside
@@ -71,35 +71,22 @@ TEST(StdEditWhole, RefusedCutsAndPastesChangeNothing) {
 }
 
 TEST(StdEditWhole, PasteReplacesAnInterval) {
-  ZvStdFCurve curve(0.0, C::LinearSegment);
-  curve.CreateKey(0.0, 0.0);
-  curve.CreateKey(10.0, 10.0);
+  ZvStdFCurve curve = Polyline({{0, 0}, {10, 10}});
   const ZvStdFCurve bump({0, 0}, {1, 3}, {2, 3}, {3, 0});
   ASSERT_EQ(curve.Paste(bump, 2.0, 6.0), 1u);  // 4 units out, 3 in: the tail moves left by 1
   EXPECT_EQ(curve.IsValid(), 1u);
-  ASSERT_EQ(curve.GetNumKeys(), 4u);
-  double last;
-  curve.GetLargestKeyParameter(last);
-  EXPECT_EQ(last, 9.0);
+  EXPECT_EQ(KeyParams(curve), (V{0.0, 2.0, 5.0, 9.0}));
   EXPECT_NEAR(curve.Eval(3.5, 0), bump.Eval(1.5, 0), 1e-12);
   EXPECT_EQ(curve.Eval(2.0, 0), 0.0);  // the bump's first key's right side (value 0)
   EXPECT_EQ(curve.EvalLeft(2.0, 0), 2.0);
 }
 
 TEST(StdEditWhole, AppendStartsAtTheLastKey) {
-  ZvStdFCurve curve(0.0, C::LinearSegment);
-  curve.CreateKey(0.0, 0.0);
-  curve.CreateKey(1.0, 1.0);
-  ZvStdFCurve tail(0.0, C::LinearSegment);
-  tail.CreateKey(5.0, 2.0);
-  tail.CreateKey(6.0, 3.0);
-  tail.CreateKey(8.0, 0.0);
+  ZvStdFCurve curve = Polyline({{0, 0}, {1, 1}});
+  ZvStdFCurve tail = Polyline({{5, 2}, {6, 3}, {8, 0}});
   Tag(tail, 6.0, 3);
   ASSERT_EQ(curve.Append(tail), 1u);
-  ZvDoubleArray keys(4);
-  curve.GetAllKeyParameters(keys);
-  ASSERT_EQ(keys.size, 4u);
-  EXPECT_EQ(keys[3], 4.0);
+  EXPECT_EQ(KeyParams(curve), (V{0.0, 1.0, 2.0, 4.0}));
   EXPECT_EQ(curve.EvalLeft(1.0, 0), 1.0);
   EXPECT_EQ(curve.Eval(1.0, 0), 2.0);  // the joined key takes the appended right side
   EXPECT_EQ(curve.Eval(2.0, 0), 3.0);
@@ -129,8 +116,8 @@ TEST(StdEditWhole, MirroredParametersTurnTheCurveAboutItsMiddle) {
 
 TEST(StdEditWhole, SnapShotMatchesTheCurveOnItsInterval) {
   ZvStdFCurve curve = stdedit::Mixed();
-  double locked = 3.0;  // locks guard the source; the snapshot's copies are still put in place
-  curve.SetConstraint(locked, C::WholeKeyLock, 1, 0.0);
+  // Locks guard the source; the snapshot's copies are still put in place.
+  SetFlag(curve, 3.0, C::WholeKeyLock, 1);
   for (int m = 1; m <= 4; ++m) {
     curve.SetExtrapolationMethod(static_cast<C::ExtrapolationMethod>(m));
     const double spans[][2] = {{-3.0, 12.0}, {-3.0, -1.0}, {-2.0, 5.0},   {1.0, 6.0},
@@ -171,9 +158,17 @@ TEST(StdEditWhole, SnapShotMatchesTheCurveOnItsInterval) {
 }
 
 TEST(StdEditWhole, ReduceThinsLinesAndRefitsCubics) {
-  ZvStdFCurve lines(0.0, C::LinearSegment);
-  for (int i = 0; i <= 10; ++i)
-    lines.CreateKey(i, i < 6 ? 2.0 * i : 10.0);
+  ZvStdFCurve lines = Polyline({{0, 0},
+                                {1, 2},
+                                {2, 4},
+                                {3, 6},
+                                {4, 8},
+                                {5, 10},
+                                {6, 10},
+                                {7, 10},
+                                {8, 10},
+                                {9, 10},
+                                {10, 10}});
   ASSERT_EQ(lines.ReduceNumKeys(0.0, 10.0, 0.0), 1u);
   EXPECT_EQ(lines.GetNumKeys(), 3u);  // the corner at 5 stays
   EXPECT_EQ(lines.Eval(2.5, 0), 5.0);
@@ -186,14 +181,10 @@ TEST(StdEditWhole, ReduceThinsLinesAndRefitsCubics) {
   // A part of the range first: the keys after it stay exactly where they were.
   ZvStdFCurve part = dense;
   ASSERT_EQ(part.ReduceNumKeys(0.0, 2.95, 1e-3), 1u);
-  ZvDoubleArray was(64), now(64);
-  dense.GetAllKeyParameters(was);
-  part.GetAllKeyParameters(now);
-  ASSERT_LT(now.size, was.size);
-  for (unsigned int i = 1; i <= 31; ++i)
-    EXPECT_EQ(now[now.size - i], was[was.size - i]) << i;
-  double at = 3.0;
-  dense.SetConstraint(at, C::ValueLock, 1, 0.0);
+  const V was = KeyParams(dense), now = KeyParams(part);
+  ASSERT_LT(now.size(), was.size());
+  EXPECT_TRUE(std::equal(was.end() - 31, was.end(), now.end() - 31));
+  SetFlag(dense, 3.0, C::ValueLock, 1);
   ASSERT_EQ(dense.ReduceNumKeys(0.0, 6.0, 1e-3), 1u);
   EXPECT_LT(dense.GetNumKeys(), 30u);
   EXPECT_EQ(dense.IsKeyParameter(3.0, 1e-12), 1u);  // a locked key stays
@@ -219,10 +210,9 @@ TEST(StdEditWhole, ScaleAndOffsetOfAllKeys) {
   EXPECT_EQ(curve.ScaleAndOffsetParameters(2.0, 5.0, 2.0, 1.0, 1.0, 1, 0, C::RightHandle), 0u);
   EXPECT_EQ(curve.ScaleAndOffsetParameters(0.0, 9.5, 2.0, 0.0, 1.0, 1, 0, C::RightHandle), 0u);
   EXPECT_EQ(curve.ScaleAndOffsetParameters(2.0, 5.0, 2.0, 1.0, 0.0, 1, 0, C::RightHandle), 1u);
-  double key = 3.0;
-  curve.SetConstraint(key, C::ParameterLock, 1, 0.0);
+  SetFlag(curve, 3.0, C::ParameterLock, 1);
   EXPECT_EQ(curve.ScaleAndOffsetParameters(-1.0, 20.0, 1.0, 2.0, 0.0, 0, 0, C::RightHandle), 0u);
-  curve.SetConstraint(key, C::ParameterLock, 0, 0.0);
+  SetFlag(curve, 3.0, C::ParameterLock, 0);
   EXPECT_EQ(Dump(curve), before);
 }
 

@@ -6,6 +6,8 @@
 
 #include <zv/fcurve.h>
 
+#include "fcurve/fcurve_lock.h"
+
 #include <algorithm>
 #include <cmath>
 #include <vector>
@@ -14,11 +16,7 @@ class TestFCurve : public ZvBaseFCurve {
  public:
   TestFCurve() = default;
   explicit TestFCurve(std::vector<double> keys) : m_keys(std::move(keys)) {}
-  TestFCurve(const TestFCurve& other) : ZvBaseFCurve(other) {
-    other.Lock();
-    m_keys = other.m_keys;
-    other.Unlock();
-  }
+  TestFCurve(const TestFCurve& other) : ZvBaseFCurve(other), m_keys(other.Keys()) {}
   TestFCurve& operator=(const TestFCurve& other) {
     Set(other);
     return *this;
@@ -191,12 +189,7 @@ class TestFCurve : public ZvBaseFCurve {
   unsigned int IsTimeFCurve() const override { return 0; }
 
  private:
-  struct Hold {
-    explicit Hold(const ZvBaseFCurve& c) : curve(c) { curve.Lock(); }
-    ~Hold() { curve.Unlock(); }
-    const ZvBaseFCurve& curve;
-  };
-
+  using Hold = ZvFCurveLockGuard;
   std::vector<double> m_keys;
 };
 
