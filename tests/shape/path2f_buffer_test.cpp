@@ -45,11 +45,7 @@ ZvPath2f Line() {
 }
 
 ZvPath2f LockedLoop() {
-  ZvPath2f path;
-  path.Moveto(P(20, 0));
-  path.Curveto(P(25, -5), P(30, -5), P(35, 0));
-  path.Curveto(P(40, 5), P(15, 5), P(20, 0));
-  path.Closeto();
+  ZvPath2f path = SmoothLoop();
   path.LockG1(3);
   path.LockG1(0);
   return path;
