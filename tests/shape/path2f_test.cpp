@@ -11,10 +11,15 @@
 
 using Codeset = std::vector<int>;
 
+// Points, segments, subpaths, nodes, largest degree and whether it is a polyline.
+std::vector<unsigned int> Counts(const ZvPath2f& p) {
+  return {p.NumPoints(),   p.NumNodes(),      p.NumSegments(),
+          p.NumSubpaths(), p.LargestDegree(), unsigned(p.IsPolyline())};
+}
+
 TEST(Path2f, EmptyAndSinglePointPaths) {
   ZvPath2f empty(10);
-  EXPECT_TRUE(empty.NumPoints() == 0 && empty.NumSegments() == 0 && empty.NumSubpaths() == 0);
-  EXPECT_TRUE(empty.NumNodes() == 0 && empty.LargestDegree() == 0 && empty.IsPolyline() == 0);
+  EXPECT_EQ(Counts(empty), (std::vector<unsigned int>{0, 0, 0, 0, 0, 0}));
   EXPECT_EQ(empty.Closeto(), 0);
   EXPECT_EQ(empty.GetBufferSize(), 16u);
   ZvPoint2<float> untouched = P(7, 7);
@@ -24,9 +29,7 @@ TEST(Path2f, EmptyAndSinglePointPaths) {
 
   ZvPath2f one;
   one.Moveto(P(3, 4));
-  // A lone start counts as a segment.
-  EXPECT_TRUE(one.NumPoints() == 1 && one.NumSegments() == 1 && one.NumSubpaths() == 1);
-  EXPECT_TRUE(one.NumNodes() == 1 && one.LargestDegree() == 0 && one.IsPolyline() == 1);
+  EXPECT_EQ(Counts(one), (std::vector<unsigned int>{1, 1, 1, 1, 0, 1}));  // a lone start: a segment
   EXPECT_EQ(one.GetCurrentPoint().y, 4.0f);
   EXPECT_EQ(one.MaxDegreeForThisImplementation(), 8u);
 }
@@ -35,16 +38,10 @@ TEST(Path2f, DrawingCodesAndStructure) {
   const ZvPath2f path = ThreeSubpaths();
   EXPECT_EQ(Codes(path), (Codeset{1, 3, 3, 1, 8, 9, 10, 8, 9, 11, 1}));
   EXPECT_TRUE(PathInvariantHolds(path));
-  EXPECT_EQ(path.NumPoints(), 11u);
-  EXPECT_EQ(path.NumSegments(), 5u);
-  EXPECT_EQ(path.NumSubpaths(), 3u);
-  EXPECT_EQ(path.NumNodes(), 7u);
+  EXPECT_EQ(Counts(path), (std::vector<unsigned int>{11, 7, 5, 3, 3, 0}));
   EXPECT_EQ(path.NumNodesExceptLastNodeOfClosedSubpaths(), 6u);
-  EXPECT_EQ(path.LargestDegree(), 3u);
-  EXPECT_EQ(path.IsPolyline(), 0);
-  EXPECT_EQ(path.GetDegree(3), 3u);  // a start answers for the segment behind it
-  EXPECT_EQ(path.GetDegree(10), 0u);
-  EXPECT_EQ(path.GetDegree(2), 1u);
+  // A start answers for the segment behind it.
+  EXPECT_TRUE(path.GetDegree(3) == 3 && path.GetDegree(10) == 0 && path.GetDegree(2) == 1);
 
   // Index asked, first and last of its segment.
   const unsigned int segments[][3] = {{5, 3, 6}, {3, 3, 6}, {9, 6, 9}, {10, 10, 10}};
@@ -95,8 +92,7 @@ TEST(Path2f, HigherDegreesAndRefusedDegrees) {
   path.AltAltCurveto(array, 1, 8);            // past the array's end
   path.AltAltCurveto(array, 0xfffffffeu, 4);  // first + degree would wrap
   EXPECT_EQ(Codes(path), (Codeset{1, 17, 18, 19, 20, 21, 5, 6, 38, 39, 40, 41, 42, 43, 44, 45}));
-  EXPECT_EQ(path.LargestDegree(), 8u);
-  EXPECT_EQ(path.NumSegments(), 3u);
+  EXPECT_TRUE(path.LargestDegree() == 8 && path.NumSegments() == 3);
   path.Closeto();  // (7, 0) is not the start
   EXPECT_EQ(Codes(path).back(), 45);
 }
