@@ -29,6 +29,12 @@ std::vector<unsigned int> KeySampleIndices(const S& spline, const ZvDoubleArray&
   return indices;
 }
 
+template <class S>
+int Fit(S& spline, const SplineSamples<S>& s, bool closed, double tol, ZvSpline::Kind kind) {
+  return closed ? spline.ClosedFit(s.params, s.values, tol, kind)
+                : spline.OpenFit(s.params, s.values, tol, kind);
+}
+
 // Largest squared error under Eval of the samples first..last.
 template <class S>
 double WorstError2(const S& spline, const SplineSamples<S>& s, unsigned int first,
@@ -67,9 +73,7 @@ TYPED_TEST(SplineFit, BezierFitKeepsEverySampleWithinTolerance) {
   const SplineSamples<TypeParam> closed = MakeSamples<TypeParam>(1001, 2e-4, 12, true);
   for (const SplineSamples<TypeParam>* s : {&open, &closed}) {
     TypeParam spline;
-    ASSERT_EQ(s == &open ? spline.OpenFit(s->params, s->values, tol, ZvSpline::BezierCubicFCurve)
-                         : spline.ClosedFit(s->params, s->values, tol, ZvSpline::BezierCubicFCurve),
-              1);
+    ASSERT_EQ(Fit(spline, *s, s == &closed, tol, ZvSpline::BezierCubicFCurve), 1);
     const unsigned int n = spline.GetNumKeys();
     KeySampleIndices(spline, s->params);
     EXPECT_LT(n, s->params.size / 5);
@@ -123,9 +127,7 @@ TYPED_TEST(SplineFit, ConversionToBezierReproducesCatmullRom) {
   const SplineSamples<TypeParam> closed = MakeSamples<TypeParam>(801, 2e-4, 6, true);
   for (const SplineSamples<TypeParam>* s : {&open, &closed}) {
     TypeParam cr, bezier, copy;
-    ASSERT_EQ(s == &open ? cr.OpenFit(s->params, s->values, 1e-3, ZvSpline::CatmullRom)
-                         : cr.ClosedFit(s->params, s->values, 1e-3, ZvSpline::CatmullRom),
-              1);
+    ASSERT_EQ(Fit(cr, *s, s == &closed, 1e-3, ZvSpline::CatmullRom), 1);
     ASSERT_EQ(cr.CopyAndConvert(bezier, ZvSpline::BezierCubicFCurve), 1);
     EXPECT_TRUE(bezier.GetKind() == ZvSpline::BezierCubicFCurve &&
                 bezier.IsClosed() == cr.IsClosed());

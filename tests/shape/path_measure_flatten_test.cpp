@@ -31,20 +31,6 @@ void ExpectWellFormed(const Array& pts, const ZvPointTagArray& tags, unsigned in
   EXPECT_EQ(subpaths, count);
 }
 
-TEST(PathMeasureFlatten, ALineGivesTwoPointsTaggedFirstAndLast) {
-  ZvPath2f path;
-  path.Moveto(P(1, 2));
-  path.Lineto(P(5, 6));
-  ZvGC gc;
-  ZvPoint2fArray pts;
-  ZvPointTagArray tags;
-  EXPECT_EQ(2u, path.Flatten(gc, pts, tags));
-  ASSERT_EQ(2u, tags.size);
-  EXPECT_TRUE(tags[0] == ZvPointTag_First && tags[1] == ZvPointTag_Last && pts[1].x == 5.0f);
-  EXPECT_EQ(0u, ZvPath2f().Flatten(gc, pts, tags));
-  EXPECT_EQ(2u, pts.size);
-}
-
 // Three subpaths (an open triangle, a closed loop of two cubics, a lone start) appended after
 // the caller's content: counts per segment are those of the flatteners, the closed loop ends on
 // its start, and the lone point reads 0, 2.
@@ -111,6 +97,8 @@ TEST(PathMeasureFlatten, TransformedAndDoubleFormsAgree) {
   ExpectWellFormed(pf, tf, 0, 3);
   EXPECT_EQ(100.0f, pf[0].x);  // (0, 0) -> (100, -50)
   EXPECT_EQ(-30.0f, pf[2].y);  // (10, 0) -> (120, -50), (10, 10) -> (120, -30)
+  EXPECT_EQ(0u, ZvPath2f().Flatten(gc, pf, tf));
+  EXPECT_EQ(n, pf.size);  // an empty path adds nothing
 
   ZvPoint2dArray pd;
   ZvPointTagArray td;
