@@ -61,7 +61,6 @@ TYPED_TEST(SplineFit, OpenCatmullRomKeepsCheckedSamplesWithinTolerance) {
   ASSERT_GE(keys.size(), 4u);
   EXPECT_LT(keys.size(), s.params.size / 5);
   EXPECT_TRUE(keys[1] == 1 && keys.back() == s.params.size - 1);
-  EXPECT_LE(WorstError2(spline, s, keys[1], keys[keys.size() - 2]), tol * tol);
   EXPECT_LE(WorstError2(spline, s, 0, s.params.size - 1), tol * tol);
   for (unsigned int k : keys)
     EXPECT_EQ(WorstError2(spline, s, k, k), 0.0);

@@ -38,10 +38,7 @@ Bytes Hex(const char* text) {
 }
 
 ZvPath2f Line() {
-  ZvPath2f path;
-  path.Moveto(P(1, -2));
-  path.Lineto(P(0.5f, 3));
-  return path;
+  return Segment(1, -2, 0.5f, 3);
 }
 
 ZvPath2f LockedLoop() {

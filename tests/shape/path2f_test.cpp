@@ -339,9 +339,7 @@ TEST(Path2f, TextDump) {
 }
 
 TEST(Path2f, RasterExtentQuickTest) {
-  ZvPath2f path;
-  path.Moveto(P(0, 0));
-  path.Lineto(P(10, 10));
+  ZvPath2f path = Segment(0, 0, 10, 10);
   ZvGC gc;
   gc.transform.Translate(5.0, 0.0, 0.0);  // the path spans 5..15 by 0..10 on the raster
   EXPECT_EQ(path.IsRasterExtentIntersecting(gc, ZvExtent2<float>(15, 10, 20, 20)), 1);  // touch

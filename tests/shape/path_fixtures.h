@@ -27,6 +27,14 @@ inline std::vector<int> Codes(const ZvPath2f& path, int mask = 63) {
   return out;
 }
 
+// An open path of one line.
+inline ZvPath2f Segment(float x0, float y0, float x1, float y1) {
+  ZvPath2f path;
+  path.Moveto(P(x0, y0));
+  path.Lineto(P(x1, y1));
+  return path;
+}
+
 // A closed axis-aligned rectangle, drawn from (x0, y0) through (x1, y0) and (x1, y1).
 inline ZvPath2f ClosedSquare(float x0, float y0, float x1, float y1) {
   ZvPath2f path;

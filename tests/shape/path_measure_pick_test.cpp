@@ -126,9 +126,7 @@ TEST(PathMeasurePick, OutlineAndInteriorHits) {
 }
 
 TEST(PathMeasurePick, SamplesInsideAnExtentKeepTheirTags) {
-  ZvPath2f line;
-  line.Moveto(P(0, 0));
-  line.Lineto(P(10, 0));
+  ZvPath2f line = Segment(0, 0, 10, 0);
   ZvGC gc;
   gc.sampleSpacing = 1.0;  // samples at 0, 1, ..., 9
   ZvPoint2fArray pts;

@@ -7,13 +7,6 @@
 
 namespace {
 
-ZvPath2f Line(float x0, float y0, float x1, float y1) {
-  ZvPath2f path;
-  path.Moveto(P(x0, y0));
-  path.Lineto(P(x1, y1));
-  return path;
-}
-
 std::vector<int> Tags(const ZvPointTagArray& tags, unsigned int from = 0) {
   std::vector<int> out;
   for (unsigned int i = from; i < tags.size; ++i)
@@ -28,16 +21,16 @@ TEST(PathMeasureSample, EvenSpacingLeavesTheFarEndOut) {
   ZvPointTagArray tags;
   // Length 10, spacing 3: r = 1 is not above 1.5, so N = 3 and the step is 10 / 3; two
   // interior samples, the second tagged last, and no sample at the far end.
-  EXPECT_EQ(3u, Line(0, 0, 10, 0).Sample(gc, pts, tags));
+  EXPECT_EQ(3u, Segment(0, 0, 10, 0).Sample(gc, pts, tags));
   EXPECT_EQ((std::vector<int>{0, 1, 2}), Tags(tags));
   EXPECT_EQ(0.0f, pts[0].x);
   EXPECT_FLOAT_EQ(10.0f / 3, pts[1].x);
   EXPECT_FLOAT_EQ(20.0f / 3, pts[2].x);
   // Length 11: r = 2 is above 1.5, N = 4.
-  EXPECT_EQ(4u, Line(0, 0, 11, 0).Sample(gc, pts, tags));
+  EXPECT_EQ(4u, Segment(0, 0, 11, 0).Sample(gc, pts, tags));
   EXPECT_FLOAT_EQ(8.25f, pts[6].x);
   // Length 2.5, not above the spacing: the two ends.
-  EXPECT_EQ(2u, Line(0, 0, 2.5f, 0).Sample(gc, pts, tags));
+  EXPECT_EQ(2u, Segment(0, 0, 2.5f, 0).Sample(gc, pts, tags));
   EXPECT_EQ((std::vector<int>{0, 2}), Tags(tags, 7));
   EXPECT_EQ(2.5f, pts[8].x);
   EXPECT_EQ(0u, ZvPath2f().Sample(gc, pts, tags));
@@ -72,7 +65,7 @@ TEST(PathMeasureSample, SubpathsAreSampledInTheContextsFrame) {
 }
 
 TEST(PathMeasureSample, RelativePositionsRunAcrossSubpaths) {
-  ZvPath2f path = Line(0, 0, 10, 0);
+  ZvPath2f path = Segment(0, 0, 10, 0);
   path.Moveto(P(0, 10));
   path.Lineto(P(30, 10));  // total flat length 40
   ZvGC gc;
