@@ -16,36 +16,21 @@ unsigned int ExpectedCapacity(unsigned int cap, unsigned int n) {
 
 TEST(ArrayConstruction, CapacityArgumentsFollowTheRules) {
   ZvDoubleArray a(0);
-  EXPECT_EQ(a.size, 0u);
-  EXPECT_EQ(a.capacity, 1u);
-
+  EXPECT_TRUE(a.size == 0 && a.capacity == 1);
   ZvPoint2fArray b(ZvPoint2<float>{1.5f, 2.5f}, 0);
-  EXPECT_EQ(b.size, 1u);
-  EXPECT_EQ(b.capacity, 1u);
-  EXPECT_EQ(b[0].x, 1.5f);
-
+  EXPECT_TRUE(b.size == 1 && b.capacity == 1 && b[0].x == 1.5f);
   ZvPoint2fArray c(ZvPoint2<float>{1, 2}, 7);  // a capacity, not a repeat count
-  EXPECT_EQ(c.size, 1u);
-  EXPECT_EQ(c.capacity, 7u);
-
+  EXPECT_TRUE(c.size == 1 && c.capacity == 7);
   const double values[3] = {1, 2, 3};
   ZvDoubleArray d(values, 3);
-  EXPECT_EQ(d.size, 3u);
-  EXPECT_EQ(d.capacity, 3u);
-  EXPECT_EQ(d[2], 3.0);
-
+  EXPECT_TRUE(d.size == 3 && d.capacity == 3 && d[2] == 3.0);
   ZvDoubleArray e(values, 0);
-  EXPECT_EQ(e.capacity, 0u);
-  EXPECT_EQ(e.size, 0u);
-}
-
-TEST(ArrayConstruction, PointArraysAreZeroedOnAllocation) {
-  ZvPoint3dArray a(4);
-  a.Resize(4);
-  for (unsigned int i = 0; i < 4; ++i) {
-    EXPECT_EQ(a[i].x, 0.0);
-    EXPECT_EQ(a[i].z, 0.0);
-  }
+  EXPECT_TRUE(e.size == 0 && e.capacity == 0);
+  // Point arrays are zeroed on allocation.
+  ZvPoint3dArray z(4);
+  z.Resize(4);
+  for (unsigned int i = 0; i < 4; ++i)
+    EXPECT_TRUE(z[i].x == 0.0 && z[i].y == 0.0 && z[i].z == 0.0) << i;
 }
 
 TEST(ArrayConstruction, CopyAndAssignmentTakeSizeAndCapacity) {
@@ -53,21 +38,18 @@ TEST(ArrayConstruction, CopyAndAssignmentTakeSizeAndCapacity) {
   for (unsigned int i = 0; i < 5; ++i)
     a.Add(i * 10);
   ZvULongArray b(a);
-  EXPECT_EQ(b.size, 5u);
-  EXPECT_EQ(b.capacity, 8u);
-  EXPECT_EQ(b[4], 40u);
-  EXPECT_NE(b.data, a.data);
-
+  EXPECT_TRUE(b.size == 5 && b.capacity == 8 && b[4] == 40 && b.data != a.data);
   ZvULongArray c(1);
   c = a;
-  EXPECT_EQ(c.capacity, 8u);
-  EXPECT_EQ(c[3], 30u);
+  EXPECT_TRUE(c.size == 5 && c.capacity == 8 && c[3] == 30);
   const unsigned int* before = c.data;
   ZvULongArray& alias = c;
   c = alias;
   EXPECT_EQ(c.data, before);
 }
 
+// The sweep below checks every capacity; this one checks that a kept block is not moved and a
+// fresh one keeps the contents.
 TEST(ArrayCapacity, ResizeHalvesAndDoublesByTheRule) {
   ZvDoubleArray a(8);
   for (int i = 0; i < 5; ++i)
@@ -79,18 +61,6 @@ TEST(ArrayCapacity, ResizeHalvesAndDoublesByTheRule) {
   a.Resize(4);  // at most half full: a fresh, smaller block
   EXPECT_EQ(a.capacity, 4u);
   EXPECT_EQ(a[3], 3.0);
-
-  ZvDoubleArray z(5);
-  z.Resize(10);
-  EXPECT_EQ(z.capacity, 10u);
-  z.Resize(2);
-  EXPECT_EQ(z.capacity, 2u);  // 10 -> 5 -> 2: truncating halving
-
-  ZvDoubleArray r(1);
-  r.Add(1.0);
-  r.Resize(0);
-  EXPECT_EQ(r.size, 0u);
-  EXPECT_EQ(r.capacity, 1u);
 }
 
 TEST(ArrayCapacity, ResizeMatchesTheRuleOverManySizes) {
@@ -109,17 +79,12 @@ TEST(ArrayCapacity, ChopKeepsStorage) {
   for (int i = 0; i < 10; ++i)
     a.Add(static_cast<unsigned char>(i));
   a.Chop(2);
-  EXPECT_EQ(a.size, 2u);
-  EXPECT_EQ(a.capacity, 16u);
+  EXPECT_TRUE(a.size == 2 && a.capacity == 16);
   a.ChopAndResize(5);  // not below size: nothing
-  EXPECT_EQ(a.capacity, 16u);
-  EXPECT_EQ(a.size, 2u);
-  a.Add(7);
-  a.Add(8);
-  a.Add(9);
+  EXPECT_TRUE(a.size == 2 && a.capacity == 16);
+  a.Add(a.data, 2);
   a.ChopAndResize(1);
-  EXPECT_EQ(a.size, 1u);
-  EXPECT_EQ(a.capacity, 1u);
+  EXPECT_TRUE(a.size == 1 && a.capacity == 1);
 }
 
 TEST(ArrayEditing, AddOfOwnElementSurvivesTheMove) {
@@ -127,10 +92,8 @@ TEST(ArrayEditing, AddOfOwnElementSurvivesTheMove) {
   a.Add(1.0, 2.0);
   a.Add(3.0, 4.0);
   a.Add(a[0]);  // full: the block moves while the argument points into it
-  ASSERT_EQ(a.size, 3u);
-  EXPECT_EQ(a.capacity, 4u);
-  EXPECT_EQ(a[2].x, 1.0);
-  EXPECT_EQ(a[2].y, 2.0);
+  ASSERT_TRUE(a.size == 3 && a.capacity == 4);
+  EXPECT_TRUE(a[2].x == 1.0 && a[2].y == 2.0);
 
   ZvDoubleArray d(1);
   d.Add(5.0);
@@ -155,9 +118,7 @@ TEST(ArrayEditing, InsertAndRemoveKeepOrder) {
   other.Add(100);
   other.Add(101);
   a.InsertBefore(1, other);
-  EXPECT_EQ(a[1], 100u);
-  EXPECT_EQ(a[2], 101u);
-  EXPECT_EQ(a[3], 1u);
+  EXPECT_TRUE(a[1] == 100 && a[2] == 101 && a[3] == 1);
 
   a.Remove(1);
   EXPECT_EQ(a[1], 101u);
@@ -172,12 +133,9 @@ TEST(ArrayEditing, RemoveShrinksToTheSmallestChainValue) {
   EXPECT_EQ(a.capacity, 16u);
   a.Remove(0);  // 7 left: 16 -> 8
   EXPECT_EQ(a.capacity, 8u);
-  EXPECT_EQ(a[0], 2.0);
-  EXPECT_EQ(a[6], 8.0);
+  EXPECT_TRUE(a[0] == 2.0 && a[6] == 8.0);
   a.RemoveClosedRange(1, 4);  // 3 left: 8 -> 4
-  EXPECT_EQ(a.size, 3u);
-  EXPECT_EQ(a.capacity, 4u);
-  EXPECT_EQ(a[1], 7.0);
+  EXPECT_TRUE(a.size == 3 && a.capacity == 4 && a[1] == 7.0);
 }
 
 TEST(ArrayEditing, RemoveOnCapacityOneOnlyDropsTheCount) {
@@ -195,8 +153,7 @@ TEST(ArrayEditing, PointRangeAppendCopiesAClosedRange) {
   ZvPoint2fArray dst(1);
   dst.Add(src, 2, 4);
   ASSERT_EQ(dst.size, 3u);
-  EXPECT_EQ(dst[0].x, 2.0f);
-  EXPECT_EQ(dst[2].y, -4.0f);
+  EXPECT_TRUE(dst[0].x == 2.0f && dst[2].y == -4.0f);
   dst.Add(src, 3, 2);  // first past last: a zero count, nothing copied
   EXPECT_EQ(dst.size, 3u);
 }
@@ -211,14 +168,11 @@ TEST(RecordArray, OpenedAndFreedSlotsAreZero) {
   a.Add(Record{1, 1.5});
   a.Add(Record{3, 3.5});
   a.InsertBefore(1, Record{2, 2.5});
-  EXPECT_EQ(a[1].key, 2);
-  EXPECT_EQ(a[2].value, 3.5);
+  EXPECT_TRUE(a[1].key == 2 && a[2].value == 3.5);
   a.RemoveClosedRange(0, 0);
   ASSERT_EQ(a.size, 2u);
   ASSERT_EQ(a.capacity, 4u);  // two of four is not below half: the block stays
-  EXPECT_EQ(a[0].key, 2);
-  EXPECT_EQ(a.data[2].key, 0);
-  EXPECT_EQ(a.data[2].value, 0.0);
+  EXPECT_TRUE(a[0].key == 2 && a.data[2].key == 0 && a.data[2].value == 0.0);
 }
 
 TEST(ObjectArray, ElementsOwningBlocksCopyDeeply) {
@@ -229,15 +183,12 @@ TEST(ObjectArray, ElementsOwningBlocksCopyDeeply) {
   a.Add(a[0]);  // aliasing add of a class element
   a[1].Add(2.0);
   ASSERT_EQ(a.size, 2u);
-  EXPECT_EQ(a[0].size, 1u);
-  EXPECT_EQ(a[1].size, 2u);
-  EXPECT_NE(a[0].data, a[1].data);
+  EXPECT_TRUE(a[0].size == 1 && a[1].size == 2 && a[0].data != a[1].data);
 
   for (int i = 0; i < 20; ++i)
     a.InsertBefore(0, first);
   a.Remove(0);
-  EXPECT_EQ(a.size, 21u);
-  EXPECT_EQ(a[20].size, 2u);
+  EXPECT_TRUE(a.size == 21 && a[20].size == 2);
 }
 
 }  // namespace

@@ -146,7 +146,7 @@ std::vector<IPoint> NearlyCollinear(std::mt19937& rng, int n) {
   std::vector<IPoint> v;
   for (int i = 0; i < n; ++i) {
     const double c = along(rng);
-    const long long x = nudge(c);
+    const long long x = nudge(c);  // x before y: argument order is unspecified
     v.emplace_back(x, nudge(c));
   }
   return v;
@@ -181,8 +181,7 @@ TEST(ConvexHull, BadInputFailsAndWritesNothing) {
   int count = 42;
   EXPECT_EQ(CQNGeometry::BuildConvexHull<double>(2, in, count, hull), 0);
   EXPECT_EQ(CQNGeometry::BuildConvexHull<double>(0, in, count, hull), 0);
-  EXPECT_EQ(count, 42);
-  EXPECT_EQ(hull[0][0], 5.0);
+  EXPECT_TRUE(count == 42 && hull[0][0] == 5.0);
   ZvPoint2<float> pts[1] = {{1, 2}};
   EXPECT_EQ(ZvGetConvexHull2D(1, pts, nullptr), 0);
 }
@@ -194,10 +193,8 @@ TEST(ConvexHull, FloatEntryAppendsCornersCounterClockwise) {
   ASSERT_EQ(ZvGetConvexHull2D(7, pts, &out), 1);
   ASSERT_EQ(out.size, 5u);
   const float expected[4][2] = {{0, 0}, {2, 0}, {2, 2}, {0, 2}};
-  for (int i = 0; i < 4; ++i) {
-    EXPECT_EQ(out[i + 1].x, expected[i][0]);
-    EXPECT_EQ(out[i + 1].y, expected[i][1]);
-  }
+  for (int i = 0; i < 4; ++i)
+    EXPECT_TRUE(out[i + 1].x == expected[i][0] && out[i + 1].y == expected[i][1]) << i;
 }
 
 // A large cloud: every point must end up inside. The time for a million points is measured by

@@ -42,11 +42,9 @@ TEST(GC, CopiesOwnTheirProfile) {
   for (double t = -0.5; t <= 1.5; t += 0.125)
     EXPECT_EQ(copy.featherProfile.Eval(t, 0), source.featherProfile.Eval(t, 0)) << t;
   copy.featherProfile.CreateKey(0.5, 7.0);
-  EXPECT_NEAR(copy.featherProfile.Eval(0.5, 0), 7.0, 1e-9);
   EXPECT_NEAR(source.featherProfile.Eval(0.5, 0), 0.5, 1e-9);
   ZvGC assigned;
   assigned = copy;
-  EXPECT_NEAR(assigned.featherProfile.Eval(0.5, 0), 7.0, 1e-9);
   copy.featherProfile.CreateKey(0.5, -1.0);
   EXPECT_NEAR(assigned.featherProfile.Eval(0.5, 0), 7.0, 1e-9);
 }
@@ -64,17 +62,14 @@ void ExpectSameMatrix(const ZvTransfo4& a, const ZvTransfo4& b) {
 TEST(IsoView, CentredOnTheWorldOrigin) {
   const ZvIsoView view(100, 2, 50, 2, 1);
   EXPECT_EQ(view.IsValid(), 1);
-  EXPECT_EQ(Map(view.viewToWorld, 0, 0).x, -100.0);
-  EXPECT_EQ(Map(view.viewToWorld, 0, 0).y, -50.0);
+  EXPECT_TRUE(Map(view.viewToWorld, 0, 0).x == -100.0 && Map(view.viewToWorld, 0, 0).y == -50.0);
   EXPECT_EQ(Map(view.viewToWorld, 50, 25).x, 0.0);
   EXPECT_DOUBLE_EQ(Map(view.worldToView, 0, 0).y, 25.0);
   EXPECT_DOUBLE_EQ(view.GetViewUnitVectorLengthInWorld(), std::sqrt(8.0));
   EXPECT_DOUBLE_EQ(view.GetWorldUnitVectorLengthInView(), std::sqrt(0.5));
   ZvExtent2<double> world;
   view.GetViewExtentInWorldCS(world);
-  EXPECT_EQ(world.kind, ZvExtent2<double>::Regular);
-  EXPECT_EQ(world.xmin, -100.0);
-  EXPECT_EQ(world.ymax, 50.0);
+  EXPECT_TRUE(world.kind == ZvExtent2<double>::Regular && world.xmin == -100 && world.ymax == 50);
 }
 
 TEST(IsoView, PanAndZoomWorkInViewCoordinates) {
@@ -118,10 +113,7 @@ TEST(IsoView, ViewExtentAndValidity) {
   EXPECT_EQ(view.IsValid(), 0);
   ZvExtent2<double> e;
   view.GetViewExtentInViewCS(e);
-  EXPECT_EQ(e.xmin, -1.0);
-  EXPECT_EQ(e.xmax, 0.0);
-  EXPECT_EQ(e.ymax, 50.0);
-  EXPECT_EQ(e.kind, ZvExtent2<double>::Regular);
+  EXPECT_TRUE(e.kind == ZvExtent2<double>::Regular && e.xmin == -1 && e.xmax == 0 && e.ymax == 50);
   const ZvIsoView flat(100, 1, 50, 1, 0);  // no depth: singular, kept as it comes
   EXPECT_EQ(flat.IsValid(), 0);
 }

@@ -94,9 +94,8 @@ TEST(MatrixGaussJordan, KnownSystems) {
   Fill(a, av);
   Fill(b, bv);
   ASSERT_EQ(SolveAndCheck(a, b, 1e-13), 1);
-  EXPECT_NEAR(b[1][1], 1, 1e-14);
-  EXPECT_NEAR(b[2][1], -2, 1e-14);
-  EXPECT_NEAR(b[3][1], 3, 1e-14);
+  for (int r = 1; r <= 3; ++r)
+    EXPECT_NEAR(b[r][1], r % 2 ? r : -r, 1e-14);
   // 6 x 6 Hilbert: full pivoting keeps the residual small despite the conditioning.
   ZvMatrix h(1, 6, 1, 6), hb(1, 6, 1, 1);
   for (int r = 1; r <= 6; ++r) {
@@ -136,8 +135,7 @@ TEST(MatrixGaussJordan, SingularSystems) {
   // Ranges without the 1-based indices are refused untouched.
   ZvMatrix noRow1(2, 3, 1, 3), shortB(1, 1, 1, 1);
   noRow1[2][2] = 7;
-  EXPECT_EQ(ZvMatrix_GaussJordanElim(noRow1, b3), 0);
-  EXPECT_EQ(noRow1[2][2], 7);
+  EXPECT_TRUE(ZvMatrix_GaussJordanElim(noRow1, b3) == 0 && noRow1[2][2] == 7);
   EXPECT_EQ(ZvMatrix_GaussJordanElim(tiny2, shortB), 0);
 }
 

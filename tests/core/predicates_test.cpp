@@ -11,42 +11,33 @@ using P2f = ZvPoint2<float>;
 using P2d = ZvPoint2<double>;
 
 TEST(ClosestPoint, ProjectsClampsAndRefuses) {
-  double d2 = -1, t = -1;
-  EXPECT_EQ(ZvPoint2_FindClosestPointOnLineSegment(P2d{5, 3}, P2d{0, 0}, P2d{10, 0}, 100.0, d2, t),
-            1);
-  EXPECT_DOUBLE_EQ(d2, 9.0);
-  EXPECT_DOUBLE_EQ(t, 0.5);
-
-  EXPECT_EQ(ZvPoint2_FindClosestPointOnLineSegment(P2d{-4, 3}, P2d{0, 0}, P2d{10, 0}, 100.0, d2, t),
-            1);
-  EXPECT_DOUBLE_EQ(d2, 25.0);
-  EXPECT_EQ(t, 0.0);
-
-  // Too far: the distance is kept, but the raw parameter has been written already.
-  d2 = -1;
-  EXPECT_EQ(ZvPoint2_FindClosestPointOnLineSegment(P2d{20, 5}, P2d{0, 0}, P2d{10, 0}, 1.0, d2, t),
-            0);
-  EXPECT_EQ(d2, -1.0);
-  EXPECT_DOUBLE_EQ(t, 2.0);
-
-  // a = b measures to a with t = 0.
-  t = -1;
-  EXPECT_EQ(ZvPoint2_FindClosestPointOnLineSegment(P2d{3, 4}, P2d{0, 0}, P2d{0, 0}, 100.0, d2, t),
-            1);
-  EXPECT_DOUBLE_EQ(d2, 25.0);
-  EXPECT_EQ(t, 0.0);
-
+  const struct {
+    P2d p, a, b;
+    double limit;
+    int found;
+    double d2, t;
+  } cases[] = {
+      {{5, 3}, {0, 0}, {10, 0}, 100, 1, 9, 0.5},
+      {{-4, 3}, {0, 0}, {10, 0}, 100, 1, 25, 0},
+      {{20, 5}, {0, 0}, {10, 0}, 1, 0, -1, 2},  // too far: d2 kept, the raw t written already
+      {{3, 4}, {0, 0}, {0, 0}, 100, 1, 25, 0},  // a = b measures to a with t = 0
+  };
+  for (const auto& c : cases) {
+    double d2 = -1, t = -1;
+    EXPECT_EQ(ZvPoint2_FindClosestPointOnLineSegment(c.p, c.a, c.b, c.limit, d2, t), c.found);
+    EXPECT_DOUBLE_EQ(d2, c.d2) << c.p.x;
+    EXPECT_DOUBLE_EQ(t, c.t) << c.p.x;
+  }
+  double d2, t;
   ZvPoint3<double> p{1, 1, 1}, a{0, 0, 0}, b{2, 0, 0};
   EXPECT_EQ(ZvPoint3_FindClosestPointOnLineSegment(p, a, b, 10.0, d2, t), 1);
-  EXPECT_DOUBLE_EQ(d2, 2.0);
-  EXPECT_DOUBLE_EQ(t, 0.5);
+  EXPECT_TRUE(d2 == 2.0 && t == 0.5);
 }
 
 TEST(Angles, AxesQuadrantsAndFullTurn) {
-  EXPECT_EQ(AngleWithFirstAxisDegree(1, 0), 0.0);
-  EXPECT_DOUBLE_EQ(AngleWithFirstAxisDegree(0, 1), 90.0);
-  EXPECT_DOUBLE_EQ(AngleWithFirstAxisDegree(-1, 0), 180.0);
-  EXPECT_DOUBLE_EQ(AngleWithFirstAxisDegree(0, -1), 270.0);
+  const double axes[][3] = {{1, 0, 0}, {0, 1, 90}, {-1, 0, 180}, {0, -1, 270}};
+  for (const auto& c : axes)
+    EXPECT_DOUBLE_EQ(AngleWithFirstAxisDegree(c[0], c[1]), c[2]) << c[0] << "," << c[1];
   EXPECT_NEAR(AngleWithFirstAxisDegree(1, -1), 315.0, 1e-12);
   EXPECT_NEAR(AngleWithFirstAxisDegree(-1, 1), 135.0, 1e-12);
   EXPECT_NEAR(AngleWithFirstAxisRadian(-1, -1), 5 * 3.141592653589793 / 4, 1e-12);
@@ -55,16 +46,18 @@ TEST(Angles, AxesQuadrantsAndFullTurn) {
 }
 
 TEST(Angles, SweepBetweenVectors) {
+  // From the first vector counter-clockwise to the second.
+  const struct {
+    P2d a, b;
+    double deg;
+  } cases[] = {{{1, 1}, {1, 1}, 0}, {{1, 0}, {0, -1}, 270}, {{0, -1}, {1, 0}, 90}};
   double deg = -1;
-  EXPECT_EQ(ZvPoint2_AngleInDegrees(P2d{1, 1}, P2d{1, 1}, deg), 1);
-  EXPECT_EQ(deg, 0.0);
-  EXPECT_EQ(ZvPoint2_AngleInDegrees(P2d{1, 0}, P2d{0, -1}, deg), 1);
-  EXPECT_DOUBLE_EQ(deg, 270.0);
-  EXPECT_EQ(ZvPoint2_AngleInDegrees(P2d{0, -1}, P2d{1, 0}, deg), 1);
-  EXPECT_DOUBLE_EQ(deg, 90.0);
+  for (const auto& c : cases) {
+    EXPECT_EQ(ZvPoint2_AngleInDegrees(c.a, c.b, deg), 1);
+    EXPECT_DOUBLE_EQ(deg, c.deg);
+  }
   EXPECT_EQ(ZvPoint2_AngleInDegrees(P2f{1, 0}, P2f{1, -1e-3f}, deg), 1);
-  EXPECT_LT(deg, 360.0);
-  EXPECT_GT(deg, 359.9);
+  EXPECT_TRUE(deg > 359.9 && deg < 360.0) << deg;
   deg = 7;
   EXPECT_EQ(ZvPoint2_AngleInDegrees(P2f{0, 0}, P2f{1, 0}, deg), 0);
   EXPECT_EQ(deg, 7.0);
@@ -74,12 +67,10 @@ TEST(Projection, AlongDirectionAndOrthogonal) {
   P2f out{};
   EXPECT_EQ(ZvPoint2_ParallelProjectionOnLineAB(P2f{3, 5}, P2f{0, 0}, P2f{10, 0}, P2f{0, 0}, out),
             1);
-  EXPECT_FLOAT_EQ(out.x, 3.0f);
-  EXPECT_FLOAT_EQ(out.y, 0.0f);
+  EXPECT_TRUE(out.x == 3.0f && out.y == 0.0f);
   EXPECT_EQ(ZvPoint2_ParallelProjectionOnLineAB(P2f{3, 5}, P2f{0, 0}, P2f{10, 0}, P2f{1, 1}, out),
             1);
-  EXPECT_FLOAT_EQ(out.x, -2.0f);
-  EXPECT_FLOAT_EQ(out.y, 0.0f);
+  EXPECT_TRUE(out.x == -2.0f && out.y == 0.0f);
   // Parallel direction and degenerate line fail and leave the output alone.
   out = {9, 9};
   EXPECT_EQ(ZvPoint2_ParallelProjectionOnLineAB(P2f{3, 5}, P2f{0, 0}, P2f{10, 0}, P2f{1, 0}, out),

@@ -108,8 +108,7 @@ TEST(Transfo4Map, WhichElementsAct) {
   double v[4] = {1, 2, 3, 1};
   t.Map(v, v);
   ExpectNear(P3{v[0], v[1], v[2]}, p, 1e-12);
-  EXPECT_EQ(v[3], 7 + 16 + 27 + 10);
-  EXPECT_EQ(t.GetMatrixElement(3, 2), 9);
+  EXPECT_TRUE(v[3] == 7 + 16 + 27 + 10 && t.GetMatrixElement(3, 2) == 9);
   // A plane point has z = 0: only m[0], m[1], m[4], m[5], m[12], m[13] act on it.
   m[2] = m[6] = m[8] = m[9] = m[10] = m[14] = 99;
   const P2 q = ZvTransfo4(m).Map(P2{1, 2});
@@ -218,6 +217,8 @@ TEST(Transfo4Parts, DecomposeRecompose) {
   const P2 center{3, -2};
   const double cases[][6] = {
       {2, 3, 0.5, 30, 1, 2}, {0.5, -1.5, -0.2, 250, -4, 0}, {1, 1, 0, 359, 0, 0}};
+  double sx, sy, shear, degrees;
+  P2 tr;
   for (const double* c : cases) {
     ZvTransfo4 t;
     t.RecomposeXY(center, c[0], c[1], c[2], c[3], P2{c[4], c[5]});
@@ -226,15 +227,11 @@ TEST(Transfo4Parts, DecomposeRecompose) {
     edits.Translate(P2{c[4], c[5]}).RotateXY(c[3], center);
     edits.ShearXZ(c[2], 0, P3{center.x, center.y, 0}).ScaleXY(c[0], c[1], center);
     ExpectNear(t, edits, 1e-12);
-    double sx, sy, shear, degrees;
-    P2 tr;
     ASSERT_EQ(t.DecomposeXY(center, sx, sy, shear, degrees, tr), 1);
     ExpectNear(P3{sx, sy, shear}, {c[0], c[1], c[2]}, 1e-12);
     ExpectNear(P3{degrees, tr.x, tr.y}, {c[3], c[4], c[5]}, 1e-10);
   }
   // Quarter turn: the second branch, scaleY = -m[4]. Mirror: the first, signs kept.
-  double sx, sy, shear, degrees;
-  P2 tr;
   ZvTransfo4()
       .RotateXY(90, P2{0, 0})
       .Scale(2, 5, 1)

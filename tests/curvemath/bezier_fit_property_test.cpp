@@ -34,8 +34,7 @@ struct Segment {
 std::vector<Segment> Segments(const ZvPath2f& path, const ZvPoint2fArray& input) {
   std::vector<Segment> out;
   unsigned int j = 0;
-  EXPECT_EQ(input[0].x, path.GetPoint(0).x);
-  EXPECT_EQ(input[0].y, path.GetPoint(0).y);
+  EXPECT_TRUE(input[0].x == path.GetPoint(0).x && input[0].y == path.GetPoint(0).y);
   for (unsigned int i = 1; i < path.NumPoints();) {
     unsigned int a, b;
     path.GetSegmentIndices(i, a, b);
@@ -60,7 +59,7 @@ std::vector<Segment> Segments(const ZvPath2f& path, const ZvPoint2fArray& input)
 TEST(BezierFitProperty, EverySegmentFollowsItsStretchOfANoisyStroke) {
   std::mt19937 rng(20240611);
   ZvBezierTool tool;
-  unsigned int strokes = 0, segments = 0;
+  unsigned int segments = 0;
   for (int trial = 0; trial < 60; ++trial) {
     const double spacing = 1.5 + 4.0 * (trial % 5) / 4.0;
     const ZvPoint2fArray input = PenStroke(rng, 120 + 10 * (trial % 9), spacing, 0.3);
@@ -69,9 +68,7 @@ TEST(BezierFitProperty, EverySegmentFollowsItsStretchOfANoisyStroke) {
     ZvPath2f path;
     const unsigned int made = tool.OpenFit(input, 0.5, degree, tolerance, 0, &path, 0);
     const std::vector<Segment> segs = Segments(path, input);
-    ASSERT_EQ(made, segs.size()) << trial;
-    ASSERT_EQ(input.size - 1, segs.back().last) << trial;
-    ++strokes;
+    ASSERT_TRUE(made == segs.size() && segs.back().last == input.size - 1) << trial;
     segments += made;
 
     ZvDoubleArray chords;
@@ -126,7 +123,6 @@ TEST(BezierFitProperty, EverySegmentFollowsItsStretchOfANoisyStroke) {
       }
     }
   }
-  EXPECT_EQ(60u, strokes);
   EXPECT_GT(segments, 60u);
 }
 

@@ -19,13 +19,9 @@ P EvalCubic(const P* p, double t) {
   return r;
 }
 
-inline double Dist(const ZvPoint2<double>& a, const ZvPoint2<double>& b) {
-  const ZvPoint2<double> d = a - b;
-  return std::sqrt(ZvDot(d, d));
-}
-
-inline double Dist(const ZvPoint3<double>& a, const ZvPoint3<double>& b) {
-  const ZvPoint3<double> d = a - b;
+template <class P>
+double Dist(const P& a, const P& b) {
+  const P d = a - b;
   return std::sqrt(ZvDot(d, d));
 }
 

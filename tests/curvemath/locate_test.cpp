@@ -22,9 +22,7 @@ Located Locate2d(const P2* p, double tolerance, const P2& q, double distance) {
 }
 
 void ExpectUntouched(const Located& r) {
-  EXPECT_EQ(r.found, 0);
-  EXPECT_EQ(r.d2, -1.0);
-  EXPECT_EQ(r.t, -2.0);
+  EXPECT_TRUE(r.found == 0 && r.d2 == -1.0 && r.t == -2.0) << r.found << " " << r.d2 << " " << r.t;
 }
 
 TEST(LocatePoint2d, FindsParametersOfPointsOnASubdividedCurve) {
@@ -82,9 +80,7 @@ TEST(LocatePoint2f, AgreesWithThe2dForm) {
     double d2 = -1, t = -2;
     const int found = ZvBezierTool_LocatePoint2f(pf, 3.0, {float(q.x), float(q.y)}, 0.85, d2, t);
     const Located r = Locate2d(kArch, 3.0, {double(float(q.x)), double(float(q.y))}, 0.85);
-    EXPECT_EQ(found, r.found);
-    EXPECT_EQ(d2, r.d2);
-    EXPECT_EQ(t, r.t);
+    EXPECT_TRUE(found == r.found && d2 == r.d2 && t == r.t) << q.x << " " << q.y;
   }
 }
 
@@ -115,8 +111,7 @@ TEST(SplitCubic3d, WritesTheFivePointsBetweenP0AndP3) {
   const P3 sentinel = {-99, -99, -99};
   P3 buf[7] = {sentinel, {}, {}, {}, {}, {}, sentinel};
   ZvBezierTool_SplitCubic3d(p, buf + 1, 0.3);
-  EXPECT_EQ(buf[0].x, sentinel.x);
-  EXPECT_EQ(buf[6].x, sentinel.x);
+  EXPECT_TRUE(buf[0].x == sentinel.x && buf[6].x == sentinel.x);
   EXPECT_EQ(buf[1].y, 0.6);  // A01 = P0 + (P1 - P0) t
   EXPECT_LT(Dist(buf[3], EvalCubic(p, 0.3)), 1e-12);
   // Both halves retrace the curve.
@@ -135,10 +130,7 @@ TEST(TightExtent, BoundsTheCurveByItsQuartersControls) {
   ZvExtent2<double> e;
   ZvBezierTool_AugmentExtentWithCubic2dTightExtent(e, p, 0);
   EXPECT_EQ(e.kind, ZvExtent2<double>::Regular);
-  EXPECT_EQ(e.xmin, 0.0);
-  EXPECT_EQ(e.ymin, -10.0);
-  EXPECT_EQ(e.xmax, 100.0);
-  EXPECT_EQ(e.ymax, 29.375);
+  EXPECT_TRUE(e.xmin == 0 && e.ymin == -10 && e.xmax == 100 && e.ymax == 29.375);
 
   ZvExtent2<double> skip;
   ZvBezierTool_AugmentExtentWithCubic2dTightExtent(skip, p, 1);
@@ -147,10 +139,7 @@ TEST(TightExtent, BoundsTheCurveByItsQuartersControls) {
   const ZvPoint2<float> pf[4] = {{0, -10}, {0, 40}, {100, 40}, {100, 0}};
   ZvExtent2<float> ef(50, 50, 60, 60);  // an existing box only grows
   ZvBezierTool_AugmentExtentWithCubic2fTightExtent(ef, pf, 0);
-  EXPECT_EQ(ef.xmin, 0.0f);
-  EXPECT_EQ(ef.ymin, -10.0f);
-  EXPECT_EQ(ef.xmax, 100.0f);
-  EXPECT_EQ(ef.ymax, 60.0f);
+  EXPECT_TRUE(ef.xmin == 0 && ef.ymin == -10 && ef.xmax == 100 && ef.ymax == 60);
 
   ZvExtent2<double> all(0, 0, 0, 0, ZvExtent2<double>::Infinite);
   ZvBezierTool_AugmentExtentWithCubic2dTightExtent(all, p, 0);

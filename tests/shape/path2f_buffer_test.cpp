@@ -38,18 +38,11 @@ Bytes Hex(const char* text) {
 }
 
 ZvPath2f Line() {
-  ZvPath2f path;
-  path.Moveto(P(1, -2));
-  path.Lineto(P(0.5f, 3));
-  return path;
+  return Segment(1, -2, 0.5f, 3);
 }
 
 ZvPath2f LockedLoop() {
-  ZvPath2f path;
-  path.Moveto(P(20, 0));
-  path.Curveto(P(25, -5), P(30, -5), P(35, 0));
-  path.Curveto(P(40, 5), P(15, 5), P(20, 0));
-  path.Closeto();
+  ZvPath2f path = SmoothLoop();
   path.LockG1(3);
   path.LockG1(0);
   return path;

@@ -27,7 +27,14 @@ inline std::vector<int> Codes(const ZvPath2f& path, int mask = 63) {
   return out;
 }
 
-// An open triangle, a closed cubic loop, and a lone start point.
+// An open path of one line.
+inline ZvPath2f Segment(float x0, float y0, float x1, float y1) {
+  ZvPath2f path;
+  path.Moveto(P(x0, y0));
+  path.Lineto(P(x1, y1));
+  return path;
+}
+
 // A closed axis-aligned rectangle, drawn from (x0, y0) through (x1, y0) and (x1, y1).
 inline ZvPath2f ClosedSquare(float x0, float y0, float x1, float y1) {
   ZvPath2f path;
@@ -40,6 +47,17 @@ inline ZvPath2f ClosedSquare(float x0, float y0, float x1, float y1) {
   return path;
 }
 
+// A closed cubic loop whose start is smooth, and a smooth inner node at 3.
+inline ZvPath2f SmoothLoop() {
+  ZvPath2f path;
+  path.Moveto(P(20, 0));
+  path.Curveto(P(25, -5), P(30, -5), P(35, 0));
+  path.Curveto(P(40, 5), P(15, 5), P(20, 0));
+  path.Closeto();
+  return path;
+}
+
+// An open triangle, a closed cubic loop, and a lone start point.
 inline ZvPath2f ThreeSubpaths() {
   ZvPath2f path(4);
   path.Moveto(P(0, 0));

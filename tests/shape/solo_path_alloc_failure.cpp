@@ -9,6 +9,7 @@
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <memory>
 #include <vector>
 
 #include "path_fixtures.h"
@@ -59,6 +60,30 @@ int ForEachFailure(const std::function<void()>& setup, const std::function<void(
 
 using Step = std::function<void(ZvPath2f&)>;
 
+// ForEachFailure on a fresh copy of `source` every round; the last round's copy stays in `path`.
+int ForEachFailureOnCopy(const ZvPath2f& source, std::unique_ptr<ZvPath2f>& path, const Step& op,
+                         const std::function<void(bool threw)>& check) {
+  return ForEachFailure([&] { path.reset(new ZvPath2f(source)); }, [&] { op(*path); }, check);
+}
+
+// An append that failed rethrew and left the path as it was on entry.
+std::function<void(bool)> ChoppedBack(const std::unique_ptr<ZvPath2f>& path, const State& entry) {
+  return [&path, entry](bool threw) {
+    EXPECT_TRUE(threw);
+    EXPECT_TRUE(PathInvariantHolds(*path));
+    EXPECT_EQ(path->GetLockCount(), 0u);
+    EXPECT_TRUE(Snapshot(*path) == entry);
+  };
+}
+
+// An operation that swallowed the failure left an empty, unlocked, well-formed path.
+void ExpectEmptied(const ZvPath2f& path) {
+  EXPECT_TRUE(PathInvariantHolds(path));
+  EXPECT_EQ(path.NumPoints(), 0u);
+  EXPECT_EQ(PathArrays::Open(path), 0u);
+  EXPECT_EQ(path.GetLockCount(), 0u);
+}
+
 std::vector<Step> DrawingSteps() {
   static const ZvPoint2<float> pts[8] = {P(1, 2), P(3, 1), P(4, 4), P(2, 6),
                                          P(0, 5), P(1, 3), P(2, 2), P(0, 0)};
@@ -87,21 +112,8 @@ TEST(PathAllocFailure, AppendsChopBackAndRethrow) {
   ZvPath2f reference(1);
   int failures = 0;
   for (const Step& step : steps) {
-    const State entry = Snapshot(reference);
-    ZvPath2f* path = nullptr;
-    failures += ForEachFailure(
-        [&] {
-          delete path;
-          path = new ZvPath2f(reference);
-        },
-        [&] { step(*path); },
-        [&](bool threw) {
-          EXPECT_TRUE(threw);
-          EXPECT_TRUE(PathInvariantHolds(*path));
-          EXPECT_EQ(path->GetLockCount(), 0u);
-          EXPECT_TRUE(Snapshot(*path) == entry);
-        });
-    delete path;
+    std::unique_ptr<ZvPath2f> path;
+    failures += ForEachFailureOnCopy(reference, path, step, ChoppedBack(path, Snapshot(reference)));
     step(reference);
   }
   EXPECT_GT(failures, 0);
@@ -115,23 +127,12 @@ TEST(PathAllocFailure, CloseSubpathInsertionChopsBack) {
   source.Lineto(P(4, 0));
   source.Lineto(P(4, 3));
   source.Moveto(P(9, 9));
-  const State entry = Snapshot(source);
-  ZvPath2f* path = nullptr;
-  const int failures = ForEachFailure(
-      [&] {
-        delete path;
-        path = new ZvPath2f(source);
-      },
-      [&] { path->CloseSubpath(1); },
-      [&](bool threw) {
-        EXPECT_TRUE(threw);
-        EXPECT_TRUE(PathInvariantHolds(*path));
-        EXPECT_EQ(path->GetLockCount(), 0u);
-        EXPECT_TRUE(Snapshot(*path) == entry);
-      });
-  EXPECT_GT(failures, 0);
+  std::unique_ptr<ZvPath2f> path;
+  EXPECT_GT(ForEachFailureOnCopy(
+                source, path, [](ZvPath2f& p) { p.CloseSubpath(1); },
+                ChoppedBack(path, Snapshot(source))),
+            0);
   EXPECT_EQ(Codes(*path), (std::vector<int>{1, 3, 3, 4, 1}));
-  delete path;
 }
 
 TEST(PathAllocFailure, CloneAnswersNull) {
@@ -161,10 +162,7 @@ TEST(PathAllocFailure, AssignmentEmptiesTheTarget) {
       [&] { target = source; },
       [&](bool threw) {
         EXPECT_FALSE(threw);
-        EXPECT_TRUE(PathInvariantHolds(target));
-        EXPECT_EQ(target.NumPoints(), 0u);
-        EXPECT_EQ(PathArrays::Open(target), 0u);
-        EXPECT_EQ(target.GetLockCount(), 0u);
+        ExpectEmptied(target);
         EXPECT_EQ(source.GetLockCount(), 0u);
       });
   EXPECT_GT(failures, 0);
@@ -173,23 +171,16 @@ TEST(PathAllocFailure, AssignmentEmptiesTheTarget) {
 
 TEST(PathAllocFailure, ClearNeverFails) {
   const ZvPath2f source = ThreeSubpaths();
-  ZvPath2f* path = nullptr;
-  const int failures = ForEachFailure(
-      [&] {
-        delete path;
-        path = new ZvPath2f(source);
-      },
-      [&] { path->Clear(); },
+  std::unique_ptr<ZvPath2f> path;
+  const int failures = ForEachFailureOnCopy(
+      source, path, [](ZvPath2f& p) { p.Clear(); },
       [&](bool threw) {
         EXPECT_FALSE(threw);
-        EXPECT_EQ(path->NumPoints(), 0u);
-        EXPECT_TRUE(PathInvariantHolds(*path));
-        EXPECT_EQ(path->GetLockCount(), 0u);
+        ExpectEmptied(*path);
       });
   EXPECT_GT(failures, 0);
-  EXPECT_EQ(path->NumPoints(), 0u);
+  ExpectEmptied(*path);
   path->Moveto(P(1, 1));  // still usable
-  delete path;
 }
 
 TEST(PathAllocFailure, ReadersEmptyThePathOrAnswerNull) {
@@ -209,10 +200,7 @@ TEST(PathAllocFailure, ReadersEmptyThePathOrAnswerNull) {
       [&](bool threw) {
         EXPECT_FALSE(threw);
         EXPECT_EQ(read, 0u);
-        EXPECT_EQ(target.NumPoints(), 0u);
-        EXPECT_EQ(PathArrays::Open(target), 0u);
-        EXPECT_TRUE(PathInvariantHolds(target));
-        EXPECT_EQ(target.GetLockCount(), 0u);
+        ExpectEmptied(target);
       });
   EXPECT_GT(failures, 0);
   EXPECT_EQ(read, block.size() - 4);
