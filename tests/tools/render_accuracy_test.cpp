@@ -76,3 +76,29 @@ TEST(RenderAccuracy, DefaultOutputMatchesSupersampledTruth) {
     EXPECT_LE(mean, 0.5) << d;
   }
 }
+
+TEST(RenderAccuracy, ArbitraryPathDataFailsCleanlyOrDraws) {
+  // Path-data letters, digits and separators in random order: each text either reads, and then
+  // draws, or fails with one line that names an offset inside the text.
+  const std::string alphabet = "MmLlHhVvCcSsQqTtAaZz0123456789.-+eE, 1010";
+  std::srand(7);
+  for (int n = 0; n < 3000; ++n) {
+    std::string d = n % 2 ? "M1 2" : "";
+    const int length = std::rand() % 40;
+    for (int i = 0; i < length; ++i)
+      d += alphabet[static_cast<std::size_t>(std::rand()) % alphabet.size()];
+    ZvPath2f path;
+    std::string error;
+    if (ZvParseSvgPath(d, path, error)) {
+      ZvRaster<unsigned char> raster(16, 16, 0);
+      ZvRenderOptions options;
+      options.strokeWidth = 1;
+      ZvRenderPath(path, options, raster);
+    } else {
+      const std::size_t at = error.rfind("at offset ");
+      ASSERT_NE(at, std::string::npos) << d << ": " << error;
+      EXPECT_LE(std::stoul(error.substr(at + 10)), d.size()) << d;
+      EXPECT_EQ(error.find('\n'), std::string::npos);
+    }
+  }
+}
