@@ -1,8 +1,9 @@
-// Feeds arbitrary bytes to the bounded shape reader and, when a path comes out, walks its
-// structure the way hosts and the other path operations do: the codes of a foreign block may
-// say anything, and no query may leave the arrays because of them. A written block must read
-// back to the same bytes.
+// Feeds arbitrary bytes to the bounded shape reader and, when a path comes out, checks that its
+// codes parse and walks its structure the way hosts and the other path operations do. A written
+// block must read back to the same bytes.
 #include <zv/path2f.h>
+
+#include "tests/shape/path_fixtures.h"
 
 #include <cstddef>
 #include <cstdint>
@@ -67,6 +68,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   if (consumed > size) std::abort();
   ZvPath2f* path = static_cast<ZvPath2f*>(shape->QueryShapeKind(ZvShape2f::KindPath));
   if (path) {
+    // A foreign block is handed over only when its codes parse, without lock bits.
+    if (!PathInvariantHolds(*path) || Codes(*path, 255) != Codes(*path, 63)) std::abort();
     // What is read is written back identically, bar the bytes a writer leaves at 0.
     std::vector<unsigned char> block(path->GetBufferSize());
     path->WriteToBuffer(block.data());

@@ -4,6 +4,7 @@
 #include <new>
 
 #include "core/le_bytes.h"
+#include "shape/path_well_formed.h"
 
 unsigned int ZvShape2f_GetBufferBodyLengthSize() {
   return 4;
@@ -71,6 +72,10 @@ ZvShape2f* ZvShape2f_CreateFromBuffer(const void* buffer, std::size_t size,
       shape = path;
       ZvByteReader in(body, length);
       read = path->ReadBody(in);
+      // A foreign block must also describe a path that the path's own queries can walk.
+      if (read && (path->currentSubpathOpen > 1 ||
+                   !zv_path::IsWellFormedBlock(path->codes.data, path->codes.size)))
+        read = 0;
     }
   } catch (...) {
     read = 0;

@@ -92,7 +92,11 @@ class ZV_API ZvPath2f : public ZvShape2f {
   ZvShape2f& Transform(const ZvTransfo4& transform) override;
   unsigned int Flatten(const ZvGC& gc, ZvPoint2fArray& points,
                        ZvPointTagArray& tags) const override;
+  // Samples every gc.sampleSpacing pixels of arc length along each subpath. At most kMaxSamples
+  // in one call: a path that would need more (a spacing not above 0, a length that is not
+  // finite) gets none, the arrays keep their sizes and the result is 0.
   unsigned int Sample(const ZvGC& gc, ZvPoint2fArray& points, ZvPointTagArray& tags) const override;
+  static constexpr unsigned int kMaxSamples = 1u << 24;
   int Fill(const ZvGC& gc, ZvRaster<unsigned char>& raster, int (*callback)(),
            const IntBbox2l* box) const override;
   int Fill(const ZvGC& gc, ZvRaster<float>& raster, int (*callback)(),

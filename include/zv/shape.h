@@ -133,9 +133,10 @@ ZV_API ZvShape2f::Kind ZvShape2f_GetKindFromBufferBody(const void* body);
 // thrown.
 ZV_API ZvShape2f* ZvShape2f_CreateFromBufferBody(const void* body, unsigned int& consumed);
 // The same for a whole block of `size` bytes from an untrusted source (a file, the network):
-// the block is refused when its length prefix exceeds `size`, or when its contents would be read
-// past the block's end. On success `consumed` is the size of the whole block, prefix included,
-// so that a caller can step to what follows; on failure null and 0.
+// the block is refused when its length prefix exceeds `size`, when its contents would be read
+// past the block's end, or when it describes a shape that breaks the kind's own rules (for a
+// path: segment codes that do not parse, or lock bits). On success `consumed` is the size of the
+// whole block, prefix included, so that a caller can step to what follows; on failure null and 0.
 ZV_API ZvShape2f* ZvShape2f_CreateFromBuffer(const void* buffer, std::size_t size,
                                              unsigned int& consumed);
 
