@@ -284,7 +284,7 @@ class ZV_API ZvPath2f : public ZvShape2f {
 // A cursor over the subpaths of a path it does not own.
 class ZV_API ZvPath2fIter {
  public:
-  explicit ZvPath2fIter(const ZvPath2f& path) : path(&path), next(0) {}
+  explicit ZvPath2fIter(const ZvPath2f& source) : path(&source), next(0) {}
   // The next subpath's first and last index; 0 when there is none left.
   int GetNextSubPathIndices(unsigned int& first, unsigned int& last);
   void Reset() { next = 0; }
