@@ -48,6 +48,9 @@ void CFillContext::BuildFeatheringFilters(int radius, int taps, const ZvGC& gc) 
 
 namespace {
 
+// Columns convolved together in the vertical pass: H is read a band's width along each row.
+constexpr int kBand = 16;
+
 // The part of the filter that falls on a run of covered cells a..b when centred on cell `at`:
 // the taps j with at + j - R inside a..b. A cell whose every tap lies in the run gets exactly 1.
 struct RunFilter {
@@ -149,13 +152,17 @@ int SoftFillPath(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int 
   ctx.BuildFeatheringFilters(radius, taps, gc);
   const int width = raster.GetWidth(), height = raster.GetHeight();
   const int columns = width + 2 * radius, rows = height + 2 * radius;
-  // H and the column buffer live in the context, which frees them on every way out.
+  // H and the column buffers live in the context, which frees them on every way out. Only the
+  // rows and columns the spans can reach are ever written or read, so only they are cleared.
   const std::size_t cells = static_cast<std::size_t>(columns) * static_cast<std::size_t>(rows);
   ctx.rowBuffer0 = new unsigned char[cells * sizeof(double)];
-  ctx.rowBuffer1 = new unsigned char[static_cast<std::size_t>(rows) * sizeof(double)];
+  ctx.rowBuffer1 = new unsigned char[static_cast<std::size_t>(rows) * kBand * sizeof(double)];
   double* h = static_cast<double*>(ctx.rowBuffer0);
-  double* column = static_cast<double*>(ctx.rowBuffer1);
-  std::fill(h, h + cells, 0.0);
+  double* buffers = static_cast<double*>(ctx.rowBuffer1);
+  const int hTop = box.yMin + radius, hEnd = box.yMax + radius;  // rows of H spans reach
+  for (int y = hTop; y < hEnd; ++y)
+    std::fill(h + static_cast<std::size_t>(y) * columns + box.xMin,
+              h + static_cast<std::size_t>(y) * columns + box.xMax + 2 * radius, 0.0);
   const RunFilter run{ctx.cumulativeFeatherFilter, radius};
   const double* f = ctx.featherFilter;
 
@@ -177,31 +184,55 @@ int SoftFillPath(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int 
     if (!done) return 0;
   }
 
-  // Vertical pass, one column at a time, each written out as soon as it is complete.
+  // Vertical pass. Each column is convolved on its own, in rows top to bottom, but bands of
+  // neighbouring columns are walked together so that H is read along its rows; the callback is
+  // still asked before each column. Columns and rows the blur cannot reach are written as 0.
+  const int reachFirst = std::max(box.xMin - radius, 0),
+            reachEnd = std::min(box.xMax + radius, width);
+  const int outFirst = std::max(box.yMin - radius, 0), outEnd = std::min(box.yMax + radius, height);
+  const T zero = Quantise<T>(0.0 * gc.opacity);
   T* pixels = raster.GetRaster();
-  for (int x = 0; x < width; ++x) {
-    if (callback && callback()) return 0;
-    std::fill(column, column + rows, 0.0);
-    const double* cell = h + x + radius;
-    for (int y = 0; y < rows;) {
-      const double v = cell[static_cast<std::size_t>(y) * columns];
-      if (v >= 1.0) {
-        int end = y;
-        while (end + 1 < rows && cell[static_cast<std::size_t>(end + 1) * columns] >= 1.0)
-          ++end;
-        run.Spread(y, end, rows, column);
-        y = end + 1;
-        continue;
-      }
-      if (v > 0.0) {
-        for (int k = std::max(radius - y, 0); k < taps && y + k - radius < rows; ++k)
-          column[y + k - radius] += v * f[k];
-      }
-      ++y;
+  for (int x0 = 0; x0 < width; x0 += kBand) {
+    int n = 0;
+    const int band = std::min(kBand, width - x0);
+    while (n < band && !(callback && callback()))
+      ++n;
+    int runStart[kBand];
+    for (int c = 0; c < n; ++c) {
+      runStart[c] = -1;
+      std::fill(buffers + c * rows + box.yMin, buffers + c * rows + hEnd + radius, 0.0);
     }
-    for (int y = 0; y < height; ++y)
-      pixels[raster.CalculateOffsetForPos(x, raster.ConvertBottomUpY(y))] =
-          Quantise<T>(column[y + radius] * gc.opacity);
+    const int c0 = std::max(reachFirst - x0, 0), c1 = std::min(reachEnd - x0, n);
+    for (int y = hTop; y < hEnd; ++y) {
+      const double* cell = h + static_cast<std::size_t>(y) * columns + x0 + radius;
+      for (int c = c0; c < c1; ++c) {
+        const double v = cell[c];
+        double* column = buffers + c * rows;
+        if (v >= 1.0) {
+          if (runStart[c] < 0) runStart[c] = y;
+          continue;
+        }
+        if (runStart[c] >= 0) {
+          run.Spread(runStart[c], y - 1, rows, column);
+          runStart[c] = -1;
+        }
+        if (v > 0.0) {
+          for (int k = 0; k < taps; ++k)
+            column[y + k - radius] += v * f[k];
+        }
+      }
+    }
+    for (int c = c0; c < c1; ++c)
+      if (runStart[c] >= 0) run.Spread(runStart[c], hEnd - 1, rows, buffers + c * rows);
+    for (int y = 0; y < height; ++y) {
+      T* row = pixels + raster.CalculateOffsetForPos(x0, raster.ConvertBottomUpY(y));
+      const bool reached = y >= outFirst && y < outEnd;
+      for (int c = 0; c < n; ++c)
+        row[c] = reached && c >= c0 && c < c1
+                     ? Quantise<T>(buffers[c * rows + y + radius] * gc.opacity)
+                     : zero;
+    }
+    if (n < band) return 0;
   }
 
   if (gc.clipToShape == 1) return ClipToShape(path, gc, raster, callback);
