@@ -5,18 +5,6 @@
 // Each definition here is removed when the real one arrives.
 #include <zv/path2f.h>
 
-// ---- Rasterising -------------------------------------------------------------------------------
-
-int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<unsigned char>&, int (*)()) const {
-  return 0;
-}
-int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<float>&, int (*)()) const {
-  return 0;
-}
-int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<short>&, int (*)()) const {
-  return 0;
-}
-
 // ---- Editing -----------------------------------------------------------------------------------
 
 int ZvPath2f::ReplaceSegment(unsigned int, const ZvPoint2<float>*, unsigned int) {

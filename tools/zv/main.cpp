@@ -35,6 +35,7 @@ const char kUsage[] =
     "  --rate 4|8               antialiasing sub-samples per pixel side (default 8)\n"
     "  --feather R              feather radius in sub-samples, 0..rate (default 0)\n"
     "  --opacity A              fill opacity (default 1)\n"
+    "  --soft W                 soft fill: the edge blurred inwards over W pixels (default 0)\n"
     "  --stroke W               stroke with line width W pixels (default 0: no stroke)\n"
     "  --join miter|round|bevel --cap flat|round|square --miter-limit M --taper\n"
     "  --tolerance T            fill curves to within T pixels (default 0.05); below 0.25 the\n"
@@ -150,6 +151,9 @@ int Render(Args& args) {
       o.feather = Integer(a, args.Value(a), 0, 8);
     } else if (a == "--opacity") {
       o.opacity = Number(a, args.Value(a));
+    } else if (a == "--soft") {
+      o.soft = Number(a, args.Value(a));
+      if (o.soft < 0 || o.soft > 256) throw UsageError{"option --soft expects 0 to 256 pixels"};
     } else if (a == "--stroke") {
       o.strokeWidth = Number(a, args.Value(a));
     } else if (a == "--join") {

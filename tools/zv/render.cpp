@@ -65,14 +65,18 @@ void ZvRenderPath(const ZvPath2f& path, const ZvRenderOptions& options,
   gc.taper = options.taper ? 1 : 0;
   gc.flattenTolerance = 0.25;
   ZvRaster<unsigned char> layer(raster.GetWidth(), raster.GetHeight(), 0);
-  if (options.fill && options.tolerance < kFillTolerance) {
+  if (options.fill) {
+    gc.featherInner = options.soft;
+    // Below the fills' own flattening the tool flattens the path itself, in pixels.
+    const bool fine = options.tolerance < kFillTolerance;
     ZvGC device(gc);
-    device.transform = ZvTransfo4();
-    FlattenedCopy(ClosedCopy(path), gc.transform, options.tolerance)
-        .AAFill(device, layer, nullptr, nullptr);
-    KeepMaximum(raster, layer);
-  } else if (options.fill) {
-    ClosedCopy(path).AAFill(gc, layer, nullptr, nullptr);
+    if (fine) device.transform = ZvTransfo4();
+    const ZvPath2f closed =
+        fine ? FlattenedCopy(ClosedCopy(path), gc.transform, options.tolerance) : ClosedCopy(path);
+    if (options.soft > 0)
+      closed.SoftFill(device, layer, nullptr);
+    else
+      closed.AAFill(device, layer, nullptr, nullptr);
     KeepMaximum(raster, layer);
   }
   if (options.strokeWidth > 0) {
