@@ -44,8 +44,10 @@ class ZV_API ZvPath2f : public ZvShape2f {
   explicit ZvPath2f(unsigned int reserve = 1);
   ZvPath2f(const ZvPath2f& other);
   // Points first..last of `source`, made well formed: the first point starts a subpath, and a
-  // cut through a closed subpath opens it and frees its tangent locks. An empty path when the
-  // range is not inside the source.
+  // cut through a closed subpath opens it and frees its tangent locks. Ends that fall inside a
+  // segment (on a control point) move inwards to the segment's nodes, so that only whole
+  // segments are copied. An empty path when the range is not inside the source or holds no
+  // node.
   ZvPath2f(const ZvPath2f& source, unsigned int first, unsigned int last);
   // A five-point closed polyline starting at corner 2 of the rectangle (defined with ZvRect2f).
   explicit ZvPath2f(const ZvRect2f& rect);
@@ -135,6 +137,8 @@ class ZV_API ZvPath2f : public ZvShape2f {
   virtual int RemoveSubpathSection(unsigned int start, unsigned int end);
 
   // ---- Drawing (each appends under the lock) ------------------------------------------------
+  // A segment starts at the path's last point, so on an empty path the segment calls append
+  // nothing: start with Moveto.
   void Moveto(const ZvPoint2<float>& p);  // starts a subpath and marks it open
   void Lineto(const ZvPoint2<float>& p);
   void Curveto(const ZvPoint2<float>& c, const ZvPoint2<float>& end);  // quadratic
@@ -276,6 +280,8 @@ class ZV_API ZvPath2f : public ZvShape2f {
   // Makes room for `count` more points in both arrays, or restores them and rethrows.
   void GrowBoth(unsigned int count);
   void Append(const ZvPoint2<float>* p, unsigned int count, unsigned char firstCode);
+  // Appends a segment of `degree` points; nothing on an empty path.
+  void AppendSegment(const ZvPoint2<float>* p, unsigned int degree);
   unsigned int SubpathStart(unsigned int index) const;
   unsigned int SubpathEnd(unsigned int index) const;
   int IsSubpathBoundary(unsigned int index) const;
