@@ -16,26 +16,3 @@ int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<float>&, int (*)()) const {
 int ZvPath2f::SoftFill(const ZvGC&, ZvRaster<short>&, int (*)()) const {
   return 0;
 }
-
-// ---- Editing -----------------------------------------------------------------------------------
-
-int ZvPath2f::ReplaceSegment(unsigned int, const ZvPoint2<float>*, unsigned int) {
-  return 0;
-}
-int ZvPath2f::ReplaceSubpathSection(unsigned int, unsigned int) {
-  return 0;
-}
-int ZvPath2f::ReplaceSubpathSection(unsigned int, unsigned int, const ZvPoint2<float>&,
-                                    const ZvPoint2<float>&) {
-  return 0;
-}
-int ZvPath2f::ReplaceSubpathSection(unsigned int, unsigned int, const ZvPath2f&, unsigned int,
-                                    unsigned int) {
-  return 0;
-}
-int ZvPath2f::RemoveSubpath(unsigned int) {
-  return 0;
-}
-int ZvPath2f::RemoveSubpathSection(unsigned int, unsigned int) {
-  return 0;
-}
