@@ -18,7 +18,9 @@ namespace {
 class Rng {
  public:
   explicit Rng(unsigned int seed) : g_(seed) {}
-  unsigned int Below(unsigned int n) { return std::uniform_int_distribution<unsigned int>(0, n - 1)(g_); }
+  unsigned int Below(unsigned int n) {
+    return std::uniform_int_distribution<unsigned int>(0, n - 1)(g_);
+  }
   float Coord() { return std::uniform_real_distribution<float>(-100.0f, 100.0f)(g_); }
   float Near(float x, float spread) {
     return x + std::uniform_real_distribution<float>(-spread, spread)(g_);
