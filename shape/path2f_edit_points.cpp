@@ -52,7 +52,8 @@ void ZvPath2f::ReplacePoint(unsigned int i, const ZvPoint2<float>& p, int scale)
   const unsigned char byte = codes[i];
   if (IsSubpathBoundary(i)) {
     const unsigned int s = SubpathStart(i), e = SubpathEnd(i);
-    if (byte & kG1Lock) {
+    // A block read from outside may mark any point; a lock needs a subpath around it.
+    if ((byte & kG1Lock) && e > s) {
       // A locked start and end are one smooth node: both points and both handles move.
       const P2f d = p - points[i];
       points[e] = p;
@@ -86,7 +87,8 @@ void ZvPath2f::ReplacePoint(unsigned int i, const ZvPoint2<float>& p, int scale)
   const unsigned int code = byte & kCodeMask;
   if (InHandleMask(kFirstHandleMask, code) && (codes[i - 1] & kG1Lock)) {
     const unsigned int node = i - 1;
-    const unsigned int partner = (codes[node] & kCodeMask) != kStart ? i - 2 : SubpathEnd(i) - 1;
+    const bool start = node == 0 || (codes[node] & kCodeMask) == kStart;
+    const unsigned int partner = start ? SubpathEnd(i) - 1 : i - 2;
     TurnPartner(points[partner], points[node], points[i], p, scale);
   } else if (InHandleMask(kLastHandleMask, code) && (codes[i + 1] & kG1Lock)) {
     const unsigned int node = i + 1;
@@ -108,7 +110,7 @@ int ZvPath2f::ReplaceTangentVectorDirections(unsigned int node, const ZvPoint2<f
   unsigned int in = node - 1, out = node + 1;
   if (IsSubpathBoundary(node)) {
     const unsigned int s = SubpathStart(node), e = SubpathEnd(node);
-    if (!IsClosedEnd(codes[e] & kCodeMask)) return 0;
+    if (!IsClosedEnd(codes[e] & kCodeMask) || e - s < 2) return 0;
     in = e - 1;
     out = s + 1;
   }
