@@ -270,7 +270,7 @@ TEST(FrameShapes, BlocksAreExactAndReadBack) {
   // The bounded reader: whole blocks pass, a block cut anywhere is refused.
   for (std::size_t size = 0; size <= 32; ++size) {
     Bytes cut(ovalBlock.begin(), ovalBlock.begin() + size);
-    if (size < 32) cut[0] = static_cast<unsigned char>(size >= 4 ? size - 4 : 0);
+    if (size >= 4 && size < 32) cut[0] = static_cast<unsigned char>(size - 4);
     s = ZvShape2f_CreateFromBuffer(cut.data(), cut.size(), consumed);
     EXPECT_EQ(s != nullptr, size == 32) << size;
     EXPECT_EQ(consumed, size == 32 ? 32u : 0u);
