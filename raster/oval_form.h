@@ -25,7 +25,8 @@ class OvalForm {
 
   // Walks the rows first..last (drawing rows, clipped to -1..height-1) whose centres lie within
   // the oval's height, calling f(row, s, e, middle): the pixels s..e of the row whose centres
-  // have Q <= 1.000001 (s > e when none has), and the column of the chord's middle. s and e are
+  // have Q <= 1.000001 (s > e when none has), and, for such an empty row, the column of the
+  // chord's middle. s and e are
   // whole numbers in double; the first and last are exact only within a pixel of the raster.
   template <class F>
   void Rows(double o, int w, int h, F f) const;
@@ -45,6 +46,7 @@ void OvalForm::Rows(double o, int w, int h, F f) const {
   const double first = std::ceil(my + lo - o), last = std::floor(my + hi - o);
   const int rowFirst = first < -1 ? -1 : static_cast<int>(first > h ? h : first);
   const int rowLast = last > h - 1 ? h - 1 : static_cast<int>(last < -2 ? -2 : last);
+  const double inv2A = 0.5 / A;
   for (int row = rowFirst; row <= rowLast; ++row) {
     const double dy = row + o - my, bx = B * dy, cdy = C * dy * dy;
     const auto q = [&](double i) {
@@ -55,24 +57,33 @@ void OvalForm::Rows(double o, int w, int h, F f) const {
     const double disc = bx * bx - 4 * A * (cdy - K);
     if (disc >= 0) {
       const double root = std::sqrt(disc);
-      s = std::ceil(mx + (-bx - root) / (2 * A) - o);
-      e = std::floor(mx + (-bx + root) / (2 * A) - o);
-      // The roots only place the ends; the bound on Q decides them, pixel by pixel, within the
-      // columns that matter (one beyond each side of the raster stands for all beyond).
-      if (s >= -2 && s <= w + 1) {
+      const double ts = mx + (-bx - root) * inv2A - o, te = mx + (-bx + root) * inv2A - o;
+      s = std::ceil(ts);
+      e = std::floor(te);
+      // The roots only place the ends; where a root lies within its rounding error of a whole
+      // number the bound on Q decides, pixel by pixel. The error grows as the chord shrinks
+      // (the roots are ill-conditioned where the row touches the outline). Only the columns
+      // that matter are refined: one beyond each side of the raster stands for all beyond.
+      const double slack = 1e-9 + 1e-13 * (std::fabs(mx) + std::fabs(ts) + std::fabs(te)) +
+                           1e-15 * (bx * bx + 4 * A * std::fabs(cdy - K)) * inv2A * 2 /
+                               (root > 1e-300 ? root : 1e-300);
+      const bool nearS = s - ts < slack || ts - (s - 1) < slack;
+      const bool nearE = te - e < slack || (e + 1) - te < slack;
+      if (nearS && s >= -2 && s <= w + 1) {
         while (s > -2 && q(s - 1) <= K)
           --s;
         while (s <= e && s <= w + 1 && q(s) > K)
           ++s;
       }
-      if (e >= -2 && e <= w + 1) {
+      if (nearE && e >= -2 && e <= w + 1) {
         while (e < w + 1 && q(e + 1) <= K)
           ++e;
         while (e >= s && e >= -2 && q(e) > K)
           --e;
       }
     }
-    f(row, s, e, std::floor(mx - bx / (2 * A) - o + 0.5));
+    // The chord's middle column matters only to a row whose chord misses every centre.
+    f(row, s, e, s > e ? std::floor(mx - bx * inv2A - o + 0.5) : 0.0);
   }
 }
 
