@@ -24,7 +24,7 @@ void FillTransposed(const ZvPoint2<float> (&p)[3], ZvRaster<T>& raster, ZvRaster
   const double ex = 0.5 * (std::fabs(double(p[1].x) - p[0].x) + std::fabs(double(p[2].x) - p[0].x));
   const double ey = 0.5 * (std::fabs(double(p[1].y) - p[0].y) + std::fabs(double(p[2].y) - p[0].y));
   const double mx = 0.5 * (double(p[1].x) + p[2].x), my = 0.5 * (double(p[1].y) + p[2].y);
-  const auto clip = [](double v, int n) { return v < 0 ? 0 : v > n ? n : static_cast<int>(v); };
+  const auto clip = [](double v, int n) { return !(v > 0) ? 0 : v > n ? n : static_cast<int>(v); };
   const int x0 = clip(std::floor(mx - ex) - 2, raster.GetWidth());
   const int x1 = clip(std::ceil(mx + ex) + 2, raster.GetWidth());
   const int y0 = clip(std::floor(my - ey) - 2, raster.GetHeight());

@@ -44,8 +44,10 @@ void OvalForm::Rows(double o, int w, int h, F f) const {
   double lo, hi;
   if (!SolveQuadraticEquation(lo, hi, B * B - 4 * A * C, 0.0, 4 * A * K)) return;
   const double first = std::ceil(my + lo - o), last = std::floor(my + hi - o);
-  const int rowFirst = first < -1 ? -1 : static_cast<int>(first > h ? h : first);
-  const int rowLast = last > h - 1 ? h - 1 : static_cast<int>(last < -2 ? -2 : last);
+  // Row -1 is walked (not written) when the oval reaches above the raster: row 0 may widen
+  // towards it.
+  const int rowFirst = !(first > -1) ? -1 : first > h ? h : static_cast<int>(first);
+  const int rowLast = !(last < h - 1) ? h - 1 : last < -2 ? -2 : static_cast<int>(last);
   const double inv2A = 0.5 / A;
   for (int row = rowFirst; row <= rowLast; ++row) {
     const double dy = row + o - my, bx = B * dy, cdy = C * dy * dy;

@@ -38,14 +38,14 @@ void ZvRadialFillPixels(const ZvTransfo4& toUnit, const ZvPoint2dArray& profile,
       double d;
       if (round) {
         const double d2 = u * u + v * v;
-        if (d2 > r2) {
+        if (!(d2 <= r2)) {  // non-numbers too
           out[x] = T(0);
           continue;
         }
         d = std::sqrt(d2);
       } else {
         d = std::fabs(u) > std::fabs(v) ? std::fabs(u) : std::fabs(v);
-        if (d > radius) {
+        if (!(d <= radius)) {
           out[x] = T(0);
           continue;
         }
