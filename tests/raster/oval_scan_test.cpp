@@ -217,6 +217,29 @@ TEST(OvalScan, OrientationAndClippingOffTheRaster) {
   EXPECT_EQ(up.GetVal(15, 11), 0);
 }
 
+TEST(OvalScan, HugeAndNonNumericFramesStayBounded) {
+  // Frames far larger than the raster cover it whole, quickly, whatever their rotation.
+  ZvGC gc;
+  for (int turn = 0; turn < 2; ++turn) {
+    ZvOval2f oval(P{50, 40}, 2e7f, 1e7f);
+    ZvRect2f rect(P{50, 40}, 2e7f, 1e7f);
+    oval.Rotate(turn * 30.0, P{50, 40});
+    rect.Rotate(turn * 30.0, P{50, 40});
+    ZvRaster<unsigned char> o(64, 48, 0), r(64, 48, 0);
+    oval.Fill(gc, o, nullptr, nullptr);
+    rect.Fill(gc, r, nullptr, nullptr);
+    EXPECT_TRUE(o.AllPixelValuesAre(255)) << turn;
+    EXPECT_TRUE(r.AllPixelValuesAre(255)) << turn;
+  }
+  // Corners that are not numbers paint nothing (and nothing outside the raster).
+  const float nan = std::nanf(""), inf = HUGE_VALF;
+  ZvRaster<unsigned char> none(16, 16, 0);
+  ZvOval2f(P{1, 1}, P{nan, 3}, P{1, 9}).Fill(gc, none, nullptr, nullptr);
+  ZvRect2f(P{1, 1}, P{9, 3}, P{nan, 9}).Fill(gc, none, nullptr, nullptr);
+  ZvOval2f(P{1, 1}, P{inf, 1}, P{1, 9}).RadialFill(gc, none);
+  EXPECT_TRUE(none.AllPixelValuesAre(0));
+}
+
 TEST(OvalDistance, AxisAlignedRadiusAtEveryReachedPixelAndSymmetric) {
   Random r;
   for (int trial = 0; trial < 40; ++trial) {
