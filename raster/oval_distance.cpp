@@ -33,21 +33,20 @@ void FillDistanceRasterIsothetic(const ZvPoint2<float>& p0, const ZvPoint2<float
                                distance.ConvertBottomUpY(static_cast<int>(row)),
                                static_cast<float>(d < 1.0 ? d : 1.0));
   };
-  const long long reach = cx - 1 > w - 1 - cx ? cx - 1 : w - 1 - cx;
-  // Top to middle as in the plain fill, over the pairs of rows of which one can be seen; each
-  // inside pixel serves its four mirror images.
-  double rHi = std::ceil(b) - 1;
-  const double seen = h - 1 - cy > cy - 1 ? h - 1 - cy : cy - 1;
-  if (rHi > seen) rHi = seen;
-  int rLo = -cy < cy - h ? -cy : cy - h;
-  if (rLo < 0) rLo = 0;
-  if (rHi < rLo) return;
+  // Top to middle as in the plain fill, over the pairs of rows and the columns of which one
+  // can be seen; each inside pixel serves its four mirror images.
+  long long first, reach, rLo, rHi;
+  zv_oval::MirroredRange(cx, w, first, reach);
+  zv_oval::MirroredRange(cy, h, rLo, rHi);
+  const double rmax = std::ceil(b) - 1;
+  if (rHi > rmax) rHi = static_cast<long long>(rmax);
+  if (rHi < rLo || reach < first) return;
   int r = static_cast<int>(rHi);
   double er = aa * (r + o) * (r + o), der = aa * (1 - 2 * o - 2 * r);
   for (; r >= rLo; --r, er += der, der += 2 * aa) {
     const long long up = static_cast<long long>(cy) + r, down = static_cast<long long>(cy) - r - 1;
-    double ex = bb * o * o, dex = bb * (1 + 2 * o);
-    for (long long x = 0; x <= reach && ex + er <= limit; ++x, ex += dex, dex += 2 * bb) {
+    double ex = bb * (first + o) * (first + o), dex = bb * (2 * first + 1 + 2 * o);
+    for (long long x = first; x <= reach && ex + er <= limit; ++x, ex += dex, dex += 2 * bb) {
       double e = ex + er;
       // The steps accumulate rounding; near the centre that could dip below 0.
       if (e < 0) e = bb * (x + o) * (x + o) + aa * (r + o) * (r + o);

@@ -67,11 +67,10 @@ void ScanConvertIsothetic(const ZvPoint2<float>& p0, const ZvPoint2<float>& p1,
             cy = static_cast<int>(std::floor(my + 0.5));
   const int w = out.Width(), h = out.Height();
   // Pair r holds rows cy + r and cy - r - 1; walk only the pairs of which a row can be seen.
+  long long rLo, rHi;
+  zv_oval::MirroredRange(cy, h, rLo, rHi);
   const double rmax = std::ceil(b) - 1;
-  double rHi = (h - 1 - cy > cy - 1 ? h - 1 - cy : cy - 1);
-  if (rHi > rmax) rHi = rmax;
-  int rLo = -cy < cy - h ? -cy : cy - h;
-  if (rLo < 0) rLo = 0;
+  if (rHi > rmax) rHi = static_cast<long long>(rmax);
   if (rHi < rLo) return;
   int r = static_cast<int>(rHi);
   const double aa = a * a, bb = b * b, limit = aa * bb;
@@ -86,12 +85,25 @@ void ScanConvertIsothetic(const ZvPoint2<float>& p0, const ZvPoint2<float>& p1,
   }
   // Once the span reaches past both sides of the raster the wider rows below cover it too; the
   // walk stops there rather than crossing an enormous oval pixel by pixel.
-  const long long reach =
-      (cx - 1 > w - 1 - cx ? cx - 1 : w - 1 - cx) + (out.Disks() ? radius + 1 : 0);
+  long long seenLo, reach;
+  zv_oval::MirroredRange(cx, w, seenLo, reach);
+  if (out.Disks()) reach += radius + 1;
   long long x = 0;
   long long prevK = -1;
   const auto col = [w](long long v) { return static_cast<int>(v < -1 ? -1 : v > w ? w : v); };
   for (; r >= rLo; --r) {
+    // Seen far from its centre, a wide oval's edge can lie millions of pixels out: jump close
+    // below it (and back to where e is inside, should rounding put the jump beyond) rather than
+    // step there one pixel at a time.
+    const double t = (r + o) / b, guess = a * std::sqrt(t < 1 ? 1 - t * t : 0.0) - o - 2;
+    if (guess > x + 64 && reach > x) {
+      x = guess < reach ? static_cast<long long>(guess) : reach;
+      for (;; --x) {
+        ex = bb * (x + o) * (x + o);
+        dex = bb * (2 * x + 1 + 2 * o);
+        if (x == 0 || ex + er <= limit) break;
+      }
+    }
     while (x < reach && ex + dex + er <= limit) {
       ex += dex;
       dex += 2 * bb;

@@ -22,6 +22,22 @@ inline int ClampIndex(double v, int width) {
   return static_cast<int>(v);
 }
 
+// The offsets k >= 0 for which c + k or c - k - 1 (the two mirror images about the pixel corner
+// c) is an index of 0..n-1: lo..hi, with lo > hi when there are none.
+inline void MirroredRange(long long c, int n, long long& lo, long long& hi) {
+  lo = 0x7fffffffffffffffLL;
+  hi = -1;
+  if (c <= n - 1) {
+    lo = c < 0 ? -c : 0;
+    hi = n - 1 - c;
+  }
+  if (c >= 1) {
+    const long long l = c - n > 0 ? c - n : 0;
+    if (l < lo) lo = l;
+    if (c - 1 > hi) hi = c - 1;
+  }
+}
+
 template <class T>
 class SpanWriter {
  public:

@@ -231,6 +231,26 @@ TEST(OvalScan, HugeAndNonNumericFramesStayBounded) {
     EXPECT_TRUE(o.AllPixelValuesAre(255)) << turn;
     EXPECT_TRUE(r.AllPixelValuesAre(255)) << turn;
   }
+  // Centred 4e8 pixels to the left, reaching to x = 64: the edge is found without walking there.
+  ZvRaster<unsigned char> edge(100, 48, 0);
+  ZvOval2f(P{-4e8f, 24}, 800000128.0f, 1e9f).Fill(gc, edge, nullptr, nullptr);
+  for (int y = 0; y < 48; ++y) {
+    ASSERT_EQ(edge.GetVal(63, y), 255) << y;
+    ASSERT_EQ(edge.GetVal(64, y), 0) << y;
+  }
+  ZvRaster<unsigned char> below(48, 100, 0);
+  ZvOval2f(P{24, -4e8f}, 1e9f, 800000128.0f).Fill(gc, below, nullptr, nullptr);
+  for (int x = 0; x < 48; ++x) {
+    ASSERT_EQ(below.GetVal(x, 63), 255) << x;
+    ASSERT_EQ(below.GetVal(x, 64), 0) << x;
+  }
+  ZvRaster<float> far(100, 48, 2.0f);
+  FillDistanceRasterIsothetic(P{-800000064.0f, -5e8f}, P{64, -5e8f}, P{-800000064.0f, 5e8f}, 0.5,
+                              far);
+  EXPECT_EQ(far.GetVal(63, 10), 1.0f);  // within a float's rounding of the outline
+  EXPECT_EQ(far.GetVal(64, 10), 2.0f);
+  EXPECT_NEAR(far.GetVal(0, 10), 1 - 64 / 4e8, 1e-7);
+
   // Corners that are not numbers paint nothing (and nothing outside the raster).
   const float nan = std::nanf(""), inf = HUGE_VALF;
   ZvRaster<unsigned char> none(16, 16, 0);
