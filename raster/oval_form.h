@@ -66,11 +66,12 @@ void OvalForm::Rows(double o, int w, int h, F f) const {
       // number the bound on Q decides, pixel by pixel. The error grows as the chord shrinks
       // (the roots are ill-conditioned where the row touches the outline). Only the columns
       // that matter are refined: one beyond each side of the raster stands for all beyond.
-      const double slack = 1e-9 + 1e-13 * (std::fabs(mx) + std::fabs(ts) + std::fabs(te)) +
-                           1e-15 * (bx * bx + 4 * A * std::fabs(cdy - K)) * inv2A * 2 /
-                               (root > 1e-300 ? root : 1e-300);
-      const bool nearS = s - ts < slack || ts - (s - 1) < slack;
-      const bool nearE = te - e < slack || (e + 1) - te < slack;
+      // The slack is kept multiplied by the root, so that no row divides.
+      const double slackRoot =
+          (1e-9 + 1e-13 * (std::fabs(mx) + std::fabs(ts) + std::fabs(te))) * root +
+          2e-15 * (bx * bx + 4 * A * std::fabs(cdy - K)) * inv2A;
+      const bool nearS = (s - ts) * root <= slackRoot || (ts - (s - 1)) * root <= slackRoot;
+      const bool nearE = (te - e) * root <= slackRoot || ((e + 1) - te) * root <= slackRoot;
       if (nearS && s >= -2 && s <= w + 1) {
         while (s > -2 && q(s - 1) <= K)
           --s;
