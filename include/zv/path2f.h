@@ -331,6 +331,7 @@ class ZV_API ZvPath2f : public ZvShape2f {
   template <class T>
   int StrokeImp(const ZvGC& gc, ZvRaster<T>& raster) const;
   friend class ZvPath2fMeasure;  // the measuring code reads the arrays directly
+  friend class ZvOval2f;         // its outline is the one built by SetToOvalOutline
   friend ZvShape2f* ZvShape2f_CreateFromBuffer(const void*, std::size_t, unsigned int&);
   // The body reader behind ReadFromBufferBody and the bounded factory.
   unsigned int ReadBody(ZvByteReader& in);

@@ -12,10 +12,12 @@
 #include <zv/fill.h>
 #include <zv/gc.h>
 #include <zv/matrix.h>
+#include <zv/oval2f.h>
 #include <zv/path2f.h>
 #include <zv/point.h>
 #include <zv/polyline.h>
 #include <zv/raster.h>
+#include <zv/rect2f.h>
 #include <zv/shape.h>
 #include <zv/spline.h>
 #include <zv/std_fcurve.h>

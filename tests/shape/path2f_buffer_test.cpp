@@ -1,7 +1,9 @@
 // Persistent blocks of paths: exact bytes, round trips, the shape factory, the bounded reader
 // and the fuzzing seeds, which are the blocks written here.
 #include <zv/gc.h>
+#include <zv/oval2f.h>
 #include <zv/path2f.h>
+#include <zv/rect2f.h>
 
 #include <gtest/gtest.h>
 
@@ -19,9 +21,9 @@ namespace {
 
 using Bytes = std::vector<unsigned char>;
 
-Bytes Block(const ZvPath2f& path) {
-  Bytes block(path.GetBufferSize(), 0xee);
-  EXPECT_EQ(path.WriteToBuffer(block.data()), block.size());
+Bytes Block(const ZvShape2f& shape) {
+  Bytes block(shape.GetBufferSize(), 0xee);
+  EXPECT_EQ(shape.WriteToBuffer(block.data()), block.size());
   return block;
 }
 
@@ -115,13 +117,13 @@ TEST(Path2fBuffer, KindsAndRefusals) {
   delete shape;
 
   ZvPath2f keep = ThreeSubpaths();
-  for (unsigned char kind : {0, 2, 3, 4, 5, 255}) {
+  for (unsigned char kind : {0, 4, 5, 255}) {
     block[4] = kind;
     EXPECT_EQ(ZvShape2f_GetKindFromBufferBody(body),
               kind >= 1 && kind <= 4 ? static_cast<ZvShape2f::Kind>(kind) : ZvShape2f::KindNone);
     EXPECT_EQ(keep.ReadFromBufferBody(body), 0u);
     consumed = 7;
-    // Rectangles, ovals and property paths are not built here yet: refused like unknown kinds.
+    // Property paths are not built here yet: refused like unknown kinds.
     EXPECT_EQ(ZvShape2f_CreateFromBufferBody(body, consumed), nullptr);
     EXPECT_EQ(consumed, 0u);
   }
@@ -241,8 +243,12 @@ void ExpectRefusedOrWellFormed(const Bytes& block) {
   unsigned int consumed = 0;
   ZvShape2f* shape = ZvShape2f_CreateFromBuffer(block.data(), block.size(), consumed);
   if (!shape) return;
+  // A corrupted kind word may name a rectangle or an oval, whose blocks are checked elsewhere.
   const ZvPath2f* path = static_cast<ZvPath2f*>(shape->QueryShapeKind(ZvShape2f::KindPath));
-  ASSERT_NE(path, nullptr);
+  if (!path) {
+    delete shape;
+    return;
+  }
   EXPECT_TRUE(PathInvariantHolds(*path));
   EXPECT_EQ(Codes(*path, 255), Codes(*path, 63));
   MeasureAndDraw(*path);
@@ -316,15 +322,17 @@ TEST(Path2fBuffer, FuzzSeedsAreTheWrittenBlocks) {
   dir += "/fuzz/corpus/fuzz_path_buffer/";
   const struct {
     const char* name;
-    ZvPath2f path;
-  } seeds[] = {{"empty", ZvPath2f()},
-               {"line", Line()},
-               {"loop", LockedLoop()},
-               {"three_subpaths", ThreeSubpaths()},
-               {"degrees", HighDegrees()}};
+    Bytes block;
+  } seeds[] = {{"empty", Block(ZvPath2f())},
+               {"line", Block(Line())},
+               {"loop", Block(LockedLoop())},
+               {"three_subpaths", Block(ThreeSubpaths())},
+               {"degrees", Block(HighDegrees())},
+               {"rect", Block(ZvRect2f(P(2, 3), P(9, 4.5f), P(1, 8)))},
+               {"oval", Block(ZvOval2f(P(4, 5), 6, 3))}};
   const bool write = std::getenv("ZV_WRITE_FUZZ_SEEDS") != nullptr;
   for (const auto& seed : seeds) {
-    const Bytes block = Block(seed.path);
+    const Bytes& block = seed.block;
     const std::string file = dir + seed.name;
     if (write) {
       std::ofstream(file, std::ios::binary)
