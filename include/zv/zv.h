@@ -13,6 +13,7 @@
 #include <zv/gc.h>
 #include <zv/matrix.h>
 #include <zv/path2f.h>
+#include <zv/path_builder.h>
 #include <zv/point.h>
 #include <zv/polyline.h>
 #include <zv/raster.h>

@@ -2,10 +2,12 @@
 //
 //   zv render [options] [FILE]   SVG path data from FILE (or standard input) to a PNG
 //   zv demo [-o FILE]            the built-in scene
+//   zv fit [options] [FILE]      pen points through a path builder, out as SVG path data
 //
 // Every failure is one line on standard error and a non-zero exit: 1 for bad input or output,
 // 2 for a bad command line.
 #include "demo.h"
+#include "fit.h"
 #include "png_write.h"
 #include "render.h"
 #include "svg_path.h"
@@ -37,7 +39,16 @@ const char kUsage[] =
     "  --opacity A              fill opacity (default 1)\n"
     "  --stroke W               stroke with line width W pixels (default 0: no stroke)\n"
     "  --join miter|round|bevel --cap flat|round|square --miter-limit M --taper\n"
-    "  --invert                 dark shapes on white\n";
+    "  --invert                 dark shapes on white\n"
+    "       zv fit [options] [FILE]      pen points ('x y [pressure]' a line; FILE or standard\n"
+    "                                    input) fed one by one to a path builder, out as SVG\n"
+    "                                    path data\n"
+    "fit options:\n"
+    "  -o, --output FILE        path data to write (default standard output)\n"
+    "  --builder linear|cubic|fit  the builder (default fit: least-squares cubics)\n"
+    "  --tolerance E            fit error in pixels (default 1)\n"
+    "  --close                  close the subpath\n"
+    "  --png FILE --size WxH    also draw the points and the path (default 512x512)\n";
 
 struct UsageError {
   std::string message;
@@ -202,6 +213,7 @@ int main(int argc, char** argv) {
   try {
     if (command == "render") return Render(args);
     if (command == "demo") return Demo(args);
+    if (command == "fit") return ZvFitCommand(argc, argv);
     if (command == "help" || command == "--help" || command == "-h") {
       std::cout << kUsage;
       return 0;

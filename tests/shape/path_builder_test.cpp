@@ -1,0 +1,223 @@
+// The path builders' shared steps, and the linear and cubic builders.
+#include <zv/gc.h>
+#include <zv/path2f.h>
+#include <zv/path_builder.h>
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <random>
+
+#include "path_builder_feed.h"
+#include "path_fixtures.h"
+#include "shape/path_builder_steps.h"
+#include "tests/curvemath/bezier_fit_strokes.h"
+
+namespace {
+ZvPoint2fArray Line(std::initializer_list<ZvPoint2<float>> points) {
+  ZvPoint2fArray a;
+  for (const ZvPoint2<float>& p : points)
+    a.Add(p);
+  return a;
+}
+}  // namespace
+
+TEST(PathBuilderSteps, SamplesCarryTheirRestAcrossBatches) {
+  // Length 25 at spacing 10: samples at 10 and 20, and the end, as 5 is left over.
+  ZvPoint2fArray samples;
+  double length = 0, residual = 0;
+  EXPECT_EQ(SampleSubpath(Line({P(0, 0), P(25, 0)}), 0, 1, 10, length, residual, samples, 1), 3u);
+  EXPECT_EQ(length, 25);
+  EXPECT_EQ(residual, 0);
+  ASSERT_EQ(samples.size, 3u);
+  EXPECT_EQ(samples[0].x, 10);
+  EXPECT_EQ(samples[1].x, 20);
+  EXPECT_EQ(samples[2].x, 25);
+  // 20.5 leaves 0.5, not above a tenth of the spacing: no end sample.
+  samples.Chop(0);
+  residual = 0;
+  EXPECT_EQ(SampleSubpath(Line({P(0, 0), P(0, 20.5f)}), 0, 1, 10, length, residual, samples, 1),
+            2u);
+  EXPECT_DOUBLE_EQ(residual, 0.5);
+  // Two batches of 7 and 8 along a bend: one sample at arc length 10, 3 into the second edge,
+  // and 5 carried over.
+  samples.Chop(0);
+  residual = 0;
+  const ZvPoint2fArray bend = Line({P(0, 0), P(7, 0), P(7, 8)});
+  EXPECT_EQ(SampleSubpath(bend, 0, 1, 10, length, residual, samples, 0), 0u);
+  EXPECT_EQ(residual, 7);
+  EXPECT_EQ(SampleSubpath(bend, 1, 2, 10, length, residual, samples, 0), 1u);
+  EXPECT_EQ(residual, 5);
+  ASSERT_EQ(samples.size, 1u);
+  EXPECT_EQ(samples[0].x, 7);
+  EXPECT_EQ(samples[0].y, 3);
+  // A single point measures nothing and keeps the rest.
+  EXPECT_EQ(SampleSubpath(bend, 2, 2, 10, length, residual, samples, 0), 0u);
+  EXPECT_EQ(length, 0);
+  EXPECT_EQ(residual, 5);
+}
+
+TEST(PathBuilderSteps, SmoothingKeepsEndsAndDenseRuns) {
+  ZvGC gc;
+  ZvPoint2fArray zigzag = Line({P(0, 0), P(4, 4), P(8, 0), P(12, 4), P(16, 0)});
+  SmoothTrailingInputPoints(gc, 0, 4, zigzag);
+  EXPECT_EQ(zigzag[0].y, 0);
+  EXPECT_EQ(zigzag[4].y, 0);
+  // Each inner point mixes its unsmoothed neighbours: 4/2, then (4 + 4) / 4 + 0, then 2.
+  EXPECT_EQ(zigzag[1].y, 2);
+  EXPECT_EQ(zigzag[2].y, 2);
+  EXPECT_EQ(zigzag[3].y, 2);
+  // Points within pointMergeDistance of the smoothed one before stay where they are.
+  ZvPoint2fArray dense = Line({P(0, 0), P(0.2f, 0.6f), P(0.4f, 0), P(0.6f, 0.6f)});
+  SmoothTrailingInputPoints(gc, 0, 3, dense);
+  EXPECT_EQ(dense[1].y, 0.6f);
+  EXPECT_EQ(dense[2].y, 0.0f);
+}
+
+TEST(PathBuilderSteps, TangentsFollowTheTravel) {
+  // Three points on the unit circle, counter-clockwise and clockwise.
+  const ZvPoint2<float> a = P(1, 0), b = P(0, 1), c = P(-1, 0);
+  const ZvPoint2<float> t0 = ZvPoint2_TangentToCircumCircle(a, b, c, 0);
+  EXPECT_NEAR(t0.x, 0, 1e-6);
+  EXPECT_GT(t0.y, 0);
+  const ZvPoint2<float> t2 = ZvPoint2_TangentToCircumCircle(c, b, a, 2);
+  EXPECT_NEAR(t2.x, 0, 1e-6);
+  EXPECT_LT(t2.y, 0);  // clockwise over the top comes down at (1, 0)
+  const ZvPoint2<float> t1 = ZvPoint2_TangentToCircumCircle(a, b, c, 1);
+  EXPECT_LT(t1.x, 0);
+  EXPECT_NEAR(t1.y, 0, 1e-6);
+  // Collinear points give the chord.
+  const ZvPoint2<float> s = ZvPoint2_TangentToCircumCircle(P(0, 0), P(1, 0), P(2, 0), 2);
+  EXPECT_EQ(s.x, 1);
+  EXPECT_EQ(s.y, 0);
+
+  // A stroke's start turning sharply takes the circle's tangent; a gentle one its first edge.
+  const ZvPoint2fArray turn = Line({P(1, 0), P(0, 1), P(-1, 0)});
+  const ZvPoint2<float> start = EstimateTangentDirection(turn, 0, 1, 0, 0);
+  EXPECT_NEAR(start.x, 0, 1e-6);
+  EXPECT_NEAR(start.y, 1, 1e-6);
+  const ZvPoint2<float> edge = EstimateTangentDirection(turn, 0, 1, 0, 1);
+  EXPECT_NEAR(edge.x, -std::sqrt(0.5), 1e-6);
+  const ZvPoint2<float> middle = EstimateTangentDirection(turn, 1, 0, 0, 0);
+  EXPECT_NEAR(middle.x, -1, 1e-6);
+  EXPECT_EQ(EstimateTangentDirection(turn, 3, 0, 0, 0).x, 0);
+}
+
+TEST(LinearPathBuilder, RunsAlongALineBecomeOneEdge) {
+  ZvGC gc;
+  ZvPath2f path;
+  ZvLinearPathBuilder builder(gc, &path);
+  builder.StartSubpath(P(0, 0));
+  builder.AddInputPoint(P(3, 0), 0);
+  for (int i = 2; i <= 10; ++i)
+    builder.AddInputPoint(P(3.0f * i, 0.1f * (i % 2)), 0);  // wobbles well within 0.5
+  builder.EndSubpath(P(30, 0), 0);
+  ASSERT_EQ(path.NumPoints(), 2u);
+  EXPECT_EQ(path.GetPoint(1).x, 30);
+
+  // Doubling back on the line ends the run even though the cross term is 0.
+  path.Clear();
+  builder.StartSubpath(P(0, 0));
+  builder.AddInputPoint(P(10, 0), 0);
+  builder.AddInputPoint(P(20, 0), 0);
+  builder.AddInputPoint(P(5, 0), 0);
+  builder.EndSubpath(P(5, 0), 0);
+  ASSERT_EQ(path.NumPoints(), 3u);
+  EXPECT_EQ(path.GetPoint(1).x, 11.25f);  // the turning point, smoothed: 20 / 2 + 5 / 4
+  EXPECT_EQ(path.GetPoint(2).x, 5);
+
+  // Points within pointMergeDistance are dropped unless forced.
+  path.Clear();
+  builder.StartSubpath(P(0, 0));
+  builder.AddInputPoint(P(0.3f, 0.3f), 0);
+  builder.AddInputPoint(P(0.2f, 0.4f), 1);
+  builder.EndSubpath(P(0.2f, 0.4f), 0);
+  EXPECT_EQ(path.NumPoints(), 2u);
+}
+
+TEST(LinearPathBuilder, StartAndEndAtOnePointGiveALoneMoveto) {
+  ZvGC gc;
+  ZvPath2f path;
+  ZvLinearPathBuilder builder(gc, &path);
+  for (int close = 0; close < 2; ++close) {
+    path.Clear();
+    builder.StartSubpath(P(5, 5));
+    const ZvPoint2fArray& samples = builder.EndSubpath(P(5, 5), close);
+    EXPECT_EQ(path.NumPoints(), 1u);
+    EXPECT_EQ(path.NumSegments(), 1u);
+    ASSERT_EQ(samples.size, 1u);
+    EXPECT_EQ(samples[0].x, 5);
+  }
+  // A closed triangle gets its closing edge.
+  path.Clear();
+  builder.StartSubpath(P(0, 0));
+  builder.AddInputPoint(P(10, 0), 0);
+  builder.AddInputPoint(P(10, 10), 0);
+  builder.EndSubpath(P(10, 10), 1);
+  EXPECT_EQ(path.NumPoints(), 4u);
+  EXPECT_TRUE(path.IsSubpathClosed(0));
+}
+
+TEST(LinearPathBuilder, TheTransformMapsTheInput) {
+  ZvGC gc;
+  gc.transform.Translate(100, 0, 0);
+  gc.transform.Scale(2, 2, 1);
+  ZvPath2f path;
+  ZvLinearPathBuilder builder(gc, &path);
+  builder.StartSubpath(P(1, 1));
+  builder.AddInputPoint(P(1, 5), 0);
+  builder.EndSubpath(P(4, 5), 0);
+  ASSERT_EQ(path.NumPoints(), 3u);
+  EXPECT_EQ(path.GetPoint(0).x, 102);
+  EXPECT_EQ(path.GetPoint(2).y, 10);
+}
+
+TEST(CubicPathBuilder, TheLastEdgeWaitsForTheNextPoint) {
+  ZvGC gc;
+  gc.sampleSpacing = 2;
+  gc.pointMergeDistance = 100;  // no smoothing: forced points only
+  ZvPath2f path;
+  ZvCubicPathBuilder builder(gc, &path);
+  builder.StartSubpath(P(0, 0));
+  builder.AddInputPoint(P(10, 0), 1);
+  builder.AddInputPoint(P(20, 5), 1);
+  builder.AddInputPoint(P(30, 0), 1);
+  const ZvPoint2fArray& first = builder.GetTrailingSamples();
+  // Edges 0-1 and 1-2 are drawn; 2-3 needs the tangent at 3.
+  ASSERT_EQ(path.NumPoints(), 7u);
+  EXPECT_EQ(path.GetPoint(6).x, 20);
+  EXPECT_GT(first.size, 10u);
+  // Handles run 0.4 of the chord along the tangents: at the start the circle through the
+  // first three points, at point 1 the direction from point 0 to point 2.
+  const ZvPoint2<float> h = path.GetPoint(5) - path.GetPoint(6);
+  EXPECT_NEAR(std::hypot(h.x, h.y), 0.4 * std::hypot(10, 5), 1e-4);
+  const ZvPoint2<float> h1 = path.GetPoint(2) - path.GetPoint(3);
+  EXPECT_NEAR(h1.y / h1.x, 0.25, 1e-6);
+  // Nothing new: an empty batch, and the path unchanged.
+  EXPECT_EQ(builder.GetTrailingSamples().size, 0u);
+  EXPECT_EQ(path.NumPoints(), 7u);
+  builder.AddInputPoint(P(40, 0), 1);
+  builder.GetTrailingSamples();
+  EXPECT_EQ(path.NumPoints(), 10u);
+  builder.EndSubpath(P(40, 0), 1);
+  EXPECT_EQ(path.NumPoints(), 16u);  // the edge into 40 and the one back to the start
+  EXPECT_TRUE(path.IsSubpathClosed(0));
+}
+
+TEST(PathBuilders, LiveStrokesOnlyGrowThePathAndSampleIt) {
+  ZvGC gc;
+  gc.sampleSpacing = 4;
+  std::mt19937 rng(17);
+  for (int kind = 0; kind < 2; ++kind) {
+    for (int live = 0; live < 2; ++live) {
+      ZvPath2f path;
+      ZvLinearPathBuilder linear(gc, &path);
+      ZvCubicPathBuilder cubic(gc, &path);
+      ZvBasePathBuilder& builder = kind ? static_cast<ZvBasePathBuilder&>(cubic) : linear;
+      const std::vector<ZvPoint2<float>> samples =
+          Feed(builder, PenStroke(rng, 100, 3.0, 0.3), live != 0);
+      SCOPED_TRACE(kind ? "cubic" : "linear");
+      ExpectEvenSamples(samples, path, gc.sampleSpacing, gc.flattenTolerance);
+    }
+  }
+}
