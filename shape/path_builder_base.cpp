@@ -6,6 +6,7 @@
 #include <zv/polyline.h>
 
 #include <cmath>
+#include <new>
 
 #include "shape/path_builder_steps.h"
 
@@ -96,7 +97,10 @@ unsigned int SampleSubpath(const ZvPoint2fArray& points, unsigned int first, uns
     length = d[d.size - 1];
     const double total = length + residual;
     if (total >= spacing) {
-      count = static_cast<unsigned int>(std::floor(total / spacing));
+      // More samples than an array can hold (a wild point) fail as the array itself would.
+      const double steps = std::floor(total / spacing);
+      if (steps > double(0x80000000u - samples.size)) throw std::bad_alloc();
+      count = static_cast<unsigned int>(steps);
       double s = spacing - residual;
       unsigned int i = 1;
       for (unsigned int k = 0; k < count; ++k, s += spacing) {

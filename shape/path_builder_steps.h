@@ -78,7 +78,7 @@ ZvPoint2<double> GetTangentDirectionOnPath(const ZvPoint2fArray& points, const Z
 // spacing - residual from points[first], and carries the rest over in `residual`; `length`
 // receives the polyline's length. With `final`, a rest above a tenth of the spacing gets the
 // array's last point as a sample of its own. Result: samples appended. A spacing that is not
-// positive gives no samples.
+// positive gives no samples; more samples than an array can hold raise std::bad_alloc.
 unsigned int SampleSubpath(const ZvPoint2fArray& points, unsigned int first, unsigned int last,
                            double spacing, double& length, double& residual,
                            ZvPoint2fArray& samples, int final);

@@ -9,16 +9,17 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <cstring>
 #include <vector>
 
 #include "path_fixtures.h"
 
-// Every point of `before` is still in `path`, unchanged.
+// Every point of `before` is still in `path`, bit for bit (so a NaN stays the same NaN).
 inline bool PathKeepsPrefix(const ZvPath2f& path, const std::vector<ZvPoint2<float>>& before) {
   if (path.NumPoints() < before.size()) return false;
   for (unsigned int i = 0; i < before.size(); ++i) {
     const ZvPoint2<float> p = path.GetPoint(i);
-    if (p.x != before[i].x || p.y != before[i].y) return false;
+    if (std::memcmp(&p, &before[i], sizeof p) != 0) return false;
   }
   return true;
 }

@@ -221,3 +221,32 @@ TEST(PathBuilders, LiveStrokesOnlyGrowThePathAndSampleIt) {
     }
   }
 }
+
+TEST(PathBuilders, WildInputEndsWithoutHarm) {
+  // Not a number and infinities: every builder comes back, and the path starts where the pen
+  // did.
+  ZvGC gc;
+  const float nan = std::nanf(""), inf = HUGE_VALF;
+  ZvPoint2fArray stroke;
+  for (const ZvPoint2<float>& p :
+       {P(0, 0), P(nan, 1), P(2, 2), P(inf, 0), P(3, 3), P(-inf, nan), P(4, 4), P(5, 5)})
+    stroke.Add(p);
+  for (int kind = 0; kind < 3; ++kind) {
+    for (int live = 0; live < 2; ++live) {
+      ZvPath2f path;
+      ZvLinearPathBuilder linear(gc, &path);
+      ZvCubicPathBuilder cubic(gc, &path);
+      ZvBezierFitPathBuilder fit(gc, &path, 32.0, 2.0, 1.0, 3);
+      ZvBasePathBuilder* builders[3] = {&linear, &cubic, &fit};
+      Feed(*builders[kind], stroke, live != 0);
+      ASSERT_GE(path.NumPoints(), 1u);
+      EXPECT_EQ(path.GetPoint(0).x, 0);
+    }
+  }
+  // A jump to 1e30 asks for more samples than an array holds: the allocation failure.
+  ZvPath2f path;
+  ZvLinearPathBuilder builder(gc, &path);
+  builder.StartSubpath(P(0, 0));
+  builder.AddInputPoint(P(1e30f, 0), 0);
+  EXPECT_THROW(builder.EndSubpath(P(1e30f, 0), 0), std::bad_alloc);
+}

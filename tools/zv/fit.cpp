@@ -27,6 +27,7 @@ struct FitOptions {
   int width = 512, height = 512;
   double tolerance = 1.0;
   bool close = false;
+  bool atEnd = false;  // commit only at the end instead of after every point
 };
 
 bool UsageError(const std::string& message) {
@@ -76,6 +77,8 @@ bool ParseOptions(int argc, char** argv, FitOptions& o) {
       if (!(o.tolerance > 0.0)) return UsageError("option --tolerance expects a positive number");
     } else if (a == "--close") {
       o.close = true;
+    } else if (a == "--at-end") {
+      o.atEnd = true;
     } else if (a.size() > 1 && a[0] == '-') {
       return UsageError("unknown option '" + a + "'");
     } else if (o.input.empty()) {
@@ -152,14 +155,15 @@ int ZvFitCommand(int argc, char** argv) {
     return 1;
   }
 
-  // Fed as a live pen would: one point at a time, the trailing samples taken after each.
+  // Fed as a live pen would: one point at a time, the trailing samples taken after each (which
+  // commits what came in), or with --at-end only once, at the end.
   ZvGC gc;
   ZvPath2f path(static_cast<unsigned int>(points.size()));
   std::unique_ptr<ZvBasePathBuilder> builder = MakeBuilder(o, gc, &path);
   builder->StartSubpath(points.front());
   for (std::size_t i = 1; i + 1 < points.size(); ++i) {
     builder->AddInputPoint(points[i], 0);
-    builder->GetTrailingSamples();
+    if (!o.atEnd) builder->GetTrailingSamples();
   }
   builder->EndSubpath(points.back(), o.close ? 1 : 0);
 

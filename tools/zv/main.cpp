@@ -48,6 +48,7 @@ const char kUsage[] =
     "  --builder linear|cubic|fit  the builder (default fit: least-squares cubics)\n"
     "  --tolerance E            fit error in pixels (default 1)\n"
     "  --close                  close the subpath\n"
+    "  --at-end                 commit once at the end, not after every point (fewer segments)\n"
     "  --png FILE --size WxH    also draw the points and the path (default 512x512)\n";
 
 struct UsageError {
