@@ -53,38 +53,24 @@ inline std::vector<ZvPoint2<float>> Feed(ZvBasePathBuilder& builder, const ZvPoi
   return samples;
 }
 
-// Distance from q to the polyline.
-inline double DistanceToPolyline(const ZvPoint2<float>& q, const ZvPoint2fArray& line) {
+// The point of the polyline nearest to q, over edges from..to - 1: its distance; its arc length
+// by the table `arc` (one entry per vertex) and its edge when asked.
+inline double Nearest(const ZvPoint2<float>& q, const ZvPoint2fArray& line, unsigned int from,
+                      unsigned int to, const std::vector<double>* arc = nullptr,
+                      double* position = nullptr, unsigned int* edge = nullptr) {
   double best = HUGE_VAL;
-  for (unsigned int k = 0; k + 1 < line.size; ++k) {
-    const double ax = line[k].x, ay = line[k].y, bx = line[k + 1].x, by = line[k + 1].y;
-    const double l2 = (bx - ax) * (bx - ax) + (by - ay) * (by - ay);
-    double t = l2 > 0 ? ((q.x - ax) * (bx - ax) + (q.y - ay) * (by - ay)) / l2 : 0.0;
-    t = t < 0 ? 0 : (t > 1 ? 1 : t);
-    best = std::fmin(best, std::hypot(ax + t * (bx - ax) - q.x, ay + t * (by - ay) - q.y));
-  }
-  return best;
-}
-
-// Projects q on the polyline from vertex `from` on, within `window` edges: the arc length of the
-// nearest point (from the polyline's start, by its chord table), its edge in `edge`.
-inline double ArcPosition(const ZvPoint2<float>& q, const ZvPoint2fArray& line,
-                          const std::vector<double>& arc, unsigned int from, unsigned int window,
-                          unsigned int& edge) {
-  double best = HUGE_VAL, position = 0.0;
-  for (unsigned int k = from; k + 1 < line.size && k < from + window; ++k) {
+  for (unsigned int k = from; k + 1 < line.size && k < to; ++k) {
     const double ax = line[k].x, ay = line[k].y, bx = line[k + 1].x, by = line[k + 1].y;
     const double l2 = (bx - ax) * (bx - ax) + (by - ay) * (by - ay);
     double t = l2 > 0 ? ((q.x - ax) * (bx - ax) + (q.y - ay) * (by - ay)) / l2 : 0.0;
     t = t < 0 ? 0 : (t > 1 ? 1 : t);
     const double d = std::hypot(ax + t * (bx - ax) - q.x, ay + t * (by - ay) - q.y);
-    if (d < best) {
-      best = d;
-      position = arc[k] + t * (arc[k + 1] - arc[k]);
-      edge = k;
-    }
+    if (d >= best) continue;
+    best = d;
+    if (arc) *position = (*arc)[k] + t * ((*arc)[k + 1] - (*arc)[k]);
+    if (edge) *edge = k;
   }
-  return position;
+  return best;
 }
 
 // The samples of one open subpath run evenly along the final path: the first is its start, each
@@ -105,11 +91,12 @@ inline void ExpectEvenSamples(const std::vector<ZvPoint2<float>>& samples, const
   unsigned int edge = 0;
   double position = 0.0;
   for (size_t k = 1; k < samples.size(); ++k) {
-    EXPECT_LE(DistanceToPolyline(samples[k], fine), tolerance + 1e-3) << "sample " << k;
+    EXPECT_LE(Nearest(samples[k], fine, 0, fine.size), tolerance + 1e-3) << "sample " << k;
     const double d = std::hypot(samples[k].x - samples[k - 1].x, samples[k].y - samples[k - 1].y);
     EXPECT_LE(d, spacing * 1.0001) << "sample " << k;
     // The next sample lies within a few spacings' worth of fine edges ahead.
-    const double next = ArcPosition(samples[k], fine, arc, edge, 400, edge);
+    double next = 0.0;
+    Nearest(samples[k], fine, edge, edge + 400, &arc, &next, &edge);
     if (k + 1 < samples.size()) {
       EXPECT_NEAR(next - position, spacing, 0.1 * spacing) << "sample " << k;
     }

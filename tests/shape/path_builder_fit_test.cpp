@@ -74,7 +74,7 @@ double WorstPenDistance(const ZvPath2f& path, const ZvPoint2fArray& stroke) {
   path.AltFlatten(0.02, fine, tags);
   double worst = 0.0;
   for (unsigned int i = 0; i < stroke.size; ++i)
-    worst = std::max(worst, DistanceToPolyline(stroke[i], fine));
+    worst = std::max(worst, Nearest(stroke[i], fine, 0, fine.size));
   return worst;
 }
 }  // namespace
