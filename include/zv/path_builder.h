@@ -36,7 +36,11 @@
 //
 // A builder belongs to one thread and has no lock; it locks the target path call by call
 // through the path's own operations. The ZvGC is read at every call and must outlive the
-// builder; the target path is not owned.
+// builder; the target path is not owned and must be set (at construction or by StartSubpath)
+// before the first GetTrailingSamples or EndSubpath.
+//
+// Statistics: the fitting builder counts the points it adds by densifying and the points it
+// hands to its fits in two process-wide counters inside the library, unguarded.
 #ifndef ZV_PATH_BUILDER_H
 #define ZV_PATH_BUILDER_H
 
