@@ -40,7 +40,7 @@ const char kUsage[] =
     "  --stroke W               stroke with line width W pixels (default 0: no stroke)\n"
     "  --join miter|round|bevel --cap flat|round|square --miter-limit M --taper\n"
     "  --invert                 dark shapes on white\n"
-    "       zv fit [options] [FILE]      pen points ('x y [pressure]' a line; FILE or standard\n"
+    "usage: zv fit [options] [FILE]      pen points ('x y [pressure]' a line; FILE or standard\n"
     "                                    input) fed one by one to a path builder, out as SVG\n"
     "                                    path data\n"
     "fit options:\n"
