@@ -14,6 +14,7 @@
 #include <zv/matrix.h>
 #include <zv/oval2f.h>
 #include <zv/path2f.h>
+#include <zv/path_builder.h>
 #include <zv/point.h>
 #include <zv/polyline.h>
 #include <zv/raster.h>

@@ -2,10 +2,12 @@
 //
 //   zv render [options] [FILE]   SVG path data from FILE (or standard input) to a PNG
 //   zv demo [-o FILE]            the built-in scene
+//   zv fit [options] [FILE]      pen points through a path builder, out as SVG path data
 //
 // Every failure is one line on standard error and a non-zero exit: 1 for bad input or output,
 // 2 for a bad command line.
 #include "demo.h"
+#include "fit.h"
 #include "offset.h"
 #include "png_write.h"
 #include "render.h"
@@ -43,7 +45,17 @@ const char kUsage[] =
     "                           tool flattens curves itself: about 15% more time on a 64 px\n"
     "                           icon, 1% at 1024 px\n"
     "  --offset D               also draw the parallel polylines D units to each side\n"
-    "  --invert                 dark shapes on white\n";
+    "  --invert                 dark shapes on white\n"
+    "usage: zv fit [options] [FILE]      pen points ('x y [pressure]' a line; FILE or standard\n"
+    "                                    input) fed one by one to a path builder, out as SVG\n"
+    "                                    path data\n"
+    "fit options:\n"
+    "  -o, --output FILE        path data to write (default standard output)\n"
+    "  --builder linear|cubic|fit  the builder (default fit: least-squares cubics)\n"
+    "  --tolerance E            fit error in pixels (default 1)\n"
+    "  --close                  close the subpath\n"
+    "  --at-end                 commit once at the end, not after every point (fewer segments)\n"
+    "  --png FILE --size WxH    also draw the points and the path (default 512x512)\n";
 
 struct UsageError {
   std::string message;
@@ -218,6 +230,7 @@ int main(int argc, char** argv) {
   try {
     if (command == "render") return Render(args);
     if (command == "demo") return Demo(args);
+    if (command == "fit") return ZvFitCommand(argc, argv);
     if (command == "help" || command == "--help" || command == "-h") {
       std::cout << kUsage;
       return 0;
