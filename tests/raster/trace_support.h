@@ -139,4 +139,35 @@ inline void PaintShapes(ZvRaster<unsigned char>& r, std::mt19937& rng, int shape
   }
 }
 
+// The fuzz target's input: width and height (each byte taken modulo 32, plus 1), the traced
+// value, a perimeter and an area threshold in whole pixels, then the pixels row by row (missing
+// ones are 0).
+struct TraceInput {
+  ZvRaster<unsigned char> raster{1, 1, 0};
+  unsigned char value = 0;
+  double perimeter = 0;
+  double area = 0;
+};
+inline TraceInput DecodeTraceInput(const unsigned char* data, std::size_t size) {
+  TraceInput in;
+  auto byte = [&](std::size_t i) { return i < size ? data[i] : 0; };
+  in.raster.Reconstruct(byte(0) % 32 + 1, byte(1) % 32 + 1, 0);
+  in.value = byte(2);
+  in.perimeter = byte(3);
+  in.area = byte(4);
+  for (int i = 0; i < in.raster.GetSize(); ++i)
+    in.raster.SetVal(i, byte(5 + static_cast<std::size_t>(i)));
+  return in;
+}
+inline std::vector<unsigned char> EncodeTraceInput(const ZvRaster<unsigned char>& r,
+                                                   unsigned char value, unsigned char perimeter,
+                                                   unsigned char area) {
+  std::vector<unsigned char> b = {static_cast<unsigned char>(r.GetWidth() - 1),
+                                  static_cast<unsigned char>(r.GetHeight() - 1), value,
+                                  perimeter, area};
+  for (int i = 0; i < r.GetSize(); ++i)
+    b.push_back(r.GetVal(i));
+  return b;
+}
+
 #endif
