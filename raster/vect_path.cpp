@@ -20,11 +20,12 @@ void Flush(VectClosure& c) {
 int ShouldExtendLastSegment(const VectClosure& closure, const ZvPoint2<float>& p) {
   const ZvPoint2<float>& a = closure.before;
   const ZvPoint2<float>& b = closure.point;
-  const double dx = static_cast<double>(b.x) - a.x, dy = static_cast<double>(b.y) - a.y;
-  if (dx > 0) return std::fabs(static_cast<double>(p.y) - b.y) <= 1e-15 && p.x >= b.x;
-  if (dx < 0) return std::fabs(static_cast<double>(p.y) - b.y) <= 1e-15 && b.x >= p.x;
-  if (dy > 0) return std::fabs(static_cast<double>(p.x) - b.x) <= 1e-15 && p.y >= b.y;
-  if (dy < 0) return std::fabs(static_cast<double>(p.x) - b.x) <= 1e-15 && b.y >= p.y;
+  // Differences of floats are exact in double, so these tests see the exact geometry.
+  auto same = [](float u, float v) { return std::fabs(static_cast<double>(u) - v) <= 1e-15; };
+  if (b.x > a.x) return same(p.y, b.y) && p.x >= b.x;
+  if (b.x < a.x) return same(p.y, b.y) && b.x >= p.x;
+  if (b.y > a.y) return same(p.x, b.x) && p.y >= b.y;
+  if (b.y < a.y) return same(p.x, b.x) && b.y >= p.y;
   return 0;
 }
 

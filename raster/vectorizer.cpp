@@ -4,6 +4,7 @@
 
 #include "raster/ob_context.h"
 #include "raster/vect_path.h"
+#include "shape/shape_lock.h"
 
 #include <cmath>
 
@@ -51,6 +52,9 @@ unsigned int ZvVectorizer::Vectorize(const ZvRaster<unsigned char>& raster, unsi
                                      const ZvExtent2<float>& extent, ZvPath2f& path) const {
   VectClosure closure{};
   closure.path = &path;
+  // One hold for the whole trace: the appends below then take the recursive lock without a
+  // round trip to the other threads, and no reader sees half a component.
+  ZvShapeLock guard(path);
   Trace(raster, value, extent, VectPathTable(), &closure);
   return closure.emitted;
 }
