@@ -80,61 +80,40 @@ inline RegionCount CountRegions(const ZvRaster<unsigned char>& r, unsigned char 
   return count;
 }
 
-// Random discs, rings, nested rings, U and n shapes, lone and corner-touching pixels, painted
-// with 1 on 0.
+// Random shapes painted with 1 on 0: concentric discs of alternating value (a disc, a ring,
+// nested rings with a dot), U and n shapes, diagonals of pixels touching at corners, scatters.
 inline void PaintShapes(ZvRaster<unsigned char>& r, std::mt19937& rng, int shapes) {
   const int w = r.GetWidth(), h = r.GetHeight();
   auto set = [&](int x, int y, unsigned char v) {
     if (x >= 0 && y >= 0 && x < w && y < h) r.SetVal(x, y, v);
   };
-  auto disc = [&](double cx, double cy, double rad, unsigned char v) {
-    for (int y = static_cast<int>(cy - rad) - 1; y <= cy + rad + 1; ++y)
-      for (int x = static_cast<int>(cx - rad) - 1; x <= cx + rad + 1; ++x)
-        if ((x + 0.5 - cx) * (x + 0.5 - cx) + (y + 0.5 - cy) * (y + 0.5 - cy) <= rad * rad)
-          set(x, y, v);
-  };
-  auto box = [&](int x0, int y0, int x1, int y1, unsigned char v) {
-    for (int y = y0; y < y1; ++y)
-      for (int x = x0; x < x1; ++x)
-        set(x, y, v);
-  };
   std::uniform_real_distribution<double> u(0.0, 1.0);
   for (int s = 0; s < shapes; ++s) {
-    const double cx = u(rng) * w, cy = u(rng) * h;
-    const double rad = 1 + u(rng) * std::min(w, h) / 4.0;
+    const double cx = u(rng) * w, cy = u(rng) * h, rad = 1 + u(rng) * std::min(w, h) / 4.0;
     const int x0 = static_cast<int>(cx), y0 = static_cast<int>(cy);
-    const int size = 3 + static_cast<int>(u(rng) * 10);
-    switch (static_cast<int>(u(rng) * 7)) {
-      case 0:
-        disc(cx, cy, rad, 1);
-        break;
-      case 1:  // ring
-        disc(cx, cy, rad + 2, 1);
-        disc(cx, cy, rad, 0);
-        break;
-      case 2:  // nested rings with a dot in the middle
-        disc(cx, cy, rad + 6, 1);
-        disc(cx, cy, rad + 4, 0);
-        disc(cx, cy, rad + 2, 1);
-        disc(cx, cy, rad, 0);
-        disc(cx, cy, rad / 3, 1);
-        break;
-      case 3:  // U
-        box(x0, y0, x0 + size, y0 + size, 1);
-        box(x0 + 1, y0, x0 + size - 1, y0 + size - 2, 0);
-        break;
-      case 4:  // n
-        box(x0, y0, x0 + size, y0 + size, 1);
-        box(x0 + 1, y0 + 2, x0 + size - 1, y0 + size, 0);
-        break;
-      case 5:  // pixels touching at corners
-        for (int k = 0; k < size; ++k)
-          set(x0 + k, y0 + k, 1);
-        break;
-      default:  // a scatter of pixels
-        for (int k = 0; k < 4 * size; ++k)
-          set(x0 + static_cast<int>(u(rng) * size), y0 + static_cast<int>(u(rng) * size), 1);
-        break;
+    const int size = 3 + static_cast<int>(u(rng) * 10), kind = static_cast<int>(u(rng) * 4);
+    if (kind == 0) {
+      const int rings = 1 + static_cast<int>(u(rng) * 5);
+      for (int k = 0; k < rings; ++k) {
+        const double rk = rad + 2 * (rings - 1 - k);
+        for (int y = static_cast<int>(cy - rk) - 1; y <= cy + rk + 1; ++y)
+          for (int x = static_cast<int>(cx - rk) - 1; x <= cx + rk + 1; ++x)
+            if ((x + 0.5 - cx) * (x + 0.5 - cx) + (y + 0.5 - cy) * (y + 0.5 - cy) <= rk * rk)
+              set(x, y, k % 2 ? 0 : 1);
+      }
+    } else if (kind == 1) {  // U or n: a box hollowed from the top or from the bottom
+      const bool n = u(rng) < 0.5;
+      for (int y = 0; y < size; ++y)
+        for (int x = 0; x < size; ++x) {
+          const bool inside = x > 0 && x < size - 1 && (n ? y >= 2 : y < size - 2);
+          set(x0 + x, y0 + y, inside ? 0 : 1);
+        }
+    } else if (kind == 2) {
+      for (int k = 0; k < size; ++k)
+        set(x0 + k, y0 + k, 1);
+    } else {
+      for (int k = 0; k < 4 * size; ++k)
+        set(x0 + static_cast<int>(u(rng) * size), y0 + static_cast<int>(u(rng) * size), 1);
     }
   }
 }
@@ -163,8 +142,8 @@ inline std::vector<unsigned char> EncodeTraceInput(const ZvRaster<unsigned char>
                                                    unsigned char value, unsigned char perimeter,
                                                    unsigned char area) {
   std::vector<unsigned char> b = {static_cast<unsigned char>(r.GetWidth() - 1),
-                                  static_cast<unsigned char>(r.GetHeight() - 1), value,
-                                  perimeter, area};
+                                  static_cast<unsigned char>(r.GetHeight() - 1), value, perimeter,
+                                  area};
   for (int i = 0; i < r.GetSize(); ++i)
     b.push_back(r.GetVal(i));
   return b;
