@@ -1,6 +1,6 @@
 // Tracing rasters into paths: Vectorize (exact pixel-edge contours) and VectorizeAndFit (the
 // same fitted with cubics at gc.flattenTolerance 1 pixel) against the peer bitmap tracer's full
-// trace (its default parameters, except that it keeps every speck, as zv does). Scenes: glyph
+// trace (its default parameters, except that it keeps every dot, as zv does). Scenes: glyph
 // shapes filled by zv's aliased fill at 1024x1024 and, the same page at four times the
 // resolution, 4096x4096; and 50% noise at 512x512. Each contender traces the dark pixels of a
 // raster prepared outside the timing, in the form it takes (8-bit pixels for zv, a packed

@@ -36,12 +36,12 @@ TEST(TraceSvg, ThresholdAndInversionChooseTheRegion) {
   EXPECT_EQ(contours, 0u);
 }
 
-TEST(TraceSvg, FittingWritesCubicsAndTheAreaFilterDropsSpecks) {
+TEST(TraceSvg, FittingWritesCubicsAndTheAreaFilterDropsDots) {
   ZvRaster<unsigned char> grey(40, 40, 255);
   for (int y = 0; y < 40; ++y)
     for (int x = 0; x < 40; ++x)
       if ((x - 20) * (x - 20) + (y - 20) * (y - 20) < 15 * 15) grey.SetVal(x, y, 0);
-  grey.SetVal(0, 39, 0);  // a speck of one pixel
+  grey.SetVal(0, 39, 0);  // a dot of one pixel
   ZvTraceOptions o;
   unsigned int contours = 0;
   ZvTraceToSvg(grey, o, contours);
