@@ -1,7 +1,6 @@
 // The sweep: rows read one by one, each compared with the rows above and below.
 #include "raster/ob_context.h"
 
-#include <algorithm>
 #include <utility>
 
 namespace {

@@ -64,5 +64,6 @@ unsigned int ZvVectorizer::VectorizeAndFit(const ZvRaster<unsigned char>& raster
                                            const ZvGC& gc, ZvPath2f& path) const {
   ZvPath2f polygons(1);
   if (!Vectorize(raster, value, extent, polygons)) return 0;
+  ZvShapeLock guard(path);
   return VectFitPolygons(polygons, gc, path);
 }

@@ -25,8 +25,9 @@
 //
 // An object holds only the two thresholds; a call allocates everything it needs and frees it
 // before returning. Concurrent calls on one object are safe as long as nobody changes the
-// thresholds meanwhile; the output path must not be shared while a call appends to it.
-// Allocation failure lets std::bad_alloc through; what was appended to the path by then stays.
+// thresholds meanwhile. The output path stays locked while a call appends to it, so another
+// thread sees it before or after the call, never half traced. Allocation failure lets
+// std::bad_alloc through; what was appended to the path by then stays.
 #ifndef ZV_VECTORIZER_H
 #define ZV_VECTORIZER_H
 
