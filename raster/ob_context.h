@@ -19,6 +19,7 @@
 
 #include <cstdint>
 #include <memory>
+#include <utility>
 #include <vector>
 
 // Corner types. Birth, split, death and merge corners come in left and right pairs; a step
@@ -113,7 +114,9 @@ class ObPool {
       return p;
     }
     if (chunks.empty() || used == kChunk) {
-      chunks.emplace_back(new T[kChunk]);
+      // Owned before the list grows, so that a failure to grow it frees the chunk.
+      std::unique_ptr<T[]> chunk(new T[kChunk]);
+      chunks.push_back(std::move(chunk));
       used = 0;
     }
     T* p = &chunks.back()[used++];
