@@ -173,7 +173,6 @@ void ObVectorize(ObContext& ctx, const ZvRaster<unsigned char>& raster, unsigned
                  const ZvExtent2<float>& extent);
 void ObProcessRow(ObContext& ctx, const std::uint16_t* prev, const std::uint16_t* cur,
                   const std::uint16_t* next, int y);
-void ObAdvanceWall(ObContext& ctx, ObActiveWall* wall, int x);
 
 // Events. Birth and split insert their two walls after `after` and answer the right one; death
 // and merge remove the pair and answer the wall left of it.

@@ -26,19 +26,9 @@ class ObNeighbours {
   unsigned int started = 0;  // runs starting no further right than its end
 };
 
-// Done with run p: its right wall moves to its end, and it dies if nothing is below it. `wall`
-// is the wall left of p's right wall, or p's right wall itself after a birth.
-ObActiveWall* Finish(ObContext& ctx, ObActiveWall* wall, const ObRun& p, int y) {
-  if (p.aboveCount) {
-    wall = wall->next;
-    ObAdvanceWall(ctx, wall, p.end);
-  }
-  if (!p.belowCount) wall = ObMakeDeath(ctx, wall->prev, wall, y);
-  return wall;
-}
-}  // namespace
-
-void ObAdvanceWall(ObContext& ctx, ObActiveWall* wall, int x) {
+// Moves a wall to column x for the next row. Called for every wall on every row, so it is kept
+// where the sweep can inline it.
+inline void ObAdvanceWall(ObContext& ctx, ObActiveWall* wall, int x) {
   const int step = x - wall->x;
   if (wall->fresh) {
     // The birth or split corner already stands for the wall's first row.
@@ -64,6 +54,18 @@ void ObAdvanceWall(ObContext& ctx, ObActiveWall* wall, int x) {
   wall->y = static_cast<std::uint16_t>(wall->y + 1);
   wall->x = static_cast<std::uint16_t>(x);
 }
+
+// Done with run p: its right wall moves to its end, and it dies if nothing is below it. `wall`
+// is the wall left of p's right wall, or p's right wall itself after a birth.
+ObActiveWall* Finish(ObContext& ctx, ObActiveWall* wall, const ObRun& p, int y) {
+  if (p.aboveCount) {
+    wall = wall->next;
+    ObAdvanceWall(ctx, wall, p.end);
+  }
+  if (!p.belowCount) wall = ObMakeDeath(ctx, wall->prev, wall, y);
+  return wall;
+}
+}  // namespace
 
 void ObProcessRow(ObContext& ctx, const std::uint16_t* prev, const std::uint16_t* cur,
                   const std::uint16_t* next, int y) {
