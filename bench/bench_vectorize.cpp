@@ -6,6 +6,8 @@
 // raster prepared outside the timing, in the form it takes (8-bit pixels for zv, a packed
 // bitmap for the peer), and builds its whole result every iteration.
 //
+// The sweep alone, writing no path, runs as a fourth case.
+//
 // Run with --benchmark_repetitions=N (N odd, 5 or more on a shared machine): the summary gives
 // median CPU times, the ratios to the peer (targets: Vectorize at most 0.1, VectorizeAndFit at
 // most 0.5), paths and segments of each result, and the growth from 1024^2 to 4096^2.
@@ -123,6 +125,26 @@ void ZvVectorize(benchmark::State& state, int scene) {
   Count(state, path);
 }
 
+// The sweep alone, its corners counted instead of written into a path: how much of Vectorize
+// is the tracing and how much the path it builds.
+void ZvSweep(benchmark::State& state, int scene) {
+  const ZvRaster<unsigned char>& r = GetScene(scene);
+  const ZvVectorizer v(0, 0);
+  long corners = 0;
+  const ObCallbackTable table = {nullptr,
+                                 nullptr,
+                                 [](int, int, void* u) { ++*static_cast<long*>(u); },
+                                 [](int, int, void* u) { ++*static_cast<long*>(u); },
+                                 nullptr,
+                                 nullptr};
+  for (auto _ : state) {
+    corners = 0;
+    v.Trace(r, 0, r.GetExtent2f(), table, &corners);
+    benchmark::DoNotOptimize(corners);
+  }
+  state.counters["corners"] = static_cast<double>(corners);
+}
+
 void ZvVectorizeAndFit(benchmark::State& state, int scene) {
   const ZvRaster<unsigned char>& r = GetScene(scene);
   const ZvVectorizer v(0, 0);
@@ -177,7 +199,7 @@ void Potrace(benchmark::State& state, int scene) {
 }
 #endif
 
-const char* const kContenders[] = {"vectorize", "vectorize_fit", "potrace"};
+const char* const kContenders[] = {"vectorize", "vectorize_fit", "potrace", "sweep"};
 
 std::string Key(int scene, const char* contender) {
   return std::string(kScenes[scene]) + "/" + contender;
@@ -193,6 +215,8 @@ void Register() {
     benchmark::RegisterBenchmark(Key(scene, kContenders[2]).c_str(), Potrace, scene)
         ->Unit(benchmark::kMillisecond);
 #endif
+    benchmark::RegisterBenchmark(Key(scene, kContenders[3]).c_str(), ZvSweep, scene)
+        ->Unit(benchmark::kMillisecond);
   }
 }
 
@@ -222,8 +246,15 @@ void PrintSummary(const ZvMedianReporter& reporter) {
                 counter(scene, 0, "segments"), counter(scene, 1, "segments"),
                 counter(scene, 2, "segments"));
   }
+  std::printf("\nThe sweep alone (corners counted, no path written):\n");
+  for (int scene = 0; scene < 3; ++scene) {
+    const double sw = ms(scene, 3), p = ms(scene, 2);
+    if (sw > 0.0)
+      std::printf("  %-11s %8.3f ms, %.3f of the peer, %.0f corner calls\n", kScenes[scene], sw,
+                  p > 0.0 ? sw / p : 0.0, counter(scene, 3, "corners"));
+  }
   std::printf("\nGrowth from glyphs1024 to glyphs4096 (16 times the pixels; target at most 16):\n");
-  for (int c = 0; c < 3; ++c) {
+  for (int c = 0; c < 4; ++c) {
     const double small = ms(0, c), large = ms(1, c);
     if (small > 0.0 && large > 0.0)
       std::printf("  %-14s %6.2f%s\n", kContenders[c], large / small,
