@@ -24,5 +24,6 @@
 #include <zv/std_fcurve.h>
 #include <zv/trace.h>
 #include <zv/transfo4.h>
+#include <zv/vectorizer.h>
 
 #endif

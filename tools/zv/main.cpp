@@ -3,6 +3,7 @@
 //   zv render [options] [FILE]   SVG path data from FILE (or standard input) to a PNG
 //   zv demo [-o FILE]            the built-in scene
 //   zv fit [options] [FILE]      pen points through a path builder, out as SVG path data
+//   zv trace [options] PNG       a PNG's dark regions traced into an SVG path
 //
 // Every failure is one line on standard error and a non-zero exit: 1 for bad input or output,
 // 2 for a bad command line.
@@ -12,6 +13,7 @@
 #include "png_write.h"
 #include "render.h"
 #include "svg_path.h"
+#include "trace.h"
 
 #include <cerrno>
 #include <cmath>
@@ -28,6 +30,7 @@ namespace {
 const char kUsage[] =
     "usage: zv render [options] [FILE]   render SVG path data (FILE or standard input)\n"
     "       zv demo [-o FILE]            render the built-in scene (default zv-demo.png)\n"
+    "       zv trace [options] PNG       trace a PNG's dark regions into an SVG path\n"
     "render options:\n"
     "  -o, --output FILE        PNG to write (required)\n"
     "  --size WxH               raster size in pixels (default 256x256)\n"
@@ -55,7 +58,13 @@ const char kUsage[] =
     "  --tolerance E            fit error in pixels (default 1)\n"
     "  --close                  close the subpath\n"
     "  --at-end                 commit once at the end, not after every point (fewer segments)\n"
-    "  --png FILE --size WxH    also draw the points and the path (default 512x512)\n";
+    "  --png FILE --size WxH    also draw the points and the path (default 512x512)\n"
+    "trace options:\n"
+    "  -o, --output FILE        SVG to write (default: standard output)\n"
+    "  --threshold N            grey values below N are dark (default 128)\n"
+    "  --invert                 trace the light regions instead\n"
+    "  --fit TOL                fit cubics within TOL pixels (default: exact pixel edges)\n"
+    "  --min-area A             drop contours enclosing less than A square pixels\n";
 
 struct UsageError {
   std::string message;
@@ -231,6 +240,7 @@ int main(int argc, char** argv) {
     if (command == "render") return Render(args);
     if (command == "demo") return Demo(args);
     if (command == "fit") return ZvFitCommand(argc, argv);
+    if (command == "trace") return ZvTraceCommand(argc - 2, argv + 2);
     if (command == "help" || command == "--help" || command == "-h") {
       std::cout << kUsage;
       return 0;
