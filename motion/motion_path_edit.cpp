@@ -41,10 +41,11 @@ int InsertNodeOnCubic(ZvMotionPath3dImpl& m, unsigned int i, double time, double
   }
   ZvPoint3<double> halves[5];
   ZvBezierTool_SplitCubic3d(m.controlPoints.data + i, halves, u);
+  // The halves are P0, h0, h1, h2 and h2, h3, h4, P3: h2 is the new node.
   m.controlPoints[i + 1] = halves[0];
-  m.controlPoints[i + 2] = halves[4];
+  m.controlPoints[i + 2] = halves[1];
   void* const none[3] = {nullptr, nullptr, nullptr};
-  m.controlPoints.InsertBefore(i + 3, halves + 1, 3);
+  m.controlPoints.InsertBefore(i + 3, halves + 2, 3);
   m.clientData.InsertBefore(i + 3, none, 3);
   m.InsertNodeRecord(i / 3 + 1, time, 0);
   // The search above flattened the segment as it was.

@@ -72,9 +72,9 @@ class ZV_API ZvMotionPath3d {
   };
 
   // Node flag bit 0: the segment leaving the node is a straight line.
-  static const unsigned char sm_LINENODE = 1;
+  static constexpr unsigned char sm_LINENODE = 1;
   // Node flag bit 1: G1 continuity is locked at the node.
-  static const unsigned char sm_G1LOCKED = 2;
+  static constexpr unsigned char sm_G1LOCKED = 2;
 
   // ---- Construction -------------------------------------------------------------------------
   ZvMotionPath3d();  // empty: grows by Moveto, then Lineto/Curveto or their Pre forms
