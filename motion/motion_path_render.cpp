@@ -4,6 +4,7 @@
 #include <zv/polyline.h>
 
 #include <cmath>
+#include <limits>
 
 #include "core/scoped_lock.h"
 #include "motion/motion_path_impl.h"
@@ -39,14 +40,24 @@ struct RenderOutput {
 struct TickGrid {
   double origin, step, j, latest;
   double Time() const { return origin + j * step; }
-  // Moves past `time`, for a segment drawn without ticks.
+  // The next tick time after `current`; infinite when the grid cannot resolve the next step,
+  // which ends the segment's ticks instead of repeating one tick forever.
+  double Advance(double current) {
+    j += 1.0;
+    const double next = Time();
+    return next > current ? next : std::numeric_limits<double>::infinity();
+  }
+  // Moves to the first tick at or after `time`, for a segment drawn without ticks. The quotient
+  // is rounded, so its ceiling may be one step off either way.
   void SkipTo(double time) {
     const double k = std::ceil((time - origin) / step);
-    if (k > j) j = k;
-    while (Time() < time)
+    if (!(k > j)) return;
+    j = k;
+    if (Time() < time) {
       j += 1.0;
-    while (j > 0.0 && origin + (j - 1.0) * step >= time)
+    } else if (origin + (j - 1.0) * step >= time) {
       j -= 1.0;
+    }
   }
 };
 
@@ -84,7 +95,7 @@ void RenderSegment(const ZvMotionPath3dImpl& m, unsigned int node, double tolera
   ZvMotionTiming timing{t0, t1, arc->length, true, 0.0, 0.0, 0.0};
   if (!straight) timing = m.SegmentTiming(i, arc->length, tolerance, cache);
   unsigned int v = 0;
-  for (double tick = grid.Time(); tick < t1; grid.j += 1.0, tick = grid.Time()) {
+  for (double tick = grid.Time(); tick < t1; tick = grid.Advance(tick)) {
     const double s = timing.ArcLength(tick);
     for (; v < end && chords[v] < s && s - chords[v] > 1e-7; ++v)
       out.Vertex(poly[v], grid.latest, node);
