@@ -14,8 +14,8 @@ bool SameBits(double a, double b) {
 }
 }  // namespace
 
-const ZvMotionSegmentArc& ZvMotionArcCache::Segment(const ZvPoint3dArray& points, unsigned int i,
-                                                    double tolerance) {
+ZvMotionSegmentArc& ZvMotionArcCache::Segment(const ZvPoint3dArray& points, unsigned int i,
+                                              double tolerance) {
   const std::size_t segments = points.size / 3;
   if (entries_.size() != segments || !SameBits(tolerance, tolerance_)) {
     entries_.clear();

@@ -13,11 +13,24 @@
 #include <memory>
 #include <vector>
 
+// How arc length runs with time along one segment.
+struct ZvMotionTiming {
+  double t0, t1, length;
+  bool constantSpeed;
+  double c3, c2, c1;  // the cubic in absolute time when the speed is not constant
+  // Distance from the segment start at `time`, within [0, length].
+  double ArcLength(double time) const;
+};
+
 struct ZvMotionSegmentArc {
-  ZvMotionSegmentArc() : polyline(32), chords(32), length(0.0) {}
+  ZvMotionSegmentArc() : polyline(32), chords(32), length(0.0), timed(false), timing() {}
   ZvPoint3dArray polyline;
   ZvDoubleArray chords;  // running length at each polyline vertex
   double length;
+  // The timing depends on times and tangent information too, which edits change; it is kept
+  // here because every edit empties the cache anyway.
+  bool timed;
+  ZvMotionTiming timing;
 };
 
 class ZvMotionArcCache {
@@ -32,7 +45,7 @@ class ZvMotionArcCache {
 
   // The segment of `points` that starts at control index i (a node, not the last), flattened to
   // `tolerance`. The reference stays valid until Clear or a call with another tolerance.
-  const ZvMotionSegmentArc& Segment(const ZvPoint3dArray& points, unsigned int i, double tolerance);
+  ZvMotionSegmentArc& Segment(const ZvPoint3dArray& points, unsigned int i, double tolerance);
   void Clear() { entries_.clear(); }
 
  private:

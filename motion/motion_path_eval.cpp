@@ -21,7 +21,7 @@ int ZvMotionPath3dImpl::EvalOnCubic(unsigned int i, double time, double toleranc
 }
 
 int ZvMotionPath3dImpl::Eval(double time, double tolerance, ZvPoint3<double>& out) const {
-  if (controlPoints.size == 0) return 0;
+  if (controlPoints.size == 0 || std::isnan(time)) return 0;
   int exact = 0;
   const unsigned int at = LocateTimeValue(time, exact);
   if (at == 0) {

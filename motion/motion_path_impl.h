@@ -24,15 +24,6 @@ struct ZvTwoSidedTangent {
   }
 };
 
-// Arc length along one segment as a function of time.
-struct ZvMotionTiming {
-  double t0, t1, length;
-  bool constantSpeed;
-  double c3, c2, c1;  // the cubic in absolute time when the speed is not constant
-  // Distance from the segment start at `time`, within [0, length].
-  double ArcLength(double time) const;
-};
-
 class ZvMotionPath3dImpl {
  public:
   ZvMotionPath3dImpl();
@@ -89,6 +80,8 @@ class ZvMotionPath3dImpl {
   ZvUByteArray nodeFlags;
   ZvDynArray<ZvTwoSidedTangent> tangents;
   mutable ZvMotionArcCache arcs;
+  // The segment of the last time search: evaluations at sequential times mostly stay in it.
+  mutable unsigned int timeHint = 0;
 };
 
 #endif

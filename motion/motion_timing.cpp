@@ -15,6 +15,12 @@ unsigned int ZvMotionPath3dImpl::LocateTimeValue(double time, int& isExact) cons
     isExact = std::fabs(time - t[k - 1]) <= 1e-15;
     return k;
   }
+  // A time well inside the hinted segment is where the bisection would end too: no node time
+  // lies within 1e-15 of it, so no exact hit is missed.
+  if (timeHint + 1 < k && time - t[timeHint] > 1e-15 && t[timeHint + 1] - time > 1e-15) {
+    isExact = 0;
+    return timeHint + 1;
+  }
   unsigned int low = 0, high = k - 1;
   while (high - low > 1) {
     const unsigned int mid = (low + high) / 2;
@@ -29,6 +35,7 @@ unsigned int ZvMotionPath3dImpl::LocateTimeValue(double time, int& isExact) cons
     }
   }
   isExact = 0;
+  timeHint = low;
   return low + 1;
 }
 
