@@ -4,13 +4,17 @@
 #include <zv/bezier_tool.h>
 #include <zv/polyline.h>
 
+#include <cstdint>
 #include <cstring>
 
 namespace {
 // Tolerances are compared by their bits, so that 0.0 and -0.0 or two NaNs never share entries
 // that a fresh flatten might lay out differently.
 bool SameBits(double a, double b) {
-  return std::memcmp(&a, &b, sizeof a) == 0;
+  std::uint64_t x, y;
+  std::memcpy(&x, &a, sizeof x);
+  std::memcpy(&y, &b, sizeof y);
+  return x == y;
 }
 }  // namespace
 

@@ -10,6 +10,31 @@ ZvMotionPath3dImpl::ZvMotionPath3dImpl()
 ZvMotionPath3dImpl::ZvMotionPath3dImpl(int)
     : controlPoints(1), clientData(1), initialTimes(1), nodeFlags(1), tangents(1) {}
 
+namespace {
+
+// A resize that throws has already set the size; the elements are still in place.
+template <class Array>
+void ReserveExtra(Array& a, unsigned int extra) {
+  const unsigned int size = a.size;
+  try {
+    a.Resize(size + extra);
+  } catch (...) {
+    a.Chop(size);
+    throw;
+  }
+  a.Chop(size);
+}
+
+}  // namespace
+
+void ZvMotionPath3dImpl::Reserve(unsigned int points) {
+  ReserveExtra(controlPoints, points);
+  ReserveExtra(clientData, points);
+  ReserveExtra(initialTimes, 1);
+  ReserveExtra(nodeFlags, 1);
+  ReserveExtra(tangents, 1);
+}
+
 void ZvMotionPath3dImpl::InsertNodeRecord(unsigned int node, double time, unsigned char flags) {
   initialTimes.InsertBefore(node, time);
   nodeFlags.InsertBefore(node, flags);

@@ -6,6 +6,7 @@
 
 int ZvMotionPath3dImpl::Moveto(const ZvPoint3<double>& p, double time) {
   if (NumPoints() != 0) return 0;
+  Reserve(1);
   controlPoints.Add(p);
   clientData.Add(nullptr);
   InsertNodeRecord(0, time, 0);
@@ -14,6 +15,7 @@ int ZvMotionPath3dImpl::Moveto(const ZvPoint3<double>& p, double time) {
 
 int ZvMotionPath3dImpl::Lineto(const ZvPoint3<double>& p, double time) {
   if (NumPoints() == 0 || !(time > initialTimes[NumNodes() - 1])) return 0;
+  Reserve(3);
   nodeFlags[NumNodes() - 1] |= ZvMotionPath3d::sm_LINENODE;
   // The handles of a line sit on its end so that flattening the segment as a cubic (for the
   // speed of a neighbour) still gives the chord's length.
@@ -28,6 +30,7 @@ int ZvMotionPath3dImpl::Lineto(const ZvPoint3<double>& p, double time) {
 int ZvMotionPath3dImpl::Curveto(const ZvPoint3<double>& c1, const ZvPoint3<double>& c2,
                                 const ZvPoint3<double>& p, double time) {
   if (NumPoints() == 0 || !(time > initialTimes[NumNodes() - 1])) return 0;
+  Reserve(3);
   const unsigned int joint = LastIndex();
   controlPoints.Add(c1);
   controlPoints.Add(c2);
@@ -60,6 +63,7 @@ int ZvMotionPath3d::PreLineto(const ZvPoint3<double>& p, double time) {
   ZvScopedLock guard(lock);
   ZvMotionPath3dImpl& m = impl->ForEdit();
   if (m.NumPoints() == 0 || !(time < m.initialTimes[0])) return 0;
+  m.Reserve(3);
   const ZvPoint3<double> copies[3] = {p, p, p};
   void* const none[3] = {nullptr, nullptr, nullptr};
   m.controlPoints.InsertBefore(0, copies, 3);
@@ -73,6 +77,7 @@ int ZvMotionPath3d::PreCurveto(const ZvPoint3<double>& c1, const ZvPoint3<double
   ZvScopedLock guard(lock);
   ZvMotionPath3dImpl& m = impl->ForEdit();
   if (m.NumPoints() == 0 || !(time < m.initialTimes[0])) return 0;
+  m.Reserve(3);
   const ZvPoint3<double> points[3] = {c1, c2, p};
   void* const none[3] = {nullptr, nullptr, nullptr};
   m.controlPoints.InsertBefore(0, points, 3);

@@ -4,11 +4,23 @@
 #include <zv/transfo4.h>
 
 #include <cmath>
+#include <new>
 
 #include "core/scoped_lock.h"
 #include "motion/motion_path_impl.h"
 
 namespace {
+
+// Removes a closed range. The arrays give memory back when they fall below half full; if that
+// allocation fails the elements are already gone and the array is sound, so the failure is
+// not passed on, which would leave the other arrays of the path out of step.
+template <class Array>
+void RemoveRange(Array& a, unsigned int first, unsigned int last) {
+  try {
+    a.RemoveClosedRange(first, last);
+  } catch (const std::bad_alloc&) {
+  }
+}
 
 // Index of a node that starts a segment, or false.
 bool IsSegmentStart(const ZvMotionPath3dImpl& m, unsigned int index) {
@@ -20,6 +32,7 @@ int InsertNodeOnLineSegment(ZvMotionPath3dImpl& m, unsigned int i, double time) 
   const double u =
       (time - m.initialTimes[node]) / (m.initialTimes[node + 1] - m.initialTimes[node]);
   const ZvPoint3<double> q = m.controlPoints[i] + (m.controlPoints[i + 3] - m.controlPoints[i]) * u;
+  m.Reserve(3);
   const ZvPoint3<double> copies[3] = {q, q, q};
   void* const none[3] = {nullptr, nullptr, nullptr};
   m.controlPoints.InsertBefore(i + 3, copies, 3);
@@ -39,6 +52,7 @@ int InsertNodeOnCubic(ZvMotionPath3dImpl& m, unsigned int i, double time, double
         !(u > 0.0 && u < 1.0))
       return 0;
   }
+  m.Reserve(3);
   ZvPoint3<double> halves[5];
   ZvBezierTool_SplitCubic3d(m.controlPoints.data + i, halves, u);
   // The halves are P0, h0, h1, h2 and h2, h3, h4, P3: h2 is the new node.
@@ -188,11 +202,11 @@ unsigned int ZvMotionPath3d::RemoveNodes(unsigned int first, unsigned int last) 
     from = first - 1;
     to = last + 1;
   }
-  m.controlPoints.RemoveClosedRange(from, to);
-  m.clientData.RemoveClosedRange(from, to);
-  m.initialTimes.RemoveClosedRange(first / 3, last / 3);
-  m.nodeFlags.RemoveClosedRange(first / 3, last / 3);
-  m.tangents.RemoveClosedRange(first / 3, last / 3);
+  RemoveRange(m.controlPoints, from, to);
+  RemoveRange(m.clientData, from, to);
+  RemoveRange(m.initialTimes, first / 3, last / 3);
+  RemoveRange(m.nodeFlags, first / 3, last / 3);
+  RemoveRange(m.tangents, first / 3, last / 3);
   return to - from + 1;
 }
 

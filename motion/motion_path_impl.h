@@ -71,7 +71,11 @@ class ZvMotionPath3dImpl {
   // After an edit next to a locked end node: lock again, or drop the lock if that fails.
   void RelockOrClear(unsigned int index);
 
-  // Points, client data, times, tangents and flags of whole segments.
+  // Room for `points` more points and one more node in every array, so that the insertions of
+  // an edit that follow cannot fail half way and leave the arrays out of step. Throws
+  // std::bad_alloc with the path unchanged.
+  void Reserve(unsigned int points);
+  // The time, tangents and flags of a new node.
   void InsertNodeRecord(unsigned int node, double time, unsigned char flags);
 
   ZvPoint3dArray controlPoints;
