@@ -82,9 +82,11 @@ unsigned int ReadBody(ZvByteReader& in, std::unique_ptr<ZvMotionPath3dImpl>& res
       t.left = t.right = ZvMotionPath3d::Constant;
       continue;
     }
-    t.left = static_cast<ZvMotionPath3d::TangentInfo>(in.U8());
-    t.right = static_cast<ZvMotionPath3d::TangentInfo>(in.U8());
-    if (!ZvTwoSidedTangent::IsValid(t.left) || !ZvTwoSidedTangent::IsValid(t.right)) return 0;
+    // Checked as bytes: an enumeration must never hold a value it does not name.
+    const unsigned int left = in.U8(), right = in.U8();
+    if (left > ZvMotionPath3d::Ease || right > ZvMotionPath3d::Ease) return 0;
+    t.left = static_cast<ZvMotionPath3d::TangentInfo>(left);
+    t.right = static_cast<ZvMotionPath3d::TangentInfo>(right);
   }
   for (unsigned int j = 0; j < k; ++j)
     m->nodeFlags[j] = in.U8();

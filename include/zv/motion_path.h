@@ -13,10 +13,11 @@
 // segment's flattened polyline. Straight segments are timed linearly whatever their tangents.
 // Before the first node time the path sits on its first point, after the last on its last.
 //
-// Tolerance. Evaluation and rendering flatten cubics to `tolerance` (same units as the points).
-// Flattened segments are kept, per tolerance, until the path is next edited, so repeated
-// evaluation costs a search rather than a flatten; a different tolerance starts afresh. Cached
-// and fresh evaluations give the same bits.
+// Tolerance. Evaluation and rendering flatten cubics to `tolerance` (same units as the points,
+// positive). The number of polyline points grows with the ratio of a segment's size to the
+// tolerance, so keep the tolerance in proportion to the path. Flattened segments are kept, per
+// tolerance, until the path is next edited, so repeated evaluation costs a search rather than a
+// flatten; a different tolerance starts afresh. Cached and fresh evaluations give the same bits.
 //
 // Indices are control point indices unless named otherwise; a node index argument is a control
 // point index divisible by 3. Operations returning int give 1 (or a positive count) on success
@@ -114,7 +115,8 @@ class ZV_API ZvMotionPath3d {
 
   // ---- Evaluation ---------------------------------------------------------------------------
   // The position at `time`. At a node time (within 1e-15) the node itself. Returns 1, or 0 when
-  // the path is empty (out untouched) or the segment has no length (out = its start node).
+  // the path is empty or time is NaN (out untouched) or the segment has no length (out = its
+  // start node).
   int Eval(double time, double tolerance, ZvPoint3<double>& out, int = 0) const;
   // Appends Eval(t) for t = from, from + step, ... while t <= to (t accumulated by addition).
   // Returns 1; 0 with nothing appended when the path is empty or step does not advance t.
