@@ -15,6 +15,8 @@
 #include <zv/path2f.h>
 #include <zv/point.h>
 #include <zv/polyline.h>
+#include <zv/quat.h>
+#include <zv/quat_fcurve.h>
 #include <zv/raster.h>
 #include <zv/shape.h>
 #include <zv/spline.h>
