@@ -102,7 +102,9 @@ unsigned int ZvQuatCurve::SetKey(const ZvQuatKey& key, double tolerance) {
   }
   const auto at = std::find_if(keys.begin(), keys.end(),
                                [&](const ZvQuatKey& k) { return !(k.time < key.time); });
-  return static_cast<unsigned int>(keys.insert(at, key) - keys.begin());
+  const auto index = at - keys.begin();
+  keys.insert(at, key);
+  return static_cast<unsigned int>(index);
 }
 
 unsigned int ZvQuatCurve::SetKey(double time, const ZvPoint3<double>& radians, double tolerance) {
