@@ -110,8 +110,7 @@ void ZvQuat::Get(ZvPoint3<double>& radians, const ZvPoint3<double>& seed) const 
   radians.z = WrapNear(best.z, seed.z);
 }
 
-ZvQuat operator*(const ZvQuat& p, const ZvQuat& q) {
-  return ZvQuat(
-      p.w * q.w - p.x * q.x - p.y * q.y - p.z * q.z, p.w * q.x + p.x * q.w + p.y * q.z - p.z * q.y,
-      p.w * q.y - p.x * q.z + p.y * q.w + p.z * q.x, p.w * q.z + p.x * q.y - p.y * q.x + p.z * q.w);
+ZvQuat ZvQuat::operator*(const ZvQuat& q) const {
+  return ZvQuat(w * q.w - x * q.x - y * q.y - z * q.z, w * q.x + x * q.w + y * q.z - z * q.y,
+                w * q.y - x * q.z + y * q.w + z * q.x, w * q.z + x * q.y - y * q.x + z * q.w);
 }

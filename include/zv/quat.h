@@ -36,10 +36,10 @@ struct ZV_API ZvQuat {
   // within pi of its seed angle. At gimbal lock only x - z (or x + z) is determined; the change
   // from the seed's combination is split evenly between x and z.
   void Get(ZvPoint3<double>& radians, const ZvPoint3<double>& seed) const;
-};
 
-// Hamilton product a b: b is applied first.
-ZV_API ZvQuat operator*(const ZvQuat& a, const ZvQuat& b);
+  // Hamilton product (*this) q: q is applied first.
+  ZvQuat operator*(const ZvQuat& q) const;
+};
 
 // Cumulative Hermite interpolation in log space: q0 exp(a B1(u)) exp(m B2(u)) exp(b B3(u)) with
 // B1 = 1 - (1 - u)^3, B2 = 3u^2 - 2u^3, B3 = u^3. a, m and b are pure quaternions (w ignored);
