@@ -182,15 +182,6 @@ unsigned int ZvQuatFCurve::EvalInverse(double, double& parameter, int) const {
   return 0;
 }
 
-unsigned int ZvQuatFCurve::Cut(double, double, ZvBaseFCurve&) {
-  return 0;
-}
-unsigned int ZvQuatFCurve::Append(const ZvBaseFCurve&) {
-  return 0;
-}
-unsigned int ZvQuatFCurve::Paste(const ZvBaseFCurve&, double, double) {
-  return 0;
-}
 unsigned int ZvQuatFCurve::MirrorParameters() {
   return 0;
 }

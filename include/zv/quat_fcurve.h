@@ -138,8 +138,15 @@ class ZV_API ZvQuatCurve {
 // Only the parameter lock, the value lock and the whole-key lock (both) are supported.
 //
 // The persistent block of this kind comes with curve persistence; until then GetBufferSize,
-// WriteToBuffer and ReadFromBufferBody answer 0. Cut, Paste, Append, SmoothSequence and
-// ReduceNumKeys also answer 0 and change nothing.
+// WriteToBuffer and ReadFromBufferBody answer 0. SmoothSequence, ReduceNumKeys and
+// MirrorParameters also answer 0 and change nothing.
+//
+// Cut, Paste and Append move whole rotations (all three angles of the keys). Cut puts keys with
+// the evaluated rotation at both ends, gives `cutOut` (a rotation view, whose rotation is
+// replaced) the keys between them, and closes the gap: the curve goes on from start as it went
+// on from end. Paste replaces [start, end] by the source's keys and moves the later keys by the
+// length difference. Append puts the source's first key on the last key. All three refuse a
+// parameter-locked key that would move, and Cut a value-locked key in the interval.
 class ZV_API ZvQuatFCurve : public ZvBaseFCurve {
  public:
   // A view of a new rotation curve of its own.
@@ -266,6 +273,9 @@ class ZV_API ZvQuatFCurve : public ZvBaseFCurve {
   unsigned int Set(const ZvBaseFCurve& curve) override;
 
  private:
+  void MoveTail(unsigned int index, double delta);
+  void DropKeys(unsigned int first, unsigned int last);
+
   ZvQuatCurve* m_curve;
   unsigned int m_component;
 };

@@ -266,4 +266,48 @@ TEST_F(QuatViews, CopiesSnapshotsAndResamples) {
   EXPECT_EQ(other.GetNumKeys(), 5u);
 }
 
+TEST_F(QuatViews, CutPasteAndAppendMoveWholeRotations) {
+  for (double t : {0.0, 1.0, 2.0, 3.0, 4.0}) {
+    x.CreateKey(t, 15.0 * t);
+    y.CreateKey(t, -5.0 * t);
+  }
+  const ZvPoint3<double> at3 = x.GetQuatCurve()->Eval(3.0);
+  ZvQuatFCurve piece(2);
+  ASSERT_EQ(z.Cut(1.0, 3.0, piece), 1u);
+  // The piece holds the keys of [1, 3] with all their angles.
+  ASSERT_EQ(piece.GetNumKeys(), 3u);
+  EXPECT_NEAR(piece.GetQuatCurve()->GetKeyValue(2, 0), 45.0, 1e-9);
+  EXPECT_NEAR(piece.GetQuatCurve()->GetKeyValue(2, 1), -15.0, 1e-9);
+  // The gap closes: what was at 3 is now at 1, and the key at 4 at 2.
+  ZvDoubleArray params;
+  x.GetAllKeyParameters(params);
+  ASSERT_EQ(params.size, 3u);
+  EXPECT_EQ(params[1], 1.0);
+  EXPECT_EQ(params[2], 2.0);
+  EXPECT_NEAR(x.GetQuatCurve()->Eval(1.0).x, at3.x, 1e-12);
+
+  // Pasting the piece back where it came from restores the keys and their times.
+  ASSERT_EQ(y.Paste(piece, 1.0, 1.0), 1u);
+  params.Resize(0);
+  x.GetAllKeyParameters(params);
+  ASSERT_EQ(params.size, 5u);
+  for (unsigned int i = 0; i < 5; ++i) {
+    EXPECT_EQ(params[i], i);
+    EXPECT_NEAR(x.GetQuatCurve()->GetKeyValue(i, 0), 15.0 * i, 1e-9);
+  }
+
+  // Appending puts the piece's first key on the last key.
+  ASSERT_EQ(x.Append(piece), 1u);
+  EXPECT_EQ(x.GetNumKeys(), 7u);
+  double last;
+  x.GetLargestKeyParameter(last);
+  EXPECT_EQ(last, 6.0);
+  EXPECT_NEAR(x.GetQuatCurve()->GetKeyValue(4, 0), 15.0, 1e-9);
+
+  double t = 5.0;
+  x.SetConstraint(t, ZvBaseFCurve::ParameterLock, 1, 0.0);
+  EXPECT_EQ(x.Cut(1.0, 2.0, piece), 0u);  // the locked key would move
+  EXPECT_EQ(x.GetNumKeys(), 7u);
+}
+
 }  // namespace
