@@ -123,8 +123,7 @@ unsigned int ZvQuatFCurve::RemoveHead(double parameter) {
   if (n == 0) return 1;
   const double first = m_curve->GetKeyTime(0);
   if (zvIsSameParameter(first, parameter)) return 1;
-  if (AreAnyKeysLockedInInterval(first, parameter, 0, 1) ||
-      AreAnyValuesLockedInInterval(first, parameter, 0, 1) ||
+  if (AreAnyValuesLockedInInterval(first, parameter, 0, 1) ||
       AreAnyParametersLockedInInterval(first, parameter, 0, 1)) {
     return 0;
   }
@@ -210,8 +209,18 @@ unsigned int ZvQuatFCurve::ScaleAndOffsetParameters(double start, double end, do
   if (zvIsSameParameter(scale, 1.0) && zvIsSameParameter(offset, 0.0)) return 1;
   // The keys beyond the interval that a moving head or tail carries along.
   const double firstKey = m_curve->GetKeyTime(0), lastKey = m_curve->GetKeyTime(n - 1);
-  if (moveHead) (offset > 0.0 ? end : start) = offset > 0.0 ? lastKey : firstKey;
-  if (moveTail) (offset > 0.0 ? start : end) = offset > 0.0 ? firstKey : lastKey;
+  if (moveHead) {
+    if (offset > 0.0)
+      end = lastKey;
+    else
+      start = firstKey;
+  }
+  if (moveTail) {
+    if (offset > 0.0)
+      start = firstKey;
+    else
+      end = lastKey;
+  }
   unsigned int first, last;
   if (!QuatKeyIndicesInInterval(m_curve->GetKeys(), start, end, first, last, 0, 0)) return 1;
   // Keys with constraint data stay where they are.
@@ -244,5 +253,39 @@ unsigned int ZvQuatFCurve::SetConstraint(double& parameter, KeyConstraint constr
   if (code & (ParameterLock | WholeKeyLock)) m_curve->SetParamLock(i, on);
   if (code & (ValueLock | WholeKeyLock)) m_curve->SetValueLock(i, on);
   parameter = m_curve->GetKeyTime(i);
+  return 1;
+}
+
+unsigned int ZvQuatFCurve::AppendLinearSegment(const ZvPoint2<double>& point) {
+  ZvFCurveLockGuard hold(*this);
+  const unsigned int n = m_curve->GetNumKeys();
+  if (m_curve->IsReadOnly() || n == 0 || !(point.x > m_curve->GetKeyTime(n - 1))) return 0;
+  m_curve->SetKey(point.x, m_component, point.y, 0.0);
+  return 1;
+}
+
+unsigned int ZvQuatFCurve::AppendOrExtendLinearSegment(const ZvPoint2<double>& point,
+                                                       double tolerance) {
+  ZvFCurveLockGuard hold(*this);
+  const unsigned int n = m_curve->GetNumKeys();
+  if (m_curve->IsReadOnly() || n == 0 || !(point.x > m_curve->GetKeyTime(n - 1))) return 0;
+  if (n >= 2) {
+    const double t0 = m_curve->GetKeyTime(n - 2), t1 = m_curve->GetKeyTime(n - 1);
+    const double v0 = m_curve->GetKeyValue(n - 2, m_component);
+    const double v1 = m_curve->GetKeyValue(n - 1, m_component);
+    const double onLine = v0 + (v1 - v0) * (point.x - t0) / (t1 - t0);
+    if (std::fabs(onLine - point.y) <= tolerance) {
+      if (HasUserData(t1)) {
+        ZvDoubleArray from(1), to(1);
+        from.Add(t1);
+        to.Add(point.x);
+        MoveKeyUserDataTail(from, to);
+      }
+      m_curve->SetParameter(n - 1, point.x);
+      m_curve->SetKeyValue(n - 1, m_component, onLine);
+      return 1;
+    }
+  }
+  m_curve->SetKey(point.x, m_component, point.y, 0.0);
   return 1;
 }

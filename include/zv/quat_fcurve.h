@@ -165,6 +165,13 @@ class ZV_API ZvQuatFCurve : public ZvBaseFCurve {
   // the values at both ends count. 0 without keys.
   unsigned int GetValueBoundsBetween(double start, double end, double& low, double& high) const;
 
+  // Pen input: a key at the point (x the time, y degrees), which must lie right of the last key.
+  // 0 without keys or read-only.
+  unsigned int AppendLinearSegment(const ZvPoint2<double>& point);
+  // The same, except that when the line through the last two keys' values passes within
+  // `tolerance` of the point, the last key moves onto that line at the point's time instead.
+  unsigned int AppendOrExtendLinearSegment(const ZvPoint2<double>& point, double tolerance);
+
   // ---- The contract of ZvBaseFCurve ----
   ZvBaseFCurve& operator=(const ZvBaseFCurve& other) override;
   ZvBaseFCurve* QueryFCurveKind(Kind kind) const override;

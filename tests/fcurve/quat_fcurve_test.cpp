@@ -310,4 +310,21 @@ TEST_F(QuatViews, CutPasteAndAppendMoveWholeRotations) {
   EXPECT_EQ(x.GetNumKeys(), 7u);
 }
 
+TEST_F(QuatViews, PenInputExtendsALineOrAppendsAKey) {
+  EXPECT_EQ(y.AppendLinearSegment(ZvPoint2<double>{1.0, 10.0}), 0u);  // nothing to append to
+  y.CreateKey(0.0, 0.0);
+  ASSERT_EQ(y.AppendLinearSegment(ZvPoint2<double>{1.0, 10.0}), 1u);
+  EXPECT_EQ(y.AppendLinearSegment(ZvPoint2<double>{0.5, 10.0}), 0u);  // not right of the last key
+  // On the line through the last two keys: the last key moves there.
+  ASSERT_EQ(y.AppendOrExtendLinearSegment(ZvPoint2<double>{2.0, 20.05}, 0.1), 1u);
+  EXPECT_EQ(x.GetNumKeys(), 2u);
+  double v;
+  ASSERT_EQ(y.GetKeyValue(2.0, ZvBaseFCurve::RightSide, v, 0.0), 1u);
+  EXPECT_NEAR(v, 20.0, 1e-9);
+  // Off the line: a new key.
+  ASSERT_EQ(y.AppendOrExtendLinearSegment(ZvPoint2<double>{3.0, 0.0}, 0.1), 1u);
+  EXPECT_EQ(x.GetNumKeys(), 3u);
+  EXPECT_NEAR(y.Eval(3.0, 0), 0.0, 1e-9);
+}
+
 }  // namespace
