@@ -46,8 +46,15 @@ ZvQuat Slerp(const ZvQuat& p, ZvQuat q, double s) {
   return QuatSum(QuatScaled(p, wp), QuatScaled(q, wq));
 }
 
+// A count of periods as an integer; 0 for a count that is not finite (times not increasing),
+// and at most 2^52, beyond which a double no longer tells the periods apart.
+long long Periods(double count) {
+  if (!(std::fabs(count) <= 4503599627370496.0)) return 0;
+  return static_cast<long long>(count);
+}
+
 // q to an integer power, by squaring so that far periods cost a logarithmic number of products.
-ZvQuat Power(ZvQuat q, long k) {
+ZvQuat Power(ZvQuat q, long long k) {
   if (k < 0) {
     q = QuatInverse(q);
     k = -k;
@@ -202,7 +209,7 @@ ZvQuat ZvQuatSpline::EvalAfterLast(double t) const {
   const double first = head.t0, last = tail.t1, period = last - first;
   switch (extrapolation) {
     case 4: {
-      const long k = static_cast<long>(std::ceil((t - first) / period)) - 1;
+      const long long k = Periods(std::ceil((t - first) / period) - 1.0);
       const double r = std::fmod(t - first, period);
       double at = std::fabs(r) <= 1e-9 ? last : first + r;
       at = std::min(std::max(at, first), last);
@@ -232,7 +239,7 @@ ZvQuat ZvQuatSpline::EvalBeforeFirst(double t) const {
   const double first = head.t0, last = tail.t1, period = last - first;
   switch (extrapolation) {
     case 4: {
-      const long k = static_cast<long>(std::floor((t - first) / period));
+      const long long k = Periods(std::floor((t - first) / period));
       const double r = std::fmod(first - t, period);
       double at = std::fabs(r) <= 1e-9 ? first : last - r;
       at = std::min(std::max(at, first), last);

@@ -142,6 +142,7 @@ void ZvQuatCurveFlatten(const ZvQuatCurve& curve, double start, double end,
 
 double ZvQuatKeyDelta(const ZvQuatCurve& curve, int i) {
   const int n = static_cast<int>(curve.GetNumKeys());
+  if (n < 2) return 0.0;
   int m = i % (n - 1);
   if (m < 0) m += n - 1;
   return curve.GetKeyTime(static_cast<unsigned int>(m + 1)) -
@@ -234,8 +235,12 @@ unsigned int ZvQuatFCurve::ResampleSequence(double start, double end, double ste
     bool key;
   };
   std::vector<Sample> samples;
-  for (double t = start; t < end - 1e-6; t += step)
+  const double count = std::ceil((end - 1e-6 - start) / step);
+  if (count > 2147483647.0) return 0;
+  for (long i = 0; i < count; ++i) {
+    const double t = start + static_cast<double>(i) * step;
     samples.push_back({t, m_curve->Eval(t), false});
+  }
   samples.push_back({end, m_curve->Eval(end), false});
   for (const ZvQuatKey& k : m_curve->GetKeys()) {
     const bool inside = k.time >= start && k.time <= end;

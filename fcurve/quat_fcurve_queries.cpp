@@ -222,7 +222,11 @@ unsigned int ZvQuatFCurve::EvalSequence(double start, double end, double step, d
   ZvFCurveLockGuard hold(*this);
   parameters.Resize(0);
   values.Resize(0);
-  for (double t = start; t < end; t += step) {
+  // Samples counted, not summed, so that a step lost in the rounding of t cannot stall the walk.
+  const double count = std::ceil((end - start) / step);
+  if (count > 2147483647.0) return 0;
+  for (long i = 0; i < count; ++i) {
+    const double t = start + static_cast<double>(i) * step;
     parameters.Add(t);
     values.Add(m_curve->Eval(t, m_component));
   }

@@ -270,4 +270,31 @@ TEST_F(QuatExtrapolation, LinearKeepsTurningAtTheEndSpeed) {
   }
 }
 
+TEST(QuatSpline, DegenerateTimesAndFarTimesStayDefined) {
+  // Keys at one time make no span; far or NaN times make no period count. Evaluation must still
+  // return (not loop or trap), and far periods of a proper spline stay unit rotations.
+  const ZvQuatKey same[3] = {ZvQuatKey(1.0, ZvPoint3<double>{0.1, 0, 0}, 0.f, 0.f, 0.f, 0),
+                             ZvQuatKey(1.0, ZvPoint3<double>{0.2, 0, 0}, 0.f, 0.f, 0.f, 0),
+                             ZvQuatKey(1.0, ZvPoint3<double>{0.3, 0, 0}, 0.f, 0.f, 0.f, 0)};
+  const ZvQuatKey two[2] = {ZvQuatKey(0.0, ZvPoint3<double>{0.1, 0.2, 0}, 0.f, 0.f, 0.f, 0),
+                            ZvQuatKey(1.0, ZvPoint3<double>{0.5, 0, 0.3}, 0.f, 0.f, 0.f, 0)};
+  for (unsigned int method = 1; method <= 4; ++method) {
+    const ZvQuatSpline flat(3, same, method);
+    for (double t : {0.0, 1.0, 2.0, std::nan("")})
+      flat.Eval(t);
+    const ZvQuatSpline s(2, two, method);
+    for (double t : {1e300, -1e300, 1e17}) {
+      const ZvQuat q = s.Eval(t);
+      EXPECT_TRUE(std::isfinite(Dot(q, q))) << method << " " << t;
+      // The linear method's angle that far out is lost to rounding; the others fold or count
+      // periods and keep a rotation.
+      if (method != 2) {
+        EXPECT_NEAR(Dot(q, q), 1.0, 1e-6) << method << " " << t;
+      }
+    }
+  }
+  EXPECT_EQ(ZvQuatSpline(1, two, 1).GetNumSegments(), 0u);
+  EXPECT_EQ(ZvQuatSpline(1, two, 1).Eval(0.5).w, 1.0);
+}
+
 }  // namespace
