@@ -151,7 +151,7 @@ class ZV_API ZvQuatFCurve : public ZvBaseFCurve {
  public:
   // A view of a new rotation curve of its own.
   explicit ZvQuatFCurve(unsigned int component = 0);
-  // A view of `curve`, which gains a reference.
+  // A view of `curve` (not null), which gains a reference.
   ZvQuatFCurve(ZvQuatCurve* curve, unsigned int component);
   // Takes the source's component and a copy of its rotation curve; user data are not copied.
   ZvQuatFCurve(const ZvQuatFCurve& other);

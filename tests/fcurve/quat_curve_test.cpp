@@ -126,6 +126,16 @@ TEST(QuatCurve, ReferenceCountDecidesItsLife) {
   }
   EXPECT_EQ(c->GetRefCount(), 1);
   c->UnRef();  // frees it; the leak checker of the sanitizer build watches this
+
+  // Without an outside reference the rotation outlives the view that made it.
+  ZvQuatFCurve* maker = new ZvQuatFCurve(0);
+  ZvQuatFCurve* other = new ZvQuatFCurve(maker->GetQuatCurve(), 1);
+  maker->CreateKey(1.0, 10.0);
+  delete maker;
+  EXPECT_EQ(other->GetNumKeys(), 1u);
+  EXPECT_NEAR(other->Eval(2.0, 0), 0.0, 1e-12);
+  EXPECT_EQ(other->GetQuatCurve()->GetRefCount(), 1);
+  delete other;
 }
 
 }  // namespace
