@@ -49,7 +49,8 @@ class ZV_API ZvQuatCurve {
   // The nearest key within the tolerance takes every field of `key` (its time too); otherwise
   // `key` is inserted in time order. Returns its index.
   unsigned int SetKey(const ZvQuatKey& key, double tolerance);
-  // The same with tension, continuity, bias and spins 0.
+  // The same with tension, continuity, bias, spins and locks 0: a key found within the tolerance
+  // loses its own.
   unsigned int SetKey(double time, const ZvPoint3<double>& radians, double tolerance);
   // Evaluates the rotation at `time`, replaces one angle by `degrees`, and sets that key: the
   // other two angles of a new key keep the curve's current shape.
@@ -136,6 +137,8 @@ class ZV_API ZvQuatCurve {
 // three, with the other two angles taken from the evaluated rotation. The function curve has no
 // clamping (it reports the extreme doubles), no tangents, no segment kinds and no inverse.
 // Only the parameter lock, the value lock and the whole-key lock (both) are supported.
+// CreateKey sets a whole key: on an existing key its tension, continuity, bias, spins and locks
+// return to 0 (set them on the rotation curve's ZvQuatKey).
 //
 // The persistent block of this kind comes with curve persistence; until then GetBufferSize,
 // WriteToBuffer and ReadFromBufferBody answer 0. SmoothSequence, ReduceNumKeys and
