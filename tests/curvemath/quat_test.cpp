@@ -6,6 +6,8 @@
 #include <random>
 #include <vector>
 
+#include "curvemath/quat_ops.h"
+
 namespace {
 
 constexpr double kPi = 3.141592653589793;
@@ -295,6 +297,33 @@ TEST(QuatSpline, DegenerateTimesAndFarTimesStayDefined) {
   }
   EXPECT_EQ(ZvQuatSpline(1, two, 1).GetNumSegments(), 0u);
   EXPECT_EQ(ZvQuatSpline(1, two, 1).Eval(0.5).w, 1.0);
+}
+
+TEST(QuatSpline, IncomingTangentFollowsTheFirstKeysContinuity) {
+  // The incoming tangent at a segment's second key weighs the rotation after it with the
+  // continuity of the segment's first key. Changing only that continuity must move it.
+  std::vector<ZvQuatKey> keys{ZvQuatKey(0.0, ZvPoint3<double>{0.0, 0.1, 0.0}, 0.f, 0.f, 0.f, 0),
+                              ZvQuatKey(1.0, ZvPoint3<double>{0.6, 0.2, 0.1}, 0.f, 0.f, 0.f, 0),
+                              ZvQuatKey(2.0, ZvPoint3<double>{0.9, -0.3, 0.7}, 0.f, 0.f, 0.f, 0)};
+  const ZvQuatSpline before(3, keys.data(), 1);
+  keys[0].continuity = 0.5f;
+  const ZvQuatSpline after(3, keys.data(), 1);
+  const ZvQuat& b0 = before.GetSegment(0).b;
+  const ZvQuat& b1 = after.GetSegment(0).b;
+  // With the second key's parameters 0 the incoming tangent is k (L2 + (1 + c) L3), k = 1/2
+  // here, and b is a third of it: raising c by 0.5 adds L3 / 12, L3 the log of the step after.
+  const ZvQuat q1(keys[1].angles), q2(keys[2].angles);
+  const ZvQuat l3 = QuatLog(QuatInverse(q1) * q2);
+  EXPECT_NEAR(b1.x - b0.x, l3.x / 12, 1e-12);
+  EXPECT_NEAR(b1.y - b0.y, l3.y / 12, 1e-12);
+  EXPECT_NEAR(b1.z - b0.z, l3.z / 12, 1e-12);
+  EXPECT_GT(LogLength(l3), 0.1);
+  // The second segment's own incoming tangent is untouched by the first key.
+  const ZvQuat& c0 = before.GetSegment(1).b;
+  const ZvQuat& c1 = after.GetSegment(1).b;
+  EXPECT_EQ(c0.x, c1.x);
+  EXPECT_EQ(c0.y, c1.y);
+  EXPECT_EQ(c0.z, c1.z);
 }
 
 }  // namespace
