@@ -18,6 +18,8 @@
 #include <zv/path_builder.h>
 #include <zv/point.h>
 #include <zv/polyline.h>
+#include <zv/quat.h>
+#include <zv/quat_fcurve.h>
 #include <zv/raster.h>
 #include <zv/rect2f.h>
 #include <zv/shape.h>
