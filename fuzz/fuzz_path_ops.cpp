@@ -65,9 +65,22 @@ void Check(const ZvPath2f& path) {
   delete copy;
 }
 
+// A flatten's cost grows with the path's size over the tolerance, up to the flatteners' cap of
+// 2^24 points, and sampling's with the size over the spacing, up to 2^24 samples (both caps are
+// tested on their own): finer steps than a millionth of the path's size would only measure that
+// cost here. Non-positive and non-finite steps still get through.
+double Tolerance(const ZvPath2f& path, double asked) {
+  ZvExtent2<float> box;
+  path.GetExtent(box);
+  const double size =
+      std::fmax(std::fabs(double(box.xmax) - box.xmin), std::fabs(double(box.ymax) - box.ymin));
+  return std::isfinite(size) ? std::fmax(asked, size * 1e-6) : asked;
+}
+
 void Step(ZvPath2f& path, Input& in) {
   const unsigned int n = path.NumPoints();
   ZvGC gc;
+  gc.flattenTolerance = Tolerance(path, gc.flattenTolerance);
   ZvPoint2fArray points;
   ZvPointTagArray tags;
   switch (in.Byte() % 24) {
@@ -123,13 +136,12 @@ void Step(ZvPath2f& path, Input& in) {
       path.ShearX(in.Number(), in.Number());
       break;
     case 15:
-      gc.flattenTolerance = in.Number();
-      gc.transform.Scale(in.Number(), in.Number(), 1.0);
+      gc.flattenTolerance = Tolerance(path, in.Number());
       path.Flatten(gc, points, tags);
       break;
     case 16:
-      gc.sampleSpacing = in.Number();
-      gc.flattenTolerance = in.Number();
+      gc.sampleSpacing = Tolerance(path, in.Number());
+      gc.flattenTolerance = Tolerance(path, in.Number());
       path.Sample(gc, points, tags);
       break;
     case 17: {

@@ -9,7 +9,7 @@
 // never evaluates the curve. As with the cubic free functions of <zv/bezier_tool.h>, the point
 // count is a pure function of the control points and the tolerance, and the last point added
 // is the last control point itself. For a cubic the counts agree with ZvBezierTool_FlattenCubic2f.
-// Like the cubic free functions, a flatten that would grow its array beyond 2^22 points throws
+// Like the cubic free functions, a flatten that would grow its array beyond 2^24 points throws
 // std::bad_alloc before adding anything.
 //
 // Fitting. OpenFit and ClosedFit turn a polyline (pen input, samples) into Bezier segments

@@ -30,7 +30,7 @@
 // The tolerance must be positive. A negative one yields P0 and P3 only; zero yields at most the
 // deepest subdivision (1023 midpoints) with no walk inside the pieces.
 //
-// No flatten grows its output array beyond 2^22 points: one that would (coordinates near the
+// No flatten grows its output array beyond 2^24 points: one that would (coordinates near the
 // float range, a vanishing tolerance) throws std::bad_alloc before adding anything, as a failed
 // allocation would.
 // ---------------------------------------------------------------------------------------------
