@@ -152,6 +152,39 @@ class CFCKeySearch : public Store {
     if (GetClosestKeyIndexInCenteredInterval(t, kCFCSnapTolerance, i)) t = keys[i].parameter;
   }
 
+  // Brings t into the keyed range for the cycle methods and counts the periods (two keys or
+  // more). The right version sends a whole number of periods to the last key, the left version
+  // to the first.
+  double CycleOffsetFold(double t, double& cycles, bool left) const {
+    const unsigned int n = keys.size;
+    const double first = keys[0].parameter, last = keys[n - 1].parameter;
+    const double period = last - first;
+    const double r = (t - first) / period;
+    double folded;
+    if (left) {
+      cycles = std::floor(r);
+      if (first - t <= 1e-9) {
+        const double w = period * (r - std::floor(r));
+        folded = std::fabs(w) <= 1e-9 ? first : first + w;
+      } else {
+        const double w = period * (std::ceil(r) - r);
+        folded = std::fabs(w) <= 1e-9 ? first : last - w;
+      }
+    } else {
+      cycles = std::ceil(r) - 1.0;
+      if (t > first) {
+        const double w = period * (r - std::floor(r));
+        folded = std::fabs(w) <= 1e-9 ? last : first + w;
+      } else {
+        const double w = period * (std::ceil(r) - r);
+        folded = std::fabs(w) <= 1e-9 ? last : last - w;
+      }
+    }
+    if (folded < first) folded = first;
+    if (folded > last) folded = last;
+    return folded;
+  }
+
   // Folds t and moves both bounds by the same displacement, then orders the bounds and clamps
   // t into them.
   void FoldBoundsAndParameter(double& start, double& end, double& t) const {
