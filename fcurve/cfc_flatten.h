@@ -541,4 +541,27 @@ unsigned int CFCEvalSequence(const Impl& s, double start, double end, double ste
   return parameters.size;
 }
 
+// Defines the drawing and sampling slots of a keyed curve class, which holds its implementation
+// object in `m_impl`; each takes the curve's lock.
+#define ZV_CFC_DRAWING_SLOTS(Class)                                                                \
+  unsigned int Class::Flatten(const ZvTransfo4& transfo, double tolerance, ZvPoint2dArray& points, \
+                              ZvPointTagArray& tags, int clamped) const {                          \
+    ZvFCurveLockGuard guard(*this);                                                                \
+    return CFCFlatten(*m_impl, transfo, tolerance, points, tags, clamped);                         \
+  }                                                                                                \
+  unsigned int Class::FlattenFromTo(const ZvExtent2<double>& box, const ZvTransfo4& transfo,       \
+                                    double tolerance, ZvPoint2dArray& points,                      \
+                                    ZvPointTagArray& tags, ZvBoolArray& extrapolated, int clamped) \
+      const {                                                                                      \
+    ZvFCurveLockGuard guard(*this);                                                                \
+    return CFCFlattenFromTo(*m_impl, box, transfo, tolerance, points, tags, extrapolated,          \
+                            clamped);                                                              \
+  }                                                                                                \
+  unsigned int Class::EvalSequence(double start, double end, double step, double tolerance,        \
+                                   ZvDoubleArray& parameters, ZvDoubleArray& values, int clamped)  \
+      const {                                                                                      \
+    ZvFCurveLockGuard guard(*this);                                                                \
+    return CFCEvalSequence(*m_impl, start, end, step, tolerance, parameters, values, clamped);     \
+  }
+
 #endif

@@ -16,6 +16,7 @@
 #include <zv/point.h>
 #include <zv/polyline.h>
 #include <zv/raster.h>
+#include <zv/raw_fcurve.h>
 #include <zv/shape.h>
 #include <zv/spline.h>
 #include <zv/std_fcurve.h>
