@@ -29,21 +29,6 @@ ZvRawFCurve::ZvRawFCurve(const ZvPoint2dArray& points, double tolerance)
   m_impl->SetToApproxLinearFitC0(points, tolerance);
 }
 
-ZvRawFCurve::ZvRawFCurve(const ZvRawFCurve& other) : ZvRawFCurve(other, ZvFCurveLockGuard(other)) {}
-
-ZvRawFCurve::ZvRawFCurve(const ZvRawFCurve& other, const ZvFCurveLockGuard&)
-    : ZvBaseFCurve(other), m_impl(new ZvRawFCurveImpl(*other.m_impl)) {}
-
-ZvRawFCurve::ZvRawFCurve(const ZvRawFCurve& source, double start, double end)
-    : ZvRawFCurve(source) {
-  ZvFCurveLockGuard guard(*this);
-  CFCSingleValueCurve<ZvRawFCurve, ZvRawFCurveImpl>::KeepSection(*this, start, end);
-}
-
-ZvRawFCurve::~ZvRawFCurve() {
-  delete m_impl;
-}
-
 ZV_CFC_SINGLE_VALUE_SLOTS(ZvRawFCurve, ZvRawFCurveImpl)
 
 ZvBaseFCurve::Kind ZvRawFCurve::GetKind() const {
@@ -66,25 +51,6 @@ unsigned int ZvRawFCurve::MergeAndCreateKey(double start, double end, double par
   }
   return m_impl->MergeAndCreateKey(start, end, parameter, value, *this, excludeStart, excludeEnd,
                                    keepAttributes);
-}
-
-unsigned int ZvRawFCurve::CreateNonModifyingKey(double parameter, int noFold) {
-  ZvFCurveLockGuard guard(*this);
-  if (m_impl->readOnly || !std::isfinite(parameter)) return 0;
-  if (!noFold) m_impl->FoldParameter(parameter);
-  unsigned int index;
-  return m_impl->CreateNonModifyingKey(parameter, index, *this);
-}
-
-// The value is read on the curve before its keys change.
-unsigned int ZvRawFCurve::MergeAndCreateNonModifyingKey(double start, double end, double parameter,
-                                                        int excludeStart, int excludeEnd,
-                                                        int keepAttributes, int noFold) {
-  ZvFCurveLockGuard guard(*this);
-  if (!std::isfinite(parameter)) return 0;
-  if (!noFold) m_impl->FoldParameter(parameter);
-  const double value = Eval(parameter, 0);
-  return MergeAndCreateKey(start, end, parameter, value, excludeStart, excludeEnd, keepAttributes);
 }
 
 unsigned int ZvRawFCurve::SetValueWhenNoKeys(double value) {

@@ -69,7 +69,7 @@ unsigned int ZvRawFCurve::SmoothSequence(double start, double end, const double*
                                          unsigned int kernelSize) {
   ZvFCurveLockGuard guard(*this);
   return CFCSingleValueCurve<ZvRawFCurve, ZvRawFCurveImpl>::SmoothSequence(*this, start, end,
-                                                                          kernel, kernelSize);
+                                                                           kernel, kernelSize);
 }
 
 unsigned int ZvRawFCurve::ReduceNumKeys(double tolerance) {
