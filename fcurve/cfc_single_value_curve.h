@@ -473,6 +473,34 @@ struct CFCSingleValueCurve {
 // Defines the slots that the kinds of one value per key answer alike, by the functions above.
 #define ZV_CFC_SINGLE_VALUE_SLOTS(Class, Impl)                                                     \
   using Class##Ops = CFCSingleValueCurve<Class, Impl>;                                             \
+  Class::Class(const Class& other) : Class(other, ZvFCurveLockGuard(other)) {}                     \
+  Class::Class(const Class& other, const ZvFCurveLockGuard&)                                       \
+      : ZvBaseFCurve(other), m_impl(new Impl(*other.m_impl)) {}                                    \
+  Class::Class(const Class& source, double start, double end) : Class(source) {                    \
+    ZvFCurveLockGuard guard(*this);                                                                \
+    Class##Ops::KeepSection(*this, start, end);                                                    \
+  }                                                                                                \
+  Class::~Class() {                                                                                \
+    delete m_impl;                                                                                 \
+  }                                                                                                \
+  unsigned int Class::CreateNonModifyingKey(double parameter, int noFold) {                        \
+    ZvFCurveLockGuard guard(*this);                                                                \
+    if (m_impl->readOnly || !std::isfinite(parameter)) return 0;                                   \
+    if (!noFold) m_impl->FoldParameter(parameter);                                                 \
+    unsigned int index;                                                                            \
+    return m_impl->CreateNonModifyingKey(parameter, index, *this);                                 \
+  }                                                                                                \
+  /* The value is read on the curve before its keys change. */                                     \
+  unsigned int Class::MergeAndCreateNonModifyingKey(double start, double end, double parameter,    \
+                                                    int excludeStart, int excludeEnd,              \
+                                                    int keepAttributes, int noFold) {              \
+    ZvFCurveLockGuard guard(*this);                                                                \
+    if (!std::isfinite(parameter)) return 0;                                                       \
+    if (!noFold) m_impl->FoldParameter(parameter);                                                 \
+    const double value = Eval(parameter, 0);                                                       \
+    return MergeAndCreateKey(start, end, parameter, value, excludeStart, excludeEnd,               \
+                             keepAttributes);                                                      \
+  }                                                                                                \
   Class& Class::operator=(const Class& other) {                                                    \
     Class##Ops::Set(*this, other);                                                                 \
     return *this;                                                                                  \
