@@ -63,24 +63,23 @@ class CFCKeySearch : public Store {
         return c + forward + 1;
       }
     }
-    unsigned int low = 0, high = n - 1;
-    if (lowEnd > t) {
-      high = c - back;
-    } else if (t > highEnd) {
-      low = c + forward;
+    // Here k[low] < t < k[high]; the neighbourhood, when t lies outside it, narrows the range.
+    // Which side t lies on is as good as random, so nothing below branches on it: a
+    // mispredicted branch per halving would cost more than the whole search. The step is added
+    // through a mask, which compilers do not turn back into a branch.
+    unsigned int low = t > highEnd ? c + forward : 0;
+    unsigned int length = (lowEnd > t ? c - back : n - 1) - low;
+    // k[low] < t <= k[low + length] holds throughout.
+    while (length > 1) {
+      const unsigned int half = length / 2;
+      low += (0u - static_cast<unsigned int>(t > k[low + half].parameter)) & half;
+      length -= half;
     }
-    while (high - low > 1) {
-      const unsigned int mid = (low + high) / 2;
-      const double p = k[mid].parameter;
-      if (!(t > p) && t >= p) {  // exact equality, on purpose
-        this->searchHint = mid;
-        found = 1;
-        return mid + 1;
-      }
-      // Which half is as good as random: chosen without a branch that would be mispredicted.
-      const bool above = t > p;
-      low = above ? mid : low;
-      high = above ? high : mid;
+    // A key equal to t is the one above low. Equality is exact, on purpose.
+    if (!(k[low + 1].parameter > t)) {
+      this->searchHint = low + 1;
+      found = 1;
+      return low + 2;
     }
     this->searchHint = low;
     found = 0;
