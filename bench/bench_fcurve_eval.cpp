@@ -10,7 +10,6 @@
 #include <zv/std_fcurve.h>
 
 #if ZV_HAVE_GSL
-#include <gsl/gsl_errno.h>
 #include <gsl/gsl_spline.h>
 #endif
 
@@ -62,13 +61,8 @@ void BM_ZvEvalSequence(benchmark::State& state) {
   state.counters["samples"] = values.size;
 }
 
-// The lock every public operation takes, alone.
 void BM_ZvLockUnlock(benchmark::State& state) {
-  const ZvStdFCurve& curve = TheCurve();
-  for (auto _ : state) {
-    curve.Lock();
-    curve.Unlock();
-  }
+  EvalBenchLockLoop(state, TheCurve());
 }
 
 #if ZV_HAVE_GSL
@@ -103,15 +97,9 @@ BENCHMARK(BM_GslRandom)->Repetitions(5)->ReportAggregatesOnly(true);
 #endif
 
 int main(int argc, char** argv) {
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-#if ZV_HAVE_GSL
-  gsl_set_error_handler_off();
-#endif
   TheCurve();  // built outside the timings
   ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-  benchmark::Shutdown();
+  if (EvalBenchRun(argc, argv, reporter)) return 1;
 
   auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name) * 1e9; };
   const double zvSeq = median("BM_ZvSequential"), zvRnd = median("BM_ZvRandom");

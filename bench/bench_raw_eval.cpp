@@ -10,7 +10,6 @@
 #include <zv/raw_fcurve.h>
 
 #if ZV_HAVE_GSL
-#include <gsl/gsl_errno.h>
 #include <gsl/gsl_interp.h>
 #endif
 
@@ -42,13 +41,8 @@ void BM_RawRandom(benchmark::State& state) {
   ZvEval(state, TheEvalBenchData().random);
 }
 
-// The lock every public operation takes, alone.
 void BM_RawLockUnlock(benchmark::State& state) {
-  const ZvRawFCurve& curve = TheCurve();
-  for (auto _ : state) {
-    curve.Lock();
-    curve.Unlock();
-  }
+  EvalBenchLockLoop(state, TheCurve());
 }
 
 #if ZV_HAVE_GSL
@@ -85,15 +79,9 @@ BENCHMARK(BM_GslLinearRandom)->Repetitions(5)->ReportAggregatesOnly(true);
 #endif
 
 int main(int argc, char** argv) {
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-#if ZV_HAVE_GSL
-  gsl_set_error_handler_off();
-#endif
   TheCurve();  // built outside the timings
   ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-  benchmark::Shutdown();
+  if (EvalBenchRun(argc, argv, reporter)) return 1;
 
   auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name) * 1e9; };
   const double zvSeq = median("BM_RawSequential"), zvRnd = median("BM_RawRandom");

@@ -6,6 +6,12 @@
 
 #include <benchmark/benchmark.h>
 
+#include "median_reporter.h"
+
+#if ZV_HAVE_GSL
+#include <gsl/gsl_errno.h>
+#endif
+
 #include <cmath>
 #include <random>
 #include <vector>
@@ -48,6 +54,27 @@ void EvalBenchLoop(benchmark::State& state, const std::vector<double>& params, E
     benchmark::DoNotOptimize(eval(params[i]));
     if (++i == params.size()) i = 0;
   }
+}
+
+// The lock every public operation of the curve takes, alone.
+template <class Curve>
+void EvalBenchLockLoop(benchmark::State& state, const Curve& curve) {
+  for (auto _ : state) {
+    curve.Lock();
+    curve.Unlock();
+  }
+}
+
+// Runs the registered benchmarks into the reporter; 0, or 1 for arguments it does not know.
+inline int EvalBenchRun(int argc, char** argv, ZvMedianReporter& reporter) {
+  benchmark::Initialize(&argc, argv);
+  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
+#if ZV_HAVE_GSL
+  gsl_set_error_handler_off();  // a peer's error must not abort the run
+#endif
+  benchmark::RunSpecifiedBenchmarks(&reporter);
+  benchmark::Shutdown();
+  return 0;
 }
 
 #endif

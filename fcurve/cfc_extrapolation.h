@@ -23,27 +23,15 @@
 
 #include "fcurve/cfc_key_search.h"
 
-// Plain right-continuous value, constant beyond the keys.
+// Plain evaluation, constant beyond the keys: right-continuous, or with `left` the left limit,
+// which differs on a key only.
 template <class Impl>
-double CFCEvalRight(const Impl& s, double t) {
+double CFCEvalPlain(const Impl& s, double t, bool left) {
   const unsigned int n = s.keys.size;
   if (n == 0) return s.valueWhenNoKeys;
   int found;
   const unsigned int at = s.LocateParameter(t, found);
-  if (found) return s.KeyRightValue(at - 1);
-  if (at >= n) return s.KeyRightValue(n - 1);
-  if (at == 0) return s.ValueLeftOfFirstKey();
-  return s.EvalSegment(t, at - 1, true);
-}
-
-// Plain left limit, constant beyond the keys.
-template <class Impl>
-double CFCEvalLeft(const Impl& s, double t) {
-  const unsigned int n = s.keys.size;
-  if (n == 0) return s.valueWhenNoKeys;
-  int found;
-  const unsigned int at = s.LocateParameter(t, found);
-  if (found) return s.KeyArrivingValue(at - 1);
+  if (found) return left ? s.KeyArrivingValue(at - 1) : s.KeyRightValue(at - 1);
   if (at >= n) return s.KeyRightValue(n - 1);
   if (at == 0) return s.ValueLeftOfFirstKey();
   return s.EvalSegment(t, at - 1, true);
@@ -59,15 +47,24 @@ double CFCEvalFoldedInside(const Impl& s, double t, unsigned int at, double shif
   return shift + s.EvalSegment(t, at - 1, true);
 }
 
+// The value with extrapolation: right-continuous, or with `left` the left limit. They differ
+// only on keys, where the left limit takes the value arriving at the key, and at the seam of two
+// periods.
 template <class Impl>
-double CFCEvalRightUsingExtrapolationMethod(const Impl& s, double t) {
+double CFCEvalUsingExtrapolationMethod(const Impl& s, double t, bool left) {
   const unsigned int n = s.keys.size;
   if (n == 0) return s.valueWhenNoKeys;
+  auto onKey = [&s, left](unsigned int i) {
+    return left ? s.KeyArrivingValue(i) : s.KeyRightValue(i);
+  };
+  // The key where one period ends and the next begins: the last one seen from the right, the
+  // first one seen from the left.
+  const unsigned int seam = left ? 1 : n;
   int found;
   switch (s.extrapolation) {
     case ZvBaseFCurve::LinearExtrapolation: {
       const unsigned int at = s.LocateParameter(t, found);
-      if (found) return s.KeyRightValue(at - 1);
+      if (found) return onKey(at - 1);
       if (at >= n) return s.GetValueAfterLastKeyWhenLinear(t);
       if (at == 0) return s.GetValueBeforeFirstKeyWhenLinear(t);
       return s.EvalSegment(t, at - 1, true);
@@ -76,66 +73,40 @@ double CFCEvalRightUsingExtrapolationMethod(const Impl& s, double t) {
       s.FoldParameter(t);
       const unsigned int at = s.LocateParameter(t, found);
       if (found) {
-        // The right limit at the end of a period is the start of the next one.
-        if (n >= 2 && at == n) return s.KeyRightValue(0);
-        return s.KeyRightValue(at - 1);
+        // The right limit at the end of a period is the start of the next one; the left limit
+        // at the start of a period is the end of the previous one.
+        if (n >= 2 && at == seam) return left ? s.KeyArrivingValue(n - 1) : s.KeyRightValue(0);
+        return onKey(at - 1);
       }
       return CFCEvalFoldedInside(s, t, at, 0.0);
     }
     case ZvBaseFCurve::CycleWithOffsetExtrapolation: {
-      const double delta = s.CycleOffset(false);
+      const double delta = s.CycleOffset(left);
       double cycles = 0.0;
-      if (n >= 2) t = s.CycleOffsetFold(t, cycles, false);
+      if (n >= 2) t = s.CycleOffsetFold(t, cycles, left);
       const unsigned int at = s.LocateParameter(t, found);
       if (found) {
-        if (n >= 2 && at == n) return cycles * delta + (s.KeyRightValue(0) + delta);
-        return delta * cycles + s.KeyRightValue(at - 1);
+        if (n >= 2 && at == seam) {
+          return left ? cycles * delta + s.KeyRightValue(n - 1) - delta
+                      : cycles * delta + (s.KeyRightValue(0) + delta);
+        }
+        return delta * cycles + onKey(at - 1);
       }
       return CFCEvalFoldedInside(s, t, at, delta * cycles);
     }
     default:
-      return CFCEvalRight(s, t);
+      return CFCEvalPlain(s, t, left);
   }
 }
 
 template <class Impl>
+double CFCEvalRightUsingExtrapolationMethod(const Impl& s, double t) {
+  return CFCEvalUsingExtrapolationMethod(s, t, false);
+}
+
+template <class Impl>
 double CFCEvalLeftUsingExtrapolationMethod(const Impl& s, double t) {
-  const unsigned int n = s.keys.size;
-  if (n == 0) return s.valueWhenNoKeys;
-  int found;
-  switch (s.extrapolation) {
-    case ZvBaseFCurve::LinearExtrapolation: {
-      const unsigned int at = s.LocateParameter(t, found);
-      if (found) return s.KeyArrivingValue(at - 1);
-      if (at >= n) return s.GetValueAfterLastKeyWhenLinear(t);
-      if (at == 0) return s.GetValueBeforeFirstKeyWhenLinear(t);
-      return s.EvalSegment(t, at - 1, true);
-    }
-    case ZvBaseFCurve::CycleExtrapolation: {
-      s.FoldParameter(t);
-      const unsigned int at = s.LocateParameter(t, found);
-      if (found) {
-        // The left limit at the start of a period is the end of the previous one.
-        if (n >= 2 && at == 1) return s.KeyArrivingValue(n - 1);
-        return s.KeyArrivingValue(at - 1);
-      }
-      return CFCEvalFoldedInside(s, t, at, 0.0);
-    }
-    case ZvBaseFCurve::CycleWithOffsetExtrapolation: {
-      const double delta = s.CycleOffset(true);
-      double cycles = 0.0;
-      if (n >= 2) t = s.CycleOffsetFold(t, cycles, true);
-      const unsigned int at = s.LocateParameter(t, found);
-      if (found) {
-        if (n >= 2 && at == 1) return cycles * delta + s.KeyRightValue(n - 1) - delta;
-        if (n == 1) return cycles * delta + s.ValueLeftOfFirstKey();
-        return delta * cycles + s.KeyArrivingValue(at - 1);
-      }
-      return CFCEvalFoldedInside(s, t, at, delta * cycles);
-    }
-    default:
-      return CFCEvalLeft(s, t);
-  }
+  return CFCEvalUsingExtrapolationMethod(s, t, true);
 }
 
 // Away from every key, one search answers for the snap and for the evaluation, and the side of

@@ -184,6 +184,24 @@ class CFCKeySearch : public Store {
     return folded;
   }
 
+  // Runs `edit(a, b)` over the parts of the keyed range that [start, end] covers: under the
+  // cycle methods (two keys or more) the interval is folded into the keyed range first - within
+  // one period the folded interval; across a period boundary the two folded pieces up to the
+  // ends of the keys; over more than a period the whole key range. Otherwise [start, end]
+  // itself. Stops at the first part that answers 0 and answers 0 then.
+  template <class Edit>
+  int ForFoldedRanges(double start, double end, Edit edit) const {
+    const unsigned int n = keys.size;
+    if ((this->extrapolation != 3 && this->extrapolation != 4) || n < 2) return edit(start, end);
+    const double first = keys[0].parameter, last = keys[n - 1].parameter;
+    double startCycle, endCycle;
+    const double foldedStart = CycleOffsetFold(start, startCycle, true);
+    const double foldedEnd = CycleOffsetFold(end, endCycle, false);
+    if (startCycle == endCycle) return edit(foldedStart, foldedEnd);
+    if (end - start <= last - first) return edit(first, foldedEnd) && edit(foldedStart, last);
+    return edit(first, last);
+  }
+
   // Folds t and moves both bounds by the same displacement, then orders the bounds and clamps
   // t into them.
   void FoldBoundsAndParameter(double& start, double& end, double& t) const {

@@ -15,6 +15,7 @@
 #include "fcurve/cfc_base_impl.h"
 #include "fcurve/cfc_extrapolation.h"
 #include "fcurve/fcurve_lock.h"
+#include "fcurve/key_user_data_transit.h"
 
 #include <cmath>
 #include <memory>
@@ -279,11 +280,7 @@ struct CFCSingleValueCurve {
     if (n == 0) return 1;
     const double sum = s.keys[0].parameter + s.keys[n - 1].parameter;
     // The user data sets travel with their keys, so they are taken out first.
-    ZvDynArray<CFCUserDataSet*> sets(n);
-    for (unsigned int i = 0; i < n; ++i) {
-      const CFCUserDataSet* set = c.GetUserDataSet(s.keys[i].parameter);
-      sets.Add(set ? new CFCUserDataSet(*set) : nullptr);
-    }
+    CFCKeyUserDataInTransit sets(c, n, [&s](unsigned int i) { return s.keys[i].parameter; });
     Impl mirrored(s);
     mirrored.DropAllKeys();
     for (unsigned int j = 0; j < n; ++j) {
@@ -296,42 +293,11 @@ struct CFCSingleValueCurve {
     mirrored.KeepValueLeftOfFirstKey(s.GetValue(n - 1));
     mirrored.searchHint = 0;
     s = mirrored;
-    c.RemoveAllKeyUserData();
-    for (unsigned int j = 0; j < n; ++j) {
-      CFCUserDataSet* set = sets[n - 1 - j];
-      if (set) c.SetUserDataSet(*set, s.keys[j].parameter);
-      delete set;
-    }
+    sets.GiveBackReversed([&s](unsigned int j) { return s.keys[j].parameter; });
     return 1;
   }
 
   // ---- Whole-curve edits of keys ---------------------------------------------------------
-
-  // Under the cycle methods the interval is folded into the keyed range first: within one
-  // period the folded interval is reduced; across a period boundary the two folded pieces up to
-  // the ends of the keys; over more than a period the whole key range.
-  template <class ReduceRange>
-  static void ForFoldedRanges(const Impl& s, double start, double end, ReduceRange reduce) {
-    const unsigned int n = s.keys.size;
-    if ((s.extrapolation != ZvBaseFCurve::CycleExtrapolation &&
-         s.extrapolation != ZvBaseFCurve::CycleWithOffsetExtrapolation) ||
-        n < 2) {
-      reduce(start, end);
-      return;
-    }
-    const double first = s.keys[0].parameter, last = s.keys[n - 1].parameter;
-    double startCycle, endCycle;
-    const double foldedStart = s.CycleOffsetFold(start, startCycle, true);
-    const double foldedEnd = s.CycleOffsetFold(end, endCycle, false);
-    if (startCycle == endCycle) {
-      reduce(foldedStart, foldedEnd);
-    } else if (end - start <= last - first) {
-      reduce(first, foldedEnd);
-      reduce(foldedStart, last);
-    } else {
-      reduce(first, last);
-    }
-  }
 
   // Keys made at both ends without changing the function, then the store's reduction between.
   static unsigned int ReduceNumKeys(Curve& c, double start, double end, double tolerance) {
@@ -345,11 +311,12 @@ struct CFCSingleValueCurve {
       end = t;
     }
     if (s.keys.size < 2) return 1;
-    ForFoldedRanges(s, start, end, [&](double a, double b) {
+    s.ForFoldedRanges(start, end, [&](double a, double b) {
       unsigned int first, last;
       s.CreateNonModifyingKey(a, first, c);
       s.CreateNonModifyingKey(b, last, c);
       s.ReduceNumKeys(first, last, tolerance, c);
+      return 1;
     });
     return 1;
   }
@@ -357,8 +324,10 @@ struct CFCSingleValueCurve {
   static unsigned int ResampleSequence(Curve& c, double start, double end, double step,
                                        int keepExistingKeys) {
     Impl& s = Of(c);
-    if (s.readOnly || !std::isfinite(start) || !std::isfinite(end) || !(step > 0.0)) return 0;
-    return Impl::Engine::ResampleKeys(s, start, end, step, keepExistingKeys, c);
+    if (s.readOnly || !std::isfinite(start) || !std::isfinite(end)) return 0;
+    return s.ForFoldedRanges(start, end, [&](double a, double b) {
+      return Impl::Engine::ResampleKeys(s, a, b, step, keepExistingKeys, c);
+    });
   }
 
   static unsigned int SmoothSequence(Curve& c, double start, double end, const double* kernel,

@@ -215,23 +215,10 @@ unsigned int ZvStdFCurve::ReduceNumKeys(double start, double end, double toleran
     start = end;
     end = t;
   }
-  const unsigned int n = s.keys.size;
-  if (n < 2) return 1;
-  const double first = s.keys[0].parameter, last = s.keys[n - 1].parameter;
-  if (s.extrapolation == CycleExtrapolation || s.extrapolation == CycleWithOffsetExtrapolation) {
-    double startCycle, endCycle;
-    const double foldedStart = s.CycleOffsetFold(start, startCycle, true);
-    const double foldedEnd = s.CycleOffsetFold(end, endCycle, false);
-    if (startCycle == endCycle) {
-      ReduceRange(*this, s, foldedStart, foldedEnd, tolerance);
-    } else if (end - start <= last - first) {
-      ReduceRange(*this, s, first, foldedEnd, tolerance);
-      ReduceRange(*this, s, foldedStart, last, tolerance);
-    } else {
-      ReduceRange(*this, s, first, last, tolerance);
-    }
+  if (s.keys.size < 2) return 1;
+  s.ForFoldedRanges(start, end, [&](double a, double b) {
+    ReduceRange(*this, s, a, b, tolerance);
     return 1;
-  }
-  ReduceRange(*this, s, start, end, tolerance);
+  });
   return 1;
 }

@@ -51,8 +51,8 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
     return keys[n - 1].rightValue - (left ? keys[0].leftValue : keys[0].rightValue);
   }
   // Plain evaluation, constant beyond the keys: right-continuous and left limit.
-  double EvalRight(double t) const { return CFCEvalRight(*this, t); }
-  double EvalLeft(double t) const { return CFCEvalLeft(*this, t); }
+  double EvalRight(double t) const { return CFCEvalPlain(*this, t, false); }
+  double EvalLeft(double t) const { return CFCEvalPlain(*this, t, true); }
   double EvalRightUsingExtrapolationMethod(double t) const {
     return CFCEvalRightUsingExtrapolationMethod(*this, t);
   }
