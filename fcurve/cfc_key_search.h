@@ -202,6 +202,27 @@ class CFCKeySearch : public Store {
     return edit(first, last);
   }
 
+  // Key reduction over [start, end] in either order, through ForFoldedRanges: refused on a
+  // read-only curve or with a bound or tolerance that is not a number; nothing to do below two
+  // keys.
+  template <class Reduce>
+  int ReduceOverFoldedRanges(double start, double end, double tolerance, Reduce reduce) {
+    if (this->readOnly || !std::isfinite(start) || !std::isfinite(end) || std::isnan(tolerance)) {
+      return 0;
+    }
+    if (keys.size < 2) return 1;
+    if (start > end) {
+      const double t = start;
+      start = end;
+      end = t;
+    }
+    ForFoldedRanges(start, end, [&reduce](double a, double b) {
+      reduce(a, b);
+      return 1;
+    });
+    return 1;
+  }
+
   // Folds t and moves both bounds by the same displacement, then orders the bounds and clamps
   // t into them.
   void FoldBoundsAndParameter(double& start, double& end, double& t) const {

@@ -302,23 +302,12 @@ struct CFCSingleValueCurve {
   // Keys made at both ends without changing the function, then the store's reduction between.
   static unsigned int ReduceNumKeys(Curve& c, double start, double end, double tolerance) {
     Impl& s = Of(c);
-    if (s.readOnly || !std::isfinite(start) || !std::isfinite(end) || std::isnan(tolerance)) {
-      return 0;
-    }
-    if (start > end) {
-      const double t = start;
-      start = end;
-      end = t;
-    }
-    if (s.keys.size < 2) return 1;
-    s.ForFoldedRanges(start, end, [&](double a, double b) {
+    return s.ReduceOverFoldedRanges(start, end, tolerance, [&](double a, double b) {
       unsigned int first, last;
       s.CreateNonModifyingKey(a, first, c);
       s.CreateNonModifyingKey(b, last, c);
       s.ReduceNumKeys(first, last, tolerance, c);
-      return 1;
     });
-    return 1;
   }
 
   static unsigned int ResampleSequence(Curve& c, double start, double end, double step,

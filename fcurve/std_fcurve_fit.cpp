@@ -207,18 +207,6 @@ void ReduceRange(ZvStdFCurve& curve, ZvStdFCurveImpl& s, double start, double en
 unsigned int ZvStdFCurve::ReduceNumKeys(double start, double end, double tolerance) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
-  if (s.readOnly || !std::isfinite(start) || !std::isfinite(end) || std::isnan(tolerance)) {
-    return 0;
-  }
-  if (start > end) {
-    const double t = start;
-    start = end;
-    end = t;
-  }
-  if (s.keys.size < 2) return 1;
-  s.ForFoldedRanges(start, end, [&](double a, double b) {
-    ReduceRange(*this, s, a, b, tolerance);
-    return 1;
-  });
-  return 1;
+  return s.ReduceOverFoldedRanges(
+      start, end, tolerance, [&](double a, double b) { ReduceRange(*this, s, a, b, tolerance); });
 }
