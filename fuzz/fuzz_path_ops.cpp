@@ -67,14 +67,15 @@ void Check(const ZvPath2f& path) {
 
 // A flatten's cost grows with the path's size over the tolerance, up to the flatteners' cap of
 // 2^24 points, and sampling's with the size over the spacing, up to 2^24 samples (both caps are
-// tested on their own): finer steps than a millionth of the path's size would only measure that
-// cost here. Non-positive and non-finite steps still get through.
+// tested on their own): steps finer than 1e-4 of the path's size (a path's length can be many
+// times its size) would only measure that cost here. Non-positive and non-finite steps still
+// get through.
 double Tolerance(const ZvPath2f& path, double asked) {
   ZvExtent2<float> box;
   path.GetExtent(box);
   const double size =
       std::fmax(std::fabs(double(box.xmax) - box.xmin), std::fabs(double(box.ymax) - box.ymin));
-  return std::isfinite(size) ? std::fmax(asked, size * 1e-6) : asked;
+  return std::isfinite(size) ? std::fmax(asked, size * 1e-4) : asked;
 }
 
 void Step(ZvPath2f& path, Input& in) {
