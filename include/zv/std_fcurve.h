@@ -250,15 +250,18 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   unsigned int LockTangentContinuity(double& parameter, double tolerance);
   unsigned int UnlockTangentContinuity(double& parameter, double tolerance);
   unsigned int IsTangentContinuityLocked(double& parameter, double tolerance) const;
-  // Locks continuity where the handles already agree or no cubic segment touches the key; making
-  // them agree takes the interactive tangent mover, which this does not run: such a key is
-  // refused with 0.
+  // Locks continuity. Where the handles do not agree yet and a cubic segment touches the key,
+  // the handle on the other side than `side` is turned to meet the one on `side`, as a drag of
+  // that handle to where it already is would do (ZvStdTgtMover), with length continuity kept
+  // if the key has it. 0 when the key's tangent direction or length is locked, when the
+  // continuity is already locked and met, or when no valid handle position exists.
   unsigned int UnifyAndLockTangentContinuity(double& parameter, KeySide side, double tolerance);
   // Length continuity: both handles keep the same visual length, Y counted times `aspect`.
   unsigned int LockTangentLengthContinuity(double& parameter, double tolerance, double aspect);
   unsigned int UnlockTangentLengthContinuity(double& parameter, double tolerance);
   unsigned int IsTangentLengthContinuityLocked(double& parameter, double tolerance) const;
-  // As UnifyAndLockTangentContinuity, for lengths.
+  // As UnifyAndLockTangentContinuity, for lengths measured with Y times `aspect`; the key's
+  // tangent continuity, if locked, is kept.
   unsigned int UnifyAndLockTangentLengthContinuity(double& parameter, KeySide side,
                                                    double tolerance, double aspect);
   unsigned int AreAnyTgtLengthsLockedInInterval(double start, double end, int excludeStart,
@@ -285,6 +288,7 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
  private:
   // Copies under the source's lock, held from before the user data is copied until the keys are.
   ZvStdFCurve(const ZvStdFCurve& other, const ZvFCurveLockGuard& sourceLock);
+  friend class ZvStdTgtMoverImpl;  // a drag writes handles that are valid only as a pair
 
   ZvStdFCurveImpl* m_impl;
 };
