@@ -61,7 +61,9 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   // every point, each tangent along the chord of the neighbours. DPCubicC2: the natural cubic
   // spline through every point. DPLinearFitC0: lines, a key where a point leaves the current
   // line by more than the tolerance. DPCubicFitG1: a cubic spline with continuous tangents that
-  // passes within the tolerance of every point, on as few keys as it needs. The last key takes
+  // passes within the tolerance of every point, on as few keys as it needs; with a negative
+  // tolerance, or fewer than three points, or a fit that fails, it is one cubic from the first
+  // point to the last with handles at the thirds of the chord. The last key takes
   // `lastSegmentKind`. Points out of order, or not finite, give a curve without keys.
   ZvStdFCurve(const ZvPoint2dArray& points, DPMethod method, double tolerance,
               FSKind firstSegmentKind, FSKind lastSegmentKind);
