@@ -111,9 +111,10 @@ void CubicFit(ZvStdFCurveImpl& s, const ZvPoint2dArray& p, double tolerance) {
     x.Add(p[i].x);
     y.Add(p[i].y);
   }
+  // A negative tolerance is refused by the fit and so falls back to the one chord cubic; it
+  // must not be read as 0, which would put a key on every point.
   ZvSpline1d spline;
-  if (p.size < 3 ||
-      !spline.OpenFit(x, y, tolerance < 0.0 ? 0.0 : tolerance, ZvSpline::BezierCubicFCurve)) {
+  if (p.size < 3 || !spline.OpenFit(x, y, tolerance, ZvSpline::BezierCubicFCurve)) {
     ChordCubic(s, p);
   } else {
     const ZvDoubleArray& t = spline.GetKeyParameters();

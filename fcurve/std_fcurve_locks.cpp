@@ -5,6 +5,7 @@
 #include "core/vec.h"
 #include "fcurve/fcurve_lock.h"
 #include "fcurve/std_fcurve_impl.h"
+#include "fcurve/std_tgt_mover_impl.h"
 
 #include <cmath>
 
@@ -48,6 +49,18 @@ bool FindKey(const ZvStdFCurveImpl& s, double& parameter, double tolerance, unsi
   return true;
 }
 
+// Makes the handle opposite `side` answer the one on `side`, as a drag of that handle to where
+// it already is does, with the continuities asked for. The drag keeps both segments functions.
+bool DragOntoItself(ZvStdFCurve& curve, const ZvStdFCurveImpl& s, unsigned int i,
+                    ZvBaseFCurve::KeySide side, int tangentContinuity, int lengthContinuity,
+                    double aspect) {
+  const ZvPoint2<double> handle =
+      side == ZvBaseFCurve::LeftSide ? s.GetEvaluatedLeftTgt(i) : s.GetEvaluatedRightTgt(i);
+  ZvStdTgtMoverImpl mover(curve, s.keys[i].parameter, side, 0.0);
+  ZvExtent2<double> modified;
+  return mover.Update(handle, tangentContinuity, lengthContinuity, aspect, modified) != 0;
+}
+
 }  // namespace
 
 unsigned int ZvStdFCurve::LockTangentContinuity(double& parameter, double tolerance) {
@@ -72,7 +85,7 @@ unsigned int ZvStdFCurve::IsTangentContinuityLocked(double& parameter, double to
   return (m_impl->keys[i].flags & CFCFlag_TangentContinuity) ? 1 : 0;
 }
 
-unsigned int ZvStdFCurve::UnifyAndLockTangentContinuity(double& parameter, KeySide,
+unsigned int ZvStdFCurve::UnifyAndLockTangentContinuity(double& parameter, KeySide side,
                                                         double tolerance) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
@@ -82,9 +95,15 @@ unsigned int ZvStdFCurve::UnifyAndLockTangentContinuity(double& parameter, KeySi
   if (s.keys[i].flags & (CFCFlag_TangentLengthLock | CFCFlag_TangentDirectionLock)) return 0;
   const bool unified = s.ActualTangentsAreUnified(i) != 0;
   if (unified && (s.keys[i].flags & CFCFlag_TangentContinuity)) return 0;  // nothing to do
-  // Turning one handle to meet the other is the tangent mover's drag; not run here.
-  if (!unified && TouchesCubic(s, i)) return 0;
-  if (!s.LockTangentContinuity(i)) return 0;
+  if (!unified && TouchesCubic(s, i)) {
+    if (!DragOntoItself(*this, s, i, side, 1, s.keys[i].flags & CFCFlag_TangentLengthContinuity,
+                        1.0) ||
+        !(s.keys[i].flags & CFCFlag_TangentContinuity)) {
+      return 0;
+    }
+  } else if (!s.LockTangentContinuity(i)) {
+    return 0;
+  }
   parameter = at;
   return 1;
 }
@@ -117,7 +136,7 @@ unsigned int ZvStdFCurve::IsTangentLengthContinuityLocked(double& parameter,
   return (m_impl->keys[i].flags & CFCFlag_TangentLengthContinuity) ? 1 : 0;
 }
 
-unsigned int ZvStdFCurve::UnifyAndLockTangentLengthContinuity(double& parameter, KeySide,
+unsigned int ZvStdFCurve::UnifyAndLockTangentLengthContinuity(double& parameter, KeySide side,
                                                               double tolerance, double aspect) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
@@ -127,8 +146,15 @@ unsigned int ZvStdFCurve::UnifyAndLockTangentLengthContinuity(double& parameter,
   if (s.keys[i].flags & (CFCFlag_TangentLengthLock | CFCFlag_TangentDirectionLock)) return 0;
   const bool same = SameVisualLength(s, i, aspect);
   if (same && (s.keys[i].flags & CFCFlag_TangentLengthContinuity)) return 0;
-  if (!same && TouchesCubic(s, i)) return 0;  // would need the tangent mover
-  SetBits(s.keys[i], CFCFlag_TangentLengthContinuity, true);
+  if (!same && TouchesCubic(s, i)) {
+    if (!DragOntoItself(*this, s, i, side, s.keys[i].flags & CFCFlag_TangentContinuity, 1,
+                        aspect) ||
+        !(s.keys[i].flags & CFCFlag_TangentLengthContinuity)) {
+      return 0;
+    }
+  } else {
+    SetBits(s.keys[i], CFCFlag_TangentLengthContinuity, true);
+  }
   parameter = at;
   return 1;
 }

@@ -61,7 +61,9 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   // every point, each tangent along the chord of the neighbours. DPCubicC2: the natural cubic
   // spline through every point. DPLinearFitC0: lines, a key where a point leaves the current
   // line by more than the tolerance. DPCubicFitG1: a cubic spline with continuous tangents that
-  // passes within the tolerance of every point, on as few keys as it needs. The last key takes
+  // passes within the tolerance of every point, on as few keys as it needs; with a negative
+  // tolerance, or fewer than three points, or a fit that fails, it is one cubic from the first
+  // point to the last with handles at the thirds of the chord. The last key takes
   // `lastSegmentKind`. Points out of order, or not finite, give a curve without keys.
   ZvStdFCurve(const ZvPoint2dArray& points, DPMethod method, double tolerance,
               FSKind firstSegmentKind, FSKind lastSegmentKind);
@@ -250,15 +252,18 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   unsigned int LockTangentContinuity(double& parameter, double tolerance);
   unsigned int UnlockTangentContinuity(double& parameter, double tolerance);
   unsigned int IsTangentContinuityLocked(double& parameter, double tolerance) const;
-  // Locks continuity where the handles already agree or no cubic segment touches the key; making
-  // them agree takes the interactive tangent mover, which this does not run: such a key is
-  // refused with 0.
+  // Locks continuity. Where the handles do not agree yet and a cubic segment touches the key,
+  // the handle on the other side than `side` is turned to meet the one on `side`, as a drag of
+  // that handle to where it already is would do (ZvStdTgtMover), with length continuity kept
+  // if the key has it. 0 when the key's tangent direction or length is locked, when the
+  // continuity is already locked and met, or when no valid handle position exists.
   unsigned int UnifyAndLockTangentContinuity(double& parameter, KeySide side, double tolerance);
   // Length continuity: both handles keep the same visual length, Y counted times `aspect`.
   unsigned int LockTangentLengthContinuity(double& parameter, double tolerance, double aspect);
   unsigned int UnlockTangentLengthContinuity(double& parameter, double tolerance);
   unsigned int IsTangentLengthContinuityLocked(double& parameter, double tolerance) const;
-  // As UnifyAndLockTangentContinuity, for lengths.
+  // As UnifyAndLockTangentContinuity, for lengths measured with Y times `aspect`; the key's
+  // tangent continuity, if locked, is kept.
   unsigned int UnifyAndLockTangentLengthContinuity(double& parameter, KeySide side,
                                                    double tolerance, double aspect);
   unsigned int AreAnyTgtLengthsLockedInInterval(double start, double end, int excludeStart,
@@ -285,6 +290,7 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
  private:
   // Copies under the source's lock, held from before the user data is copied until the keys are.
   ZvStdFCurve(const ZvStdFCurve& other, const ZvFCurveLockGuard& sourceLock);
+  friend class ZvStdTgtMoverImpl;  // a drag writes handles that are valid only as a pair
 
   ZvStdFCurveImpl* m_impl;
 };

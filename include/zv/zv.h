@@ -26,6 +26,7 @@
 #include <zv/shape.h>
 #include <zv/spline.h>
 #include <zv/std_fcurve.h>
+#include <zv/std_tgt_mover.h>
 #include <zv/step_fcurve.h>
 #include <zv/trace.h>
 #include <zv/transfo4.h>
