@@ -287,6 +287,8 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   ZvStdFCurve(const ZvStdFCurve& other, const ZvFCurveLockGuard& sourceLock);
 
   ZvStdFCurveImpl* m_impl;
+
+  friend struct CFCCurveStore;  // the interactive editing tools work on the keys directly
 };
 
 // The u in [0, 1] at which a monotone cubic X with controls x0..x3 takes the value x.

@@ -1,0 +1,13 @@
+// The implementation object behind a public curve, for the interactive editing tools, which
+// lay keys out in the store itself. A curve class opens itself to it by naming it a friend.
+#ifndef ZV_FCURVE_CFC_CURVE_STORE_H
+#define ZV_FCURVE_CFC_CURVE_STORE_H
+
+struct CFCCurveStore {
+  template <class Curve>
+  static auto& Of(Curve& curve) {
+    return *curve.m_impl;
+  }
+};
+
+#endif

@@ -1,0 +1,243 @@
+// The records of each keyed store under a drag: one template over the three stores, with the
+// few things that differ between key records told by overloads.
+#include "fcurve/key_mover_keys.h"
+
+#include <zv/raw_fcurve.h>
+#include <zv/std_fcurve.h>
+#include <zv/step_fcurve.h>
+
+#include "fcurve/cfc_curve_store.h"
+#include "fcurve/cfc_single_value_curve.h"
+#include "fcurve/raw_fcurve_impl.h"
+#include "fcurve/std_fcurve_impl.h"
+#include "fcurve/step_fcurve_impl.h"
+
+#include <algorithm>
+#include <cmath>
+#include <utility>
+#include <vector>
+
+namespace {
+
+// A key parameter is the same key within this distance.
+constexpr double kKeyIdentity = 1e-15;
+
+double RightValueOf(const CFCSingleValueKey<int>& k) {
+  return k.value;
+}
+double RightValueOf(const CFCSingleValueKey<double>& k) {
+  return k.value;
+}
+double RightValueOf(const CFCStdKey& k) {
+  return k.rightValue;
+}
+double LeftValueOf(const CFCStdKey& k) {
+  return k.leftValue;
+}
+template <class Key>
+double LeftValueOf(const Key& k) {
+  return RightValueOf(k);
+}
+
+void Place(CFCSingleValueKey<int>& k, double t, double v) {
+  k.parameter = t;
+  k.value = CFCWholeKeyValue(v);
+}
+void Place(CFCSingleValueKey<double>& k, double t, double v) {
+  k.parameter = t;
+  k.value = v;
+}
+// The handles are absolute positions: they travel with the key, and a discontinuity keeps its
+// step.
+void Place(CFCStdKey& k, double t, double v) {
+  const ZvPoint2<double> d{t - k.parameter, v - k.rightValue};
+  k.leftTangent = k.leftTangent + d;
+  k.rightTangent = k.rightTangent + d;
+  k.parameter = t;
+  k.leftValue += d.y;
+  k.rightValue = v;
+}
+
+template <class Key>
+void AddKey(ZvExtent2<double>& e, const Key& k) {
+  e.AddPoint(ZvPoint2<double>{k.parameter, LeftValueOf(k)});
+  e.AddPoint(ZvPoint2<double>{k.parameter, RightValueOf(k)});
+}
+// A Bezier segment stays inside the hull of its control points.
+void AddKey(ZvExtent2<double>& e, const CFCStdKey& k) {
+  e.AddPoint(ZvPoint2<double>{k.parameter, k.leftValue});
+  e.AddPoint(ZvPoint2<double>{k.parameter, k.rightValue});
+  e.AddPoint(k.leftTangent);
+  e.AddPoint(k.rightTangent);
+}
+
+// Only Bezier stores have handles, which must keep the segment they reach into a function of
+// the parameter whatever its kind, as a kind may change back to cubic later.
+template <class Impl>
+void FitSegment(Impl&, unsigned int) {}
+
+// Scales a handle so that its reach along the parameter stays within the segment's length,
+// which keeps a cubic segment a function of the parameter.
+ZvPoint2<double> WithinReach(const ZvPoint2<double>& key, const ZvPoint2<double>& handle,
+                             double length) {
+  const double reach = std::fabs(handle.x - key.x);
+  if (reach <= length) return handle;
+  return key + (handle - key) * (length / reach);
+}
+
+// The segment from key a to key a + 1, after keys moved at either end.
+void FitSegment(ZvStdFCurveImpl& s, unsigned int a) {
+  CFCStdKey& k = s.keys[a];
+  if (a + 1 >= s.keys.size) return;
+  CFCStdKey& next = s.keys[a + 1];
+  const ZvPoint2<double> p0{k.parameter, k.rightValue}, p3{next.parameter, next.leftValue};
+  if (ZvStdFCurve_IsCubicSegmentValid(p0, k.rightTangent, next.leftTangent, p3)) return;
+  const double length = p3.x - p0.x;
+  k.rightTangent = WithinReach(p0, k.rightTangent, length);
+  next.leftTangent = WithinReach(p3, next.leftTangent, length);
+}
+
+template <class Impl>
+class MoverKeys final : public CFCMoverKeys {
+ public:
+  using Key = std::remove_reference_t<decltype(std::declval<Impl&>().keys[0])>;
+
+  explicit MoverKeys(Impl& store) : m_store(store) {}
+
+  bool Capture(const ZvDoubleArray& selected) override {
+    const unsigned int n = m_store.keys.size;
+    std::vector<unsigned int> index(selected.size);
+    std::vector<char> taken(n, 0);
+    for (unsigned int i = 0; i < selected.size; ++i) {
+      const unsigned int at = Find(selected[i]);
+      if (at == n || taken[at]) return false;
+      taken[at] = 1;
+      index[i] = at;
+    }
+    m_moved.clear();
+    m_movedFlags.clear();
+    for (unsigned int at : index) {
+      m_moved.push_back(m_store.keys[at]);
+      m_movedFlags.push_back(m_store.GetKeyFlags(at));
+    }
+    m_rest.clear();
+    m_restFlags.clear();
+    m_restParameters.clear();
+    for (unsigned int at = 0; at < n; ++at) {
+      if (taken[at]) continue;
+      m_rest.push_back(m_store.keys[at]);
+      m_restFlags.push_back(m_store.GetKeyFlags(at));
+      m_restParameters.push_back(m_store.keys[at].parameter);
+    }
+    m_now = m_moved;
+    return true;
+  }
+
+  bool ReadOnly() const override { return m_store.readOnly != 0; }
+  unsigned int NumKeys() const override { return m_store.keys.size; }
+  double StartParameter(unsigned int i) const override { return m_moved[i].parameter; }
+  double StartValue(unsigned int i) const override { return RightValueOf(m_moved[i]); }
+  double StartLeftValue(unsigned int i) const override { return LeftValueOf(m_moved[i]); }
+  unsigned short StartFlags(unsigned int i) const override { return m_movedFlags[i]; }
+
+  bool UnmovedKeyNear(double t, double tolerance) const override {
+    const auto it =
+        std::lower_bound(m_restParameters.begin(), m_restParameters.end(), t - tolerance);
+    return it != m_restParameters.end() && *it <= t + tolerance;
+  }
+
+  void Layout(const double* parameters, const double* values, const unsigned int* ascending,
+              ZvExtent2<double>& modified) override {
+    const unsigned int count = static_cast<unsigned int>(m_moved.size());
+    for (unsigned int i = 0; i < count; ++i)
+      AddAround(m_now[i].parameter, modified);
+    for (unsigned int i = 0; i < count; ++i) {
+      m_now[i] = m_moved[i];
+      Place(m_now[i], parameters[i], values[i]);
+    }
+    // One merge of the unmoved records, which never change during the drag, with the moved.
+    const unsigned int n = m_store.keys.size;
+    unsigned int r = 0, m = 0;
+    m_placed.clear();
+    for (unsigned int at = 0; at < n; ++at) {
+      const bool takeMoved =
+          m < count && (r == m_rest.size() || m_now[ascending[m]].parameter < m_rest[r].parameter);
+      if (takeMoved) {
+        const unsigned int i = ascending[m++];
+        m_store.keys[at] = m_now[i];
+        m_store.SetKeyFlags(at, m_movedFlags[i]);
+        m_placed.push_back(at);
+      } else {
+        m_store.keys[at] = m_rest[r];
+        m_store.SetKeyFlags(at, m_restFlags[r++]);
+      }
+    }
+    m_store.searchHint = 0;
+    for (unsigned int at : m_placed) {
+      if (at > 0) FitSegment(m_store, at - 1);
+      FitSegment(m_store, at);
+    }
+    for (unsigned int i = 0; i < count; ++i)
+      AddAround(m_now[i].parameter, modified);
+  }
+
+ private:
+  // The index of the key at t within the identity tolerance, or the number of keys.
+  unsigned int Find(double t) const {
+    const unsigned int n = m_store.keys.size;
+    unsigned int lo = 0, hi = n;
+    while (lo < hi) {
+      const unsigned int mid = lo + (hi - lo) / 2;
+      if (m_store.keys[mid].parameter < t - kKeyIdentity)
+        lo = mid + 1;
+      else
+        hi = mid;
+    }
+    return lo < n && m_store.keys[lo].parameter <= t + kKeyIdentity ? lo : n;
+  }
+
+  // The key at t in the store as it stands, and its two neighbours, whose segments it shapes.
+  void AddAround(double t, ZvExtent2<double>& modified) const {
+    const unsigned int at = Find(t), n = m_store.keys.size;
+    if (at == n) return;
+    AddKey(modified, m_store.keys[at]);
+    if (at > 0) AddKey(modified, m_store.keys[at - 1]);
+    if (at + 1 < n) AddKey(modified, m_store.keys[at + 1]);
+  }
+
+  Impl& m_store;
+  std::vector<Key> m_moved, m_now, m_rest;
+  std::vector<unsigned short> m_movedFlags, m_restFlags;
+  std::vector<double> m_restParameters;
+  std::vector<unsigned int> m_placed;
+};
+
+template <class Impl>
+std::unique_ptr<CFCMoverKeys> Keys(Impl& store) {
+  return std::make_unique<MoverKeys<Impl>>(store);
+}
+
+template <class Curve, class Impl>
+std::unique_ptr<CFCMoverKeys> SingleValueKeys(ZvBaseFCurve& curve) {
+  Curve* c = dynamic_cast<Curve*>(&curve);
+  return c ? Keys(CFCSingleValueCurve<Curve, Impl>::Of(*c)) : nullptr;
+}
+
+}  // namespace
+
+std::unique_ptr<CFCMoverKeys> CFCMakeMoverKeys(ZvBaseFCurve& curve) {
+  switch (curve.GetKind()) {
+    case ZvBaseFCurve::BooleanKind:
+      return SingleValueKeys<ZvBooleanFCurve, ZvStepFCurveImpl>(curve);
+    case ZvBaseFCurve::IntegerKind:
+      return SingleValueKeys<ZvIntegerFCurve, ZvStepFCurveImpl>(curve);
+    case ZvBaseFCurve::RawKind:
+      return SingleValueKeys<ZvRawFCurve, ZvRawFCurveImpl>(curve);
+    case ZvBaseFCurve::StdKind: {
+      ZvStdFCurve* c = dynamic_cast<ZvStdFCurve*>(&curve);
+      return c ? Keys(CFCCurveStore::Of(*c)) : nullptr;
+    }
+    default:
+      return nullptr;
+  }
+}
