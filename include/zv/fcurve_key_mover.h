@@ -23,9 +23,11 @@
 //   directions, for this Update only: the handles come back when the drag does.
 // - Per-key user data follow their keys.
 //
+// - On a rotation curve the mover drags one component (degrees) of whole rotation keys: the time
+//   moves the whole key, the other two angles and the spline parameters stay with it.
+//
 // The curve's lock is held for the whole of each call. Between construction and Finalize the
-// curve must not be changed by anything else. The rotation curve kind is not supported yet: a
-// mover built on one is inert (Update answers 0).
+// curve must not be changed by anything else.
 #ifndef ZV_FCURVE_KEY_MOVER_H
 #define ZV_FCURVE_KEY_MOVER_H
 

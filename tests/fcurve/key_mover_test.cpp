@@ -1,5 +1,6 @@
 // Dragging keys: random drags on every draggable kind, then the rules one by one.
 #include <zv/fcurve_key_mover.h>
+#include <zv/quat_fcurve.h>
 #include <zv/raw_fcurve.h>
 #include <zv/std_fcurve.h>
 #include <zv/step_fcurve.h>
@@ -35,6 +36,9 @@ std::unique_ptr<C> MakeCurve(C::Kind kind, std::mt19937& rng, unsigned int n) {
     case C::RawKind:
       curve = std::make_unique<ZvRawFCurve>();
       break;
+    case C::QuatKind:
+      curve = std::make_unique<ZvQuatFCurve>(1);  // the other two angles ride along
+      break;
     default:
       curve = std::make_unique<ZvStdFCurve>();
       break;
@@ -49,6 +53,13 @@ std::unique_ptr<C> MakeCurve(C::Kind kind, std::mt19937& rng, unsigned int n) {
                      : kind == C::IntegerKind ? std::round(value(rng))
                                               : value(rng);
     curve->CreateKey(t, v);
+  }
+  if (auto* quat = dynamic_cast<ZvQuatFCurve*>(curve.get())) {
+    ZvQuatCurve& keys = *quat->GetQuatCurve();
+    for (unsigned int i = 0; i < keys.GetNumKeys(); ++i) {
+      keys.SetKeyValue(i, 0, value(rng) * 30);
+      keys.SetKeyValue(i, 2, value(rng) * 30);
+    }
   }
   ZvDoubleArray keys;
   curve->GetAllKeyParameters(keys);
@@ -76,6 +87,13 @@ std::string Dump(const C& curve) {
   if (auto* std = dynamic_cast<const ZvStdFCurve*>(&curve)) return stdedit::Dump(*std);
   std::string out;
   char line[256];
+  if (auto* quat = dynamic_cast<const ZvQuatFCurve*>(&curve)) {
+    for (const ZvQuatKey& k : quat->GetQuatCurve()->GetKeys()) {
+      std::snprintf(line, sizeof line, "%.17g %.17g %.17g %.17g %g %g %g %u\n", k.time, k.angles.x,
+                    k.angles.y, k.angles.z, k.tension, k.continuity, k.bias, k.flags);
+      out += line;
+    }
+  }
   for (unsigned int i = 0; i < curve.GetNumKeys(); ++i) {
     C::KeyInfo k{};
     k.mask = 511;
@@ -155,7 +173,8 @@ TEST_P(KeyMoverKinds, RandomDragsStayApartAndComeBack) {
 }
 
 INSTANTIATE_TEST_SUITE_P(AllKinds, KeyMoverKinds,
-                         ::testing::Values(C::BooleanKind, C::IntegerKind, C::StdKind, C::RawKind));
+                         ::testing::Values(C::BooleanKind, C::IntegerKind, C::StdKind, C::RawKind,
+                                           C::QuatKind));
 
 struct Drag {
   explicit Drag(ZvFCurveKeyMover& m) : mover(m) {}
