@@ -354,3 +354,40 @@ TEST(KeyMover, StandardHandlesTravelAndFit) {
 }
 
 }  // namespace
+
+namespace {
+
+// An offset of part of the keys is one drag: the keys of the interval, or up to an end of the
+// curve when the head or the tail moves, stop short of keys that stay.
+TEST(KeyMover, OffsetOfPartOfTheKeys) {
+  ZvStdFCurve curve;
+  for (int i = 0; i < 6; ++i)
+    curve.CreateKey(i, i % 2);
+  const ZvStdFCurve original = curve;
+  ASSERT_EQ(curve.ScaleAndOffsetParameters(1, 2, 0, 1, 0.5, 0, 0, C::RightHandle), 1u);
+  EXPECT_EQ(Keys(curve), (std::vector<double>{0, 1.5, 2.5, 3, 4, 5}));
+  EXPECT_DOUBLE_EQ(curve.Eval(2.5, 0), 0.0);
+  EXPECT_TRUE(curve.IsValid());
+
+  curve = original;
+  ASSERT_EQ(curve.ScaleAndOffsetParameters(1, 2, 0, 1, 1.0, 0, 0, C::RightHandle), 1u);
+  EXPECT_EQ(Keys(curve), Keys(original)) << "2 + 1 lands on 3: nothing moves";
+
+  curve = original;
+  ASSERT_EQ(curve.ScaleAndOffsetParameters(1, 2, 0, 1, 1.0, 1, 0, C::RightHandle), 1u);
+  EXPECT_EQ(Keys(curve), (std::vector<double>{0, 2, 3, 4, 5, 6})) << "the head moves along";
+
+  curve = original;
+  ASSERT_EQ(curve.ScaleAndOffsetParameters(3, 4, 0, 1, 0.25, 0, 1, C::RightHandle), 1u);
+  EXPECT_EQ(Keys(curve), (std::vector<double>{0.25, 1.25, 2.25, 3.25, 4.25, 5}))
+      << "the tail moves along";
+
+  // The same rules for the other kinds, which share the operation.
+  ZvRawFCurve raw = Raw({{0, 0}, {1, 1}, {2, 0}});
+  ASSERT_EQ(raw.ScaleAndOffsetParameters(0.5, 1.5, 0, 1, -0.75, 0, 0, C::LeftHandle), 1u);
+  EXPECT_EQ(Keys(raw), (std::vector<double>{0, 0.25, 2}));
+  EXPECT_EQ(raw.ScaleAndOffsetParameters(0.5, 1.5, 0, 2, 0, 0, 0, C::LeftHandle), 0u)
+      << "a scale of part of the keys is refused";
+}
+
+}  // namespace
