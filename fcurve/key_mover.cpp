@@ -136,8 +136,9 @@ void ZvFCurveKeyMoverImpl::DecideStates(const ZvPoint2<double>& translation, dou
     unsigned char state = ValueOnly;
     parameters[k] = m_currentParameters[k];
     if (!(flags & CFCFlag_ParameterLock) && !blocked) {
-      const double t = m_keys->StartParameter(k) + translation.x;
-      if (m_keys->UnmovedKeyNear(t, kCollision)) {
+      const double start = m_keys->StartParameter(k), t = start + translation.x;
+      // A key's own start is always free, however near its neighbours were to begin with.
+      if (t != start && m_keys->UnmovedKeyNear(t, kCollision)) {
         blocked = true;
       } else {
         parameters[k] = t;
@@ -168,6 +169,8 @@ void ZvFCurveKeyMoverImpl::SeparateSelectedKeys(double* parameters) {
     for (unsigned int n = 1; n < m_numKeys; ++n) {
       const unsigned int a = m_ascending[n - 1], b = m_ascending[n];
       if (!moving(a) && !moving(b)) continue;
+      const auto home = [&](unsigned int k) { return parameters[k] == m_keys->StartParameter(k); };
+      if (home(a) && home(b)) continue;
       const double gap = parameters[b] - parameters[a];
       if (gap > (moving(a) && moving(b) ? kKeyIdentity : kCollision)) continue;
       for (unsigned int k : {a, b}) {

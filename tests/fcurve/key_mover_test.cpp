@@ -231,6 +231,21 @@ TEST(KeyMover, StopsOnUnmovedKeysAndGoesOn) {
   EXPECT_EQ(drag.To(0, 0), 1);
   EXPECT_EQ(Dump(curve), Dump(Raw({{0, 0}, {1, 1}, {2, 2}, {3, 3}})));
   EXPECT_EQ(drag.To(0, 0), 0) << "nothing left to change";
+
+  // Keys that started nearer than the collision distance may always go back where they were.
+  ZvIntegerFCurve close;
+  close.CreateKey(0, 0);
+  close.CreateKey(5e-7, 1);
+  close.CreateKey(1, 0);
+  double at = 5e-7;
+  close.SetConstraint(at, C::ParameterLock, 1, 0.0);
+  const std::string closeStart = Dump(close);
+  ZvFCurveKeyMover apart(close, Params({0, 5e-7}), kWide, kNoBox);
+  Drag back(apart);
+  back.To(-0.5, 1);
+  EXPECT_EQ(Keys(close), (std::vector<double>{-0.5, 5e-7, 1}));
+  back.To(0, 0);
+  EXPECT_EQ(Dump(close), closeStart);
 }
 
 // The translation is clamped so that the selection's extreme keys reach the bounds exactly.
