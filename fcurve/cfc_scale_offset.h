@@ -3,16 +3,53 @@
 //
 // The work happens on a copy, which replaces the curve only when everything succeeded and the
 // copy is valid. A bulk change of part of the keys must obey the collision and clamp rules of
-// an interactive drag, so it belongs to the key stretcher and the key mover; those are not part
-// of this library yet, and such a change is refused with 0. When the change concerns every key
-// it is a plain scale, mirror or shift of the whole curve, and is done here.
+// an interactive drag: an offset of part of the keys is one Update of the key mover. A scale of
+// part of the keys belongs to the key stretcher, which is not part of this library yet: such a
+// change is refused with 0. When the change concerns every key it is a plain scale, mirror or
+// shift of the whole curve, and is done here.
 #ifndef ZV_FCURVE_CFC_SCALE_OFFSET_H
 #define ZV_FCURVE_CFC_SCALE_OFFSET_H
 
 #include <zv/fcurve.h>
 
+#include "fcurve/key_mover_impl.h"
+
+#include <algorithm>
 #include <cfloat>
 #include <cmath>
+
+// Moves the keys of [start, end] by offset as one drag would, with its collision rules. The
+// interval reaches to the last key when the head moves forwards or the tail backwards, and to the
+// first key the other way round. An interval without keys moves temporary keys made at its ends,
+// which are removed afterwards.
+template <class Curve>
+bool CFCOffsetPartOfKeys(Curve& work, double start, double end, double offset, int moveHead,
+                         int moveTail) {
+  double first = 0.0, last = 0.0;
+  work.GetSmallestKeyParameter(first);
+  work.GetLargestKeyParameter(last);
+  if ((moveHead && offset > 0.0) || (moveTail && offset < 0.0)) end = std::max(end, last);
+  if ((moveHead && offset < 0.0) || (moveTail && offset > 0.0)) start = std::min(start, first);
+  ZvDoubleArray selected(8);
+  bool temporary = false;
+  if (work.GetKeyParameters(start, end, selected, 0, 0) == 0) {
+    if (!work.CreateNonModifyingKey(start, 1) || !work.CreateNonModifyingKey(end, 1)) return false;
+    temporary = true;
+    if (work.GetKeyParameters(start, end, selected, 0, 0) == 0) return false;
+  }
+  const ZvExtent2<double> everywhere(-DBL_MAX, -DBL_MAX, DBL_MAX, DBL_MAX);
+  ZvFCurveKeyMoverImpl mover(work, selected, everywhere, ZvExtent2<double>());
+  ZvPoint2<double> translation{offset, 0.0};
+  ZvDoubleArray moved;
+  ZvExtent2<double> modified, box;
+  mover.Update(translation, moved, modified, box, -DBL_MAX, DBL_MAX);
+  mover.Finalize();
+  if (temporary) {
+    work.RemoveKey(start + offset, 1e-6);
+    work.RemoveKey(end + offset, 1e-6);
+  }
+  return true;
+}
 
 // Called under the curve's lock; `valid` tells whether the edited copy may replace the curve.
 template <class Curve, class Valid>
@@ -33,11 +70,8 @@ unsigned int CFCScaleAndOffsetParameters(Curve& c, double start, double end, dou
   work.GetNearestKeyParameterInCenteredInterval(start, 1e-6);
   work.GetNearestKeyParameterInCenteredInterval(end, 1e-6);
   ZvDoubleArray selected(8);
-  if (work.GetKeyParameters(start, end, selected, 0, 0) == 0) {
-    // Temporary keys would stand for the empty interval; with keys elsewhere the selection is
-    // then partial, which is the stretcher's and the mover's work.
-    return 0;
-  }
+  // An empty interval is scaled through temporary keys at its ends, which is the stretcher's.
+  if (work.GetKeyParameters(start, end, selected, 0, 0) == 0 && scales) return 0;
   const bool all = selected.size == work.GetNumKeys();
   const double factor = std::fabs(scale);
   if (scales) {
@@ -56,8 +90,11 @@ unsigned int CFCScaleAndOffsetParameters(Curve& c, double start, double end, dou
     }
   }
   if (offsets) {
-    if (!all && !(moveHead && moveTail)) return 0;  // the mover's work
-    if (!work.ShiftParameters(offset)) return 0;
+    if (all || (moveHead && moveTail)) {
+      if (!work.ShiftParameters(offset)) return 0;
+    } else if (!CFCOffsetPartOfKeys(work, start, end, offset, moveHead, moveTail)) {
+      return 0;
+    }
   }
   if (!valid(work)) return 0;
   return c.Set(work);

@@ -130,6 +130,8 @@ class ZV_API ZvQuatCurve {
   int refCount;
   unsigned int extrapolation;
   int readOnly;
+
+  friend struct CFCCurveStore;  // the interactive editing tools work on the keys directly
 };
 
 // One Euler angle (component 0 x, 1 y, 2 z) of a shared ZvQuatCurve as a function curve, in

@@ -27,9 +27,10 @@
 // box showing more than a million periods is refused with 0.
 //
 // Persistence is not available yet: GetBufferSize, WriteToBuffer and ReadFromBufferBody refuse
-// with 0 and change nothing. ScaleAndOffsetParameters does what concerns every key (a scale, a
-// mirror, a shift of the whole curve) and refuses with 0 a change of part of the keys, which
-// needs the interactive key stretcher and mover.
+// with 0 and change nothing. ScaleAndOffsetParameters scales, mirrors and shifts the whole
+// curve, and offsets part of the keys as a drag of ZvFCurveKeyMover would (a key that would land
+// on a key that stays does not move, nor do those behind it); it refuses with 0 a scale of part
+// of the keys, which needs the key stretcher.
 #ifndef ZV_STD_FCURVE_H
 #define ZV_STD_FCURVE_H
 
@@ -293,6 +294,8 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   friend class ZvStdTgtMoverImpl;  // a drag writes handles that are valid only as a pair
 
   ZvStdFCurveImpl* m_impl;
+
+  friend struct CFCCurveStore;  // the interactive editing tools work on the keys directly
 };
 
 // The u in [0, 1] at which a monotone cubic X with controls x0..x3 takes the value x.
