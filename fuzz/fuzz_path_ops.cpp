@@ -3,7 +3,7 @@
 // and its written block must read back through the bounded reader to the same bytes. An
 // allocation failure (which includes a flatten past its cap) is an allowed outcome; the path
 // must still parse after it. CI runs this with -timeout=1 and -rss_limit_mb=512; an input holds
-// at most 16 calls, so that a second for the input bounds every call well within it.
+// at most 8 calls, so that a second for the input bounds every call well within it.
 #include <zv/gc.h>
 #include <zv/path2f.h>
 
@@ -67,7 +67,7 @@ void Check(const ZvPath2f& path) {
 
 // A flatten's cost grows with the path's size over the tolerance, up to the flatteners' cap of
 // 2^24 points, and sampling's with the size over the spacing, up to 2^24 samples (both caps are
-// tested on their own): steps finer than 1e-4 of the path's size (a path's length can be many
+// tested on their own): steps finer than 1e-3 of the path's size (a path's length can be many
 // times its size) would only measure that cost here. Non-positive and non-finite steps still
 // get through.
 double Tolerance(const ZvPath2f& path, double asked) {
@@ -75,7 +75,7 @@ double Tolerance(const ZvPath2f& path, double asked) {
   path.GetExtent(box);
   const double size =
       std::fmax(std::fabs(double(box.xmax) - box.xmin), std::fabs(double(box.ymax) - box.ymin));
-  return std::isfinite(size) ? std::fmax(asked, size * 1e-4) : asked;
+  return std::isfinite(size) ? std::fmax(asked, size * 1e-3) : asked;
 }
 
 void Step(ZvPath2f& path, Input& in) {
@@ -204,7 +204,7 @@ void Step(ZvPath2f& path, Input& in) {
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   Input in(data, size);
   ZvPath2f path;
-  for (int calls = 0; in.More() && calls < 16; ++calls) {
+  for (int calls = 0; in.More() && calls < 8; ++calls) {
     try {
       Step(path, in);
     } catch (const std::bad_alloc&) {
