@@ -38,6 +38,17 @@ class ZvByteWriter {
     std::memcpy(&bits, f, 4);
     U32(bits);
   }
+  void Bytes(const void* data, std::size_t count) {
+    if (count) std::memcpy(at_, data, count);
+    at_ += count;
+  }
+  // The next `count` bytes, for a nested block that its own writer fills; the writer moves past
+  // them.
+  unsigned char* Run(std::size_t count) {
+    unsigned char* p = at_;
+    at_ += count;
+    return p;
+  }
   std::size_t Written() const { return static_cast<std::size_t>(at_ - start_); }
 
  private:
@@ -80,6 +91,13 @@ class ZvByteReader {
     std::memcpy(f, &bits, 4);
   }
   void Skip(std::size_t count) { Take(count); }
+  // The next `count` bytes where they lie, without a copy.
+  const unsigned char* Bytes(std::size_t count) { return Take(count); }
+  // A reader of the next `count` bytes alone, bounded like this one; this one does not move.
+  // A nested block is read through it so that its contents cannot reach past its own length.
+  ZvByteReader Part(std::size_t count) const {
+    return bounded_ ? ZvByteReader(at_, count) : ZvByteReader(at_);
+  }
 
   std::size_t Consumed() const { return static_cast<std::size_t>(at_ - start_); }
 

@@ -26,16 +26,23 @@
 // polyline at regular steps and replaces the contents of its arrays. Under the cycle methods a
 // box showing more than a million periods is refused with 0.
 //
-// Persistence is not available yet: GetBufferSize, WriteToBuffer and ReadFromBufferBody refuse
-// with 0 and change nothing. ScaleAndOffsetParameters does what concerns every key (a scale, a
-// mirror, a shift of the whole curve) and refuses with 0 a change of part of the keys, which
-// needs the interactive key stretcher and mover.
+// Persistence. The block (version 264) holds the curve-wide values, 60 bytes a key, the flags,
+// extrapolation, read-only flag, the keys' extra bytes, the user data block, the tangent
+// constraint and the time-curve flag: 68 + 64 n + U bytes for n keys and a user data block of U,
+// of which the writer fills all but the last four, which it zeroes. GetBufferSize first drops
+// every key whose parameter is not above the one kept before it (their per-key user data go
+// along), so a curve writes only ascending keys. ReadFromBufferBody takes every older version as
+// well; it consumes 60 + 64 n + U body bytes of a block of today. ScaleAndOffsetParameters does
+// what concerns every key (a scale, a mirror, a shift of the whole curve) and refuses with 0 a
+// change of part of the keys, which needs the interactive key stretcher and mover.
 #ifndef ZV_STD_FCURVE_H
 #define ZV_STD_FCURVE_H
 
 #include <zv/api.h>
 #include <zv/fcurve.h>
 #include <zv/point.h>
+
+#include <cstddef>
 
 class ZvStdFCurveImpl;
 class ZvFCurveLockGuard;
@@ -167,6 +174,10 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   unsigned int GetBufferSize() const override;
   unsigned int WriteToBuffer(void* buffer) const override;
   unsigned int ReadFromBufferBody(const void* body) override;
+  // Reads a whole block of `size` bytes, length field included, refusing one whose length exceeds
+  // `size` or whose contents would be read past its body: the bytes taken (4 + the stored
+  // length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
+  unsigned int ReadFromBuffer(const void* buffer, std::size_t size);
   unsigned int ScaleAndShiftValues(double scale, double offset) override;
   // The parameter at which a bijective curve takes the value; the last argument is ignored.
   unsigned int EvalInverse(double value, double& parameter, int clamped) const override;
@@ -283,6 +294,8 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
  private:
   // Copies under the source's lock, held from before the user data is copied until the keys are.
   ZvStdFCurve(const ZvStdFCurve& other, const ZvFCurveLockGuard& sourceLock);
+  // The reader behind ReadFromBufferBody and ReadFromBuffer.
+  unsigned int ReadBody(ZvByteReader& in);
 
   ZvStdFCurveImpl* m_impl;
 };
