@@ -155,4 +155,16 @@ inline ZvStdFCurve RichStdCurve() {
   return curve;
 }
 
+// The fuzzer's seeds: one block of each kind as written today and one of each older layout, by
+// file name under fuzz/corpus/fuzz_fcurve_buffer/.
+inline std::vector<std::pair<std::string, ByteVec>> SeedBlocks() {
+  std::vector<std::pair<std::string, ByteVec>> seeds = {
+      {"std_empty", BlockOf(ZvStdFCurve())},
+      {"std_rich", BlockOf(RichStdCurve())},
+  };
+  for (unsigned int stamp : {1u, 256u, 257u, 259u, 261u, 262u})
+    seeds.emplace_back("std_v" + std::to_string(stamp), StdBlock(stamp));
+  return seeds;
+}
+
 #endif
