@@ -2,9 +2,11 @@
 //
 //   zv render [options] [FILE]   SVG path data from FILE (or standard input) to a PNG
 //   zv demo [-o FILE]            the built-in scene
+//   zv curve [options] [KEYS]    a function curve sampled to CSV, plotted, saved as a block
 //
 // Every failure is one line on standard error and a non-zero exit: 1 for bad input or output,
 // 2 for a bad command line.
+#include "curve.h"
 #include "demo.h"
 #include "png_write.h"
 #include "render.h"
@@ -202,8 +204,9 @@ int main(int argc, char** argv) {
   try {
     if (command == "render") return Render(args);
     if (command == "demo") return Demo(args);
+    if (command == "curve") return ZvCurveCommand(argc, argv);
     if (command == "help" || command == "--help" || command == "-h") {
-      std::cout << kUsage;
+      std::cout << kUsage << kZvCurveUsage;
       return 0;
     }
     throw UsageError{command.empty() ? "no command given" : "unknown command '" + command + "'"};
