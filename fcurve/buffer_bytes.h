@@ -1,10 +1,10 @@
 // What the curve blocks add to the little-endian writer and reader: doubles, identifiers, tags
 // and the opening of a whole block.
 //
-// A double travels as the eight bytes of its IEEE 754 image, low word first, and a value that is
-// not finite travels as 0.0 both ways: a block never carries nor yields a NaN or an infinity.
-// Every reader is written once against ZvByteReader and asks Has() before each run of reads, so
-// the trusted body readers and the bounded whole-block readers are the same code.
+// A double travels as the eight bytes of its IEEE 754 image, least significant first, and a value
+// that is not finite travels as 0.0 both ways: a block never carries nor yields a NaN or an
+// infinity. Every reader is written once against ZvByteReader and asks Has() before each run of
+// reads, so the trusted body readers and the bounded whole-block readers are the same code.
 #ifndef ZV_FCURVE_BUFFER_BYTES_H
 #define ZV_FCURVE_BUFFER_BYTES_H
 
@@ -21,20 +21,27 @@ inline double zvFiniteOrZero(double v) {
   return std::isfinite(v) ? v : 0.0;
 }
 
-inline void zvPutF64(ZvByteWriter& out, double v) {
-  const double filtered = zvFiniteOrZero(v);
-  std::uint64_t bits;
-  std::memcpy(&bits, &filtered, 8);
-  out.U32(static_cast<std::uint32_t>(bits));
-  out.U32(static_cast<std::uint32_t>(bits >> 32));
-}
-
-inline double zvGetF64(ZvByteReader& in) {
-  const std::uint64_t low = in.U32();
-  const std::uint64_t bits = low | static_cast<std::uint64_t>(in.U32()) << 32;
+// The double at p, and its store, for runs of records decoded from one local pointer.
+inline double zvLoadF64(const unsigned char* p) {
+  const std::uint64_t bits = zvLoadLE<8>(p);
   double v;
   std::memcpy(&v, &bits, 8);
   return zvFiniteOrZero(v);
+}
+
+inline unsigned char* zvStoreF64(unsigned char* p, double v) {
+  const double filtered = zvFiniteOrZero(v);
+  std::uint64_t bits;
+  std::memcpy(&bits, &filtered, 8);
+  return zvStoreLE<8>(p, bits);
+}
+
+inline void zvPutF64(ZvByteWriter& out, double v) {
+  zvStoreF64(out.Run(8), v);
+}
+
+inline double zvGetF64(ZvByteReader& in) {
+  return zvLoadF64(in.Bytes(8));
 }
 
 // u32 Data1, u16 Data2, u16 Data3, the 8 bytes of Data4.

@@ -20,17 +20,19 @@ bool IsOne(unsigned int byte) {
   return byte == 1;
 }
 
-void ReadKeyFields(ZvByteReader& in, CFCStdKey& k) {
-  k.parameter = zvGetF64(in);
-  k.leftValue = zvGetF64(in);
-  k.rightValue = zvGetF64(in);
-  k.leftTangent.x = zvGetF64(in);
-  k.leftTangent.y = zvGetF64(in);
-  k.rightTangent.x = zvGetF64(in);
-  k.rightTangent.y = zvGetF64(in);
-  k.segmentKind = in.U8();
-  in.Skip(3);
+// A key record from p; the caller checked that it lies inside the block. New keys claim
+// continuity until the flags say otherwise.
+const unsigned char* ReadKeyRecord(const unsigned char* p, CFCStdKey& k) {
+  k.parameter = zvLoadF64(p);
+  k.leftValue = zvLoadF64(p + 8);
+  k.rightValue = zvLoadF64(p + 16);
+  k.leftTangent.x = zvLoadF64(p + 24);
+  k.leftTangent.y = zvLoadF64(p + 32);
+  k.rightTangent.x = zvLoadF64(p + 40);
+  k.rightTangent.y = zvLoadF64(p + 48);
+  k.segmentKind = p[56];
   k.flags = CFCFlag_TangentContinuity;
+  return p + kKeyRecordSize;
 }
 
 // The oldest layout: value when no keys, first segment kind, and 64-byte records whose last
@@ -43,8 +45,8 @@ bool ReadOldest(ZvByteReader& in, ZvStdFCurveImpl& s) {
   if (!in.Has(static_cast<std::uint64_t>(kKeyRecordSize + 4) * n)) return false;
   s.keys.Resize(n);
   for (unsigned int i = 0; i < n; ++i) {
-    ReadKeyFields(in, s.keys[i]);
-    if (in.U32() != 0) return false;
+    const unsigned char* tail = ReadKeyRecord(in.Bytes(kKeyRecordSize + 4), s.keys[i]);
+    if (zvLoadLE<4>(tail) != 0) return false;
   }
   return true;
 }
@@ -60,8 +62,10 @@ bool ReadHeaderAndKeys(ZvByteReader& in, ZvStdFCurveImpl& s) {
   // The records are checked before anything is allocated for them.
   if (!in.Has(static_cast<std::uint64_t>(kKeyRecordSize) * n)) return false;
   s.keys.Resize(n);
+  const unsigned char* p = in.Bytes(kKeyRecordSize * n);
+  CFCStdKey* keys = s.keys.data;
   for (unsigned int i = 0; i < n; ++i)
-    ReadKeyFields(in, s.keys[i]);
+    p = ReadKeyRecord(p, keys[i]);
   return true;
 }
 

@@ -2,49 +2,17 @@
 #include <zv/std_fcurve.h>
 
 #include "fcurve/buffer_bytes.h"
+#include "fcurve/cfc_key_order.h"
 #include "fcurve/fcurve_lock.h"
 #include "fcurve/std_fcurve_buffer.h"
 #include "fcurve/std_fcurve_impl.h"
 
-#include <vector>
-
 using namespace zv_std_buffer;
-
-namespace {
-
-// Keeps the keys whose parameter is above the last kept one, in order, and answers the
-// parameters of the keys it dropped.
-std::vector<double> DropKeysOutOfOrder(ZvStdFCurveImpl& s) {
-  std::vector<double> dropped;
-  unsigned int kept = 0;
-  for (unsigned int i = 0; i < s.keys.size; ++i) {
-    if (kept > 0 && !(s.keys[i].parameter > s.keys[kept - 1].parameter)) {
-      dropped.push_back(s.keys[i].parameter);
-      continue;
-    }
-    if (kept != i) s.keys[kept] = s.keys[i];
-    ++kept;
-  }
-  if (kept != s.keys.size) s.keys.Resize(kept);
-  return dropped;
-}
-
-}  // namespace
 
 // Not a pure query: a curve whose keys went out of order (a foreign block, say) is repaired
 // here, before the lock, so that what is written always reads back as a valid curve.
 unsigned int ZvStdFCurve::GetBufferSize() const {
-  if (!m_impl->IsValid()) {
-    ZvStdFCurve& self = const_cast<ZvStdFCurve&>(*this);
-    for (const double parameter : DropKeysOutOfOrder(*m_impl)) {
-      // A dropped key's user data go with it, unless a kept key has the same parameter.
-      unsigned int at;
-      if (!m_impl->GetClosestKeyIndexInCenteredInterval(parameter, 0.0, at) ||
-          m_impl->keys[at].parameter != parameter) {
-        self.RemoveKeyUserData(parameter);
-      }
-    }
-  }
+  if (!m_impl->IsValid()) CFCDropKeysOutOfOrder(*m_impl, const_cast<ZvStdFCurve&>(*this));
   ZvFCurveLockGuard guard(*this);
   const unsigned int perKey = kKeyRecordSize + 2 + 2;  // record, flags, extra bytes
   return kHeaderSize + perKey * m_impl->keys.size + kTrailerSize + GetUserDataBufferSize() +
@@ -66,15 +34,14 @@ unsigned int ZvStdFCurve::WriteToBuffer(void* buffer) const {
   zvPutF64(out, s.maxClamp);
   out.U32(s.firstSegmentKind);
   out.U32(n);
+  unsigned char* p = out.Run(kKeyRecordSize * n);
   for (unsigned int i = 0; i < n; ++i) {
     const CFCStdKey& k = s.keys[i];
     for (const double v : {k.parameter, k.leftValue, k.rightValue, k.leftTangent.x, k.leftTangent.y,
                            k.rightTangent.x, k.rightTangent.y}) {
-      zvPutF64(out, v);
+      p = zvStoreF64(p, v);
     }
-    out.U8(k.segmentKind);
-    out.U8(0);
-    out.U16(0);
+    p = zvStoreLE<4>(p, k.segmentKind);  // the kind and three zero bytes
   }
   out.U32(kFlagsTag);
   for (unsigned int i = 0; i < n; ++i)
