@@ -9,6 +9,7 @@
 #include "fcurve/std_fcurve_buffer.h"
 #include "fcurve/std_fcurve_impl.h"
 
+#include <cstring>
 #include <utility>
 
 using namespace zv_std_buffer;
@@ -79,18 +80,18 @@ bool ReadTaggedBlocks(ZvByteReader& in, unsigned int stamp, ZvStdFCurveImpl& s,
   if (!zvReadTag(in, kFlagsTag) || !in.Has(static_cast<std::uint64_t>(wide ? 2 : 1) * n)) {
     return false;
   }
-  for (unsigned int i = 0; i < n; ++i)
-    s.keys[i].flags = static_cast<unsigned short>(wide ? in.U16() : in.U8());
+  const unsigned char* flags = in.Bytes((wide ? 2u : 1u) * n);
+  for (unsigned int i = 0; i < n; ++i) {
+    s.keys[i].flags = static_cast<unsigned short>(wide ? zvLoadLE<2>(flags + 2 * i) : flags[i]);
+  }
 
   if (stamp < kSettingsTag) return true;
   if (!zvReadTag(in, kSettingsTag) || !in.Has(2 + 2 * static_cast<std::uint64_t>(n))) return false;
   s.extrapolation = in.U8();
   s.readOnly = in.U8() != 0 ? 1 : 0;
-  for (unsigned int i = 0; i < n; ++i) {
-    const unsigned char* extra = in.Bytes(2);
-    s.keys[i].extra[0] = extra[0];
-    s.keys[i].extra[1] = extra[1];
-  }
+  const unsigned char* extra = in.Bytes(2u * n);
+  for (unsigned int i = 0; i < n; ++i)
+    std::memcpy(s.keys[i].extra, extra + 2 * i, 2);
   if (readUserData(in) == 0) return false;
 
   if (stamp < kTangentConstraintTag) return true;

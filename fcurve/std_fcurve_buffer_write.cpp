@@ -7,6 +7,8 @@
 #include "fcurve/std_fcurve_buffer.h"
 #include "fcurve/std_fcurve_impl.h"
 
+#include <cstring>
+
 using namespace zv_std_buffer;
 
 // Not a pure query: a curve whose keys went out of order (a foreign block, say) is repaired
@@ -44,13 +46,15 @@ unsigned int ZvStdFCurve::WriteToBuffer(void* buffer) const {
     p = zvStoreLE<4>(p, k.segmentKind);  // the kind and three zero bytes
   }
   out.U32(kFlagsTag);
+  p = out.Run(2u * n);
   for (unsigned int i = 0; i < n; ++i)
-    out.U16(s.keys[i].flags);
+    p = zvStoreLE<2>(p, s.keys[i].flags);
   out.U32(kSettingsTag);
   out.U8(s.extrapolation);
   out.U8(s.readOnly ? 1 : 0);
-  for (unsigned int i = 0; i < n; ++i)
-    out.Bytes(s.keys[i].extra, 2);
+  p = out.Run(2u * n);
+  for (unsigned int i = 0; i < n; ++i, p += 2)
+    std::memcpy(p, s.keys[i].extra, 2);
   WriteUserData(out);
   out.U32(kTangentConstraintTag);
   out.U8(s.defaultBezierTangentConstraint ? 1 : 0);
