@@ -1,6 +1,7 @@
 // Curves from persistent blocks: the kind of a body, and the factories that build a curve of
 // that kind from a trusted body or from a bounded whole block.
 #include <zv/fcurve.h>
+#include <zv/quat_fcurve.h>
 #include <zv/std_fcurve.h>
 
 #include "fcurve/buffer_bytes.h"
@@ -46,6 +47,8 @@ const KindReader kReaders[] = {
     {ZvBaseFCurve::StdKind,
      [] { return static_cast<ZvBaseFCurve*>(new ZvStdFCurve(0.0, ZvBaseFCurve::CubicSegment)); },
      &ReadBounded<ZvStdFCurve>},
+    {ZvBaseFCurve::QuatKind, [] { return static_cast<ZvBaseFCurve*>(new ZvQuatFCurve(0)); },
+     &ReadBounded<ZvQuatFCurve>},
 };
 
 const KindReader* ReaderOfKind(unsigned int kind) {

@@ -3,12 +3,14 @@
 #ifndef ZV_TESTS_FCURVE_CURVE_BLOCKS_H
 #define ZV_TESTS_FCURVE_CURVE_BLOCKS_H
 
+#include <zv/quat_fcurve.h>
 #include <zv/std_fcurve.h>
 
 #include <gtest/gtest.h>
 
 #include <cstdint>
 #include <cstring>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -155,12 +157,40 @@ inline ZvStdFCurve RichStdCurve() {
   return curve;
 }
 
+// A rotation block of the older form, "0010", which has no component: two keys out of time
+// order, spins with the top bits set (masked off on reading), parameter locks.
+inline ByteVec QuatBlockWithoutComponent() {
+  BlockBuilder b;
+  b.U32(0x30313030).U32(ZvBaseFCurve::QuatKind).U32(2);
+  for (double time : {2.0, 1.0}) {
+    b.F64(time).F64(time / 4).F64(0.0).F64(-time / 8);
+    b.U32(0).U32(0).U32(0).U16(0xC005).U16(4);
+  }
+  return b.F64(0.1).F64(0.2).F64(0.3).U32(0).U32(3).NoUserData().Finish();
+}
+
+// A rotation view of two keys with locks, spins and user data.
+// (Held by pointer: a copy of a view leaves its user data behind.)
+inline std::unique_ptr<ZvQuatFCurve> RotationView() {
+  std::unique_ptr<ZvQuatFCurve> owner(new ZvQuatFCurve(2));
+  ZvQuatFCurve& view = *owner;
+  ZvQuatCurve& rotation = *view.GetQuatCurve();
+  rotation.SetKey(ZvQuatKey(0.0, {0.1, 0.2, 0.3}, 0.25f, -0.5f, 0.0f, -2), 0.0);
+  rotation.SetKey(ZvQuatKey(1.5, {1.0, -0.5, 0.25}, 0.0f, 0.0f, 0.75f, 1), 0.0);
+  rotation.SetConstraintData(1, 6);
+  double t = 1.5;
+  view.SetKeyUserData(t, MakeUID(8), Bytes("turn"), 4, 0.0);
+  return owner;
+}
+
 // The fuzzer's seeds: one block of each kind as written today and one of each older layout, by
 // file name under fuzz/corpus/fuzz_fcurve_buffer/.
 inline std::vector<std::pair<std::string, ByteVec>> SeedBlocks() {
   std::vector<std::pair<std::string, ByteVec>> seeds = {
       {"std_empty", BlockOf(ZvStdFCurve())},
       {"std_rich", BlockOf(RichStdCurve())},
+      {"quat", BlockOf(*RotationView())},
+      {"quat_v0010", QuatBlockWithoutComponent()},
   };
   for (unsigned int stamp : {1u, 256u, 257u, 259u, 261u, 262u})
     seeds.emplace_back("std_v" + std::to_string(stamp), StdBlock(stamp));

@@ -66,11 +66,10 @@ TEST(FCurveFactory, EveryTruncatedBlockIsRefused) {
     const ByteVec& block = seed.second;
     ZvBaseFCurve* probe = nullptr;
     ASSERT_EQ(ZvBaseFCurve_CreateFromBufferBody(block.data() + 4, &probe), 1u);
-    ZvStdFCurve target;
     // What the reader needs: its length field and the body bytes it consumes.
-    const std::size_t needed = 4 + target.ReadFromBufferBody(block.data() + 4);
+    const std::size_t needed = 4 + probe->ReadFromBufferBody(block.data() + 4);
     delete probe;
-    target = RichStdCurve();
+    ZvStdFCurve target = RichStdCurve();
     const ByteVec before = BlockOf(target);
     for (std::size_t cut = 0; cut < block.size(); ++cut) {
       ByteVec prefix(block.begin(), block.begin() + static_cast<std::ptrdiff_t>(cut));

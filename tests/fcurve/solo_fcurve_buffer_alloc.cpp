@@ -40,22 +40,29 @@ int ForEachFailure(const std::function<void()>& op, const std::function<void(boo
 TEST(FCurveBufferAllocFailure, BodyReaderThrowsAndChangesNothing) {
   for (const auto& seed : SeedBlocks()) {
     SCOPED_TRACE(seed.first);
-    ZvStdFCurve target(7.0);
-    target.CreateKey(1.0, 2.0);
-    const ByteVec before = BlockOf(target);
+    const unsigned char* body = seed.second.data() + 4;
+    // A curve of the block's kind, holding what the block holds, reads the block again.
+    std::unique_ptr<ZvBaseFCurve> target;
+    const auto fresh = [&] {
+      ZvBaseFCurve* made = nullptr;
+      ASSERT_EQ(ZvBaseFCurve_CreateFromBufferBody(body, &made), 1u);
+      target.reset(made);
+      // Unlike the block, so that a half-done read would show.
+      target->SetFCurveUserData(MakeUID(99), Bytes("other"), 5);
+    };
+    fresh();
+    const ByteVec before = BlockOf(*target);
     unsigned int read = 0;
-    const int failures =
-        ForEachFailure([&] { read = target.ReadFromBufferBody(seed.second.data() + 4); },
-                       [&](bool threw) {
-                         // An item's bytes lost while copying are dropped in silence; anything else
-                         // throws.
-                         if (threw) {
-            EXPECT_EQ(BlockOf(target), before);
-          }
-                         EXPECT_EQ(target.GetLockCount(), 0u);
-                         target = ZvStdFCurve(7.0);
-                         target.CreateKey(1.0, 2.0);
-                       });
+    const int failures = ForEachFailure([&] { read = target->ReadFromBufferBody(body); },
+                                        [&](bool threw) {
+                                          // An item's bytes lost while copying are dropped in
+                                          // silence; anything else throws.
+                                          if (threw) {
+                                            EXPECT_EQ(BlockOf(*target), before);
+                                          }
+                                          EXPECT_EQ(target->GetLockCount(), 0u);
+                                          fresh();
+                                        });
     EXPECT_GT(failures, 0);
     EXPECT_NE(read, 0u);
   }
@@ -72,8 +79,8 @@ TEST(FCurveBufferAllocFailure, FactoriesAnswerNull) {
                        [&](bool threw) {
                          EXPECT_FALSE(threw);
                          if (result == 0) {
-            EXPECT_EQ(out, nullptr);
-          }
+                           EXPECT_EQ(out, nullptr);
+                         }
                          delete out;
                          out = nullptr;
                        });
