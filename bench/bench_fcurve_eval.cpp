@@ -4,52 +4,24 @@
 // lock and unlock of the curve costs on its own.
 #include <benchmark/benchmark.h>
 
+#include "eval_bench_data.h"
 #include "median_reporter.h"
 
 #include <zv/std_fcurve.h>
 
 #if ZV_HAVE_GSL
-#include <gsl/gsl_errno.h>
 #include <gsl/gsl_spline.h>
 #endif
 
-#include <cmath>
 #include <cstdio>
-#include <map>
-#include <random>
-#include <string>
 #include <vector>
 
 namespace {
 
-constexpr int kKeys = 1000;
+constexpr int kKeys = kEvalBenchKeys;
 
-struct Data {
-  std::vector<double> x, y;
-  std::vector<double> sequential;  // a sweep over the keyed range, ten samples per segment
-  std::vector<double> random;
-  Data() {
-    std::mt19937 rng(11);
-    std::uniform_real_distribution<double> gap(0.05, 0.15);
-    double p = 0.0;
-    for (int i = 0; i < kKeys; ++i) {
-      x.push_back(p);
-      y.push_back(std::sin(i * 0.37) * 3.0 + std::cos(i * 0.11));
-      p += gap(rng);
-    }
-    const double last = x.back();
-    const int sweep = 10 * (kKeys - 1);
-    for (int i = 0; i < sweep; ++i)
-      sequential.push_back(last * i / sweep);
-    std::uniform_real_distribution<double> anywhere(0.0, last);
-    for (int i = 0; i < 4096; ++i)
-      random.push_back(anywhere(rng));
-  }
-};
-
-const Data& TheData() {
-  static const Data data;
-  return data;
+const EvalBenchData& TheData() {
+  return TheEvalBenchData();
 }
 
 // Keys appended left to right: cubic segments with continued tangents.
@@ -65,11 +37,7 @@ ZvStdFCurve& TheCurve() {
 
 void ZvEval(benchmark::State& state, const std::vector<double>& params) {
   const ZvStdFCurve& curve = TheCurve();
-  size_t i = 0;
-  for (auto _ : state) {
-    benchmark::DoNotOptimize(curve.Eval(params[i], 0));
-    if (++i == params.size()) i = 0;
-  }
+  EvalBenchLoop(state, params, [&curve](double t) { return curve.Eval(t, 0); });
 }
 
 void BM_ZvSequential(benchmark::State& state) {
@@ -93,26 +61,18 @@ void BM_ZvEvalSequence(benchmark::State& state) {
   state.counters["samples"] = values.size;
 }
 
-// The lock every public operation takes, alone.
 void BM_ZvLockUnlock(benchmark::State& state) {
-  const ZvStdFCurve& curve = TheCurve();
-  for (auto _ : state) {
-    curve.Lock();
-    curve.Unlock();
-  }
+  EvalBenchLockLoop(state, TheCurve());
 }
 
 #if ZV_HAVE_GSL
 void GslEval(benchmark::State& state, const std::vector<double>& params) {
-  const Data& d = TheData();
+  const EvalBenchData& d = TheData();
   gsl_interp_accel* accel = gsl_interp_accel_alloc();
   gsl_spline* spline = gsl_spline_alloc(gsl_interp_cspline, kKeys);
   gsl_spline_init(spline, d.x.data(), d.y.data(), kKeys);
-  size_t i = 0;
-  for (auto _ : state) {
-    benchmark::DoNotOptimize(gsl_spline_eval(spline, params[i], accel));
-    if (++i == params.size()) i = 0;
-  }
+  EvalBenchLoop(state, params,
+                [spline, accel](double t) { return gsl_spline_eval(spline, t, accel); });
   gsl_spline_free(spline);
   gsl_interp_accel_free(accel);
 }
@@ -137,15 +97,9 @@ BENCHMARK(BM_GslRandom)->Repetitions(5)->ReportAggregatesOnly(true);
 #endif
 
 int main(int argc, char** argv) {
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-#if ZV_HAVE_GSL
-  gsl_set_error_handler_off();
-#endif
   TheCurve();  // built outside the timings
   ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-  benchmark::Shutdown();
+  if (EvalBenchRun(argc, argv, reporter)) return 1;
 
   auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name) * 1e9; };
   const double zvSeq = median("BM_ZvSequential"), zvRnd = median("BM_ZvRandom");

@@ -50,7 +50,7 @@ ZvBezierTool::ZvBezierTool()
 
 ZvPoint2<double>* ZvBezierTool::Row(unsigned int k) {
   // Rows 0..k-1 hold d + 1, d, ..., d + 2 - k entries.
-  return differences + k * (degree + 1) - k * (k - 1) / 2;
+  return differences + (k * (degree + 1) - k * (k - 1) / 2);
 }
 
 void ZvBezierTool::Emit(const ZvPoint2<double>& q) {
@@ -120,10 +120,6 @@ void ZvBezierTool::ContextInitTwo() {
 
 void ZvBezierTool::OFDInnerLoop() {
   const unsigned int d = degree;
-  // Pieces are walked one at a time here, so the cap is checked piece by piece.
-  const unsigned int size = useDouble ? outDouble->size : outFloat->size;
-  if (size > kZvMaxFlattenPoints || numSteps - 2 > kZvMaxFlattenPoints - size)
-    throw std::bad_alloc();
   ZvPoint2<double> q = Row(0)[0];
   for (unsigned int i = 2; i < numSteps; ++i) {
     q += forward[1];
@@ -147,6 +143,16 @@ void ZvBezierTool::PMSOFD(const ZvPoint2<double>* p, unsigned int depth) {
   PMSOFD(right, depth - 1);
 }
 
+unsigned long long ZvBezierTool::CountPoints(const ZvPoint2<double>* p, unsigned int depth) {
+  if (depth == 0) {
+    ContextInitOne(p);
+    return numSteps - 2;
+  }
+  ZvPoint2<double> left[9], right[9];
+  SplitAtHalf(p, degree, left, right);
+  return CountPoints(left, depth - 1) + 1 + CountPoints(right, depth - 1);
+}
+
 unsigned int ZvBezierTool::FlattenPoints(const ZvPoint2<double>* p, unsigned int d, int skipFirst) {
   degree = d;
   numAdded = 0;
@@ -167,7 +173,15 @@ unsigned int ZvBezierTool::FlattenPoints(const ZvPoint2<double>* p, unsigned int
       if (len > l) l = len;
     }
   }
-  PMSOFD(p, zvSubdivisionDepth(zvTruncateToCount(l * (1.0 / tolerance) + 0.5)));
+  const unsigned int depth = zvSubdivisionDepth(zvTruncateToCount(l * (1.0 / tolerance) + 0.5));
+  // A walk never passes the array cap: at most 2^16 steps a piece, so shallow subdivisions of
+  // small arrays cannot reach it, and the others are counted before anything is walked.
+  const unsigned int size = useDouble ? outDouble->size : outFloat->size;
+  if (size > kZvMaxFlattenPoints ||
+      (((1ull << depth) << 16) + (1ull << depth) + 2 > kZvMaxFlattenPoints - size &&
+       CountPoints(p, depth) + 2 > kZvMaxFlattenPoints - size))
+    throw std::bad_alloc();
+  PMSOFD(p, depth);
   Emit(p[d]);
   return numAdded;
 }

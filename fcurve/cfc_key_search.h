@@ -63,24 +63,28 @@ class CFCKeySearch : public Store {
         return c + forward + 1;
       }
     }
-    unsigned int low = 0, high = n - 1;
-    if (lowEnd > t) {
-      high = c - back;
-    } else if (t > highEnd) {
-      low = c + forward;
+    // Here k[low] < t < k[high]; the neighbourhood, when t lies outside it, narrows the range.
+    // Which side t lies on is as good as random, so nothing below branches on it: a
+    // mispredicted branch per halving would cost more than the whole search. The step is added
+    // through a mask, which compilers do not turn back into a branch.
+    unsigned int low = t > highEnd ? c + forward : 0;
+    unsigned int length = (lowEnd > t ? c - back : n - 1) - low;
+    // k[low] < t <= k[low + length] holds throughout.
+    while (length > 1) {
+      const unsigned int half = length / 2;
+      // Both keys the next halving may read are fetched while this one waits for its own: on
+      // large keys the array outgrows the first-level cache.
+      const unsigned int next = (length - half) / 2;
+      __builtin_prefetch(&k[low + next]);
+      __builtin_prefetch(&k[low + half + next]);
+      low += (0u - static_cast<unsigned int>(t > k[low + half].parameter)) & half;
+      length -= half;
     }
-    while (high - low > 1) {
-      const unsigned int mid = (low + high) / 2;
-      const double p = k[mid].parameter;
-      if (!(t > p) && t >= p) {  // exact equality, on purpose
-        this->searchHint = mid;
-        found = 1;
-        return mid + 1;
-      }
-      // Which half is as good as random: chosen without a branch that would be mispredicted.
-      const bool above = t > p;
-      low = above ? mid : low;
-      high = above ? high : mid;
+    // A key equal to t is the one above low. Equality is exact, on purpose.
+    if (!(k[low + 1].parameter > t)) {
+      this->searchHint = low + 1;
+      found = 1;
+      return low + 2;
     }
     this->searchHint = low;
     found = 0;
@@ -150,6 +154,78 @@ class CFCKeySearch : public Store {
     if (t > last) t = last;
     unsigned int i;
     if (GetClosestKeyIndexInCenteredInterval(t, kCFCSnapTolerance, i)) t = keys[i].parameter;
+  }
+
+  // Brings t into the keyed range for the cycle methods and counts the periods (two keys or
+  // more). The right version sends a whole number of periods to the last key, the left version
+  // to the first.
+  double CycleOffsetFold(double t, double& cycles, bool left) const {
+    const unsigned int n = keys.size;
+    const double first = keys[0].parameter, last = keys[n - 1].parameter;
+    const double period = last - first;
+    const double r = (t - first) / period;
+    double folded;
+    if (left) {
+      cycles = std::floor(r);
+      if (first - t <= 1e-9) {
+        const double w = period * (r - std::floor(r));
+        folded = std::fabs(w) <= 1e-9 ? first : first + w;
+      } else {
+        const double w = period * (std::ceil(r) - r);
+        folded = std::fabs(w) <= 1e-9 ? first : last - w;
+      }
+    } else {
+      cycles = std::ceil(r) - 1.0;
+      if (t > first) {
+        const double w = period * (r - std::floor(r));
+        folded = std::fabs(w) <= 1e-9 ? last : first + w;
+      } else {
+        const double w = period * (std::ceil(r) - r);
+        folded = std::fabs(w) <= 1e-9 ? last : last - w;
+      }
+    }
+    if (folded < first) folded = first;
+    if (folded > last) folded = last;
+    return folded;
+  }
+
+  // Runs `edit(a, b)` over the parts of the keyed range that [start, end] covers: under the
+  // cycle methods (two keys or more) the interval is folded into the keyed range first - within
+  // one period the folded interval; across a period boundary the two folded pieces up to the
+  // ends of the keys; over more than a period the whole key range. Otherwise [start, end]
+  // itself. Stops at the first part that answers 0 and answers 0 then.
+  template <class Edit>
+  int ForFoldedRanges(double start, double end, Edit edit) const {
+    const unsigned int n = keys.size;
+    if ((this->extrapolation != 3 && this->extrapolation != 4) || n < 2) return edit(start, end);
+    const double first = keys[0].parameter, last = keys[n - 1].parameter;
+    double startCycle, endCycle;
+    const double foldedStart = CycleOffsetFold(start, startCycle, true);
+    const double foldedEnd = CycleOffsetFold(end, endCycle, false);
+    if (startCycle == endCycle) return edit(foldedStart, foldedEnd);
+    if (end - start <= last - first) return edit(first, foldedEnd) && edit(foldedStart, last);
+    return edit(first, last);
+  }
+
+  // Key reduction over [start, end] in either order, through ForFoldedRanges: refused on a
+  // read-only curve or with a bound or tolerance that is not a number; nothing to do below two
+  // keys.
+  template <class Reduce>
+  int ReduceOverFoldedRanges(double start, double end, double tolerance, Reduce reduce) {
+    if (this->readOnly || !std::isfinite(start) || !std::isfinite(end) || std::isnan(tolerance)) {
+      return 0;
+    }
+    if (keys.size < 2) return 1;
+    if (start > end) {
+      const double t = start;
+      start = end;
+      end = t;
+    }
+    ForFoldedRanges(start, end, [&reduce](double a, double b) {
+      reduce(a, b);
+      return 1;
+    });
+    return 1;
   }
 
   // Folds t and moves both bounds by the same displacement, then orders the bounds and clamps

@@ -16,19 +16,6 @@ double ZvStdFCurve::EvalLeft(double parameter, int clamped) const {
   return clamped ? m_impl->Clamp(v) : v;
 }
 
-unsigned int ZvStdFCurve::GetKeys(ZvDoubleArray& parameters, ZvDoubleArray& leftValues,
-                                  ZvDoubleArray& rightValues, int clamped) const {
-  ZvFCurveLockGuard guard(*this);
-  const ZvStdFCurveImpl& s = *m_impl;
-  for (unsigned int i = 0; i < s.keys.size; ++i) {
-    const double l = s.EffectiveLeftValue(i), r = s.keys[i].rightValue;
-    parameters.Add(s.keys[i].parameter);
-    leftValues.Add(clamped ? s.Clamp(l) : l);
-    rightValues.Add(clamped ? s.Clamp(r) : r);
-  }
-  return s.keys.size;
-}
-
 double ZvStdFCurve::GetValueUpperBound(int clamped) const {
   ZvFCurveLockGuard guard(*this);
   const double v = m_impl->GetValueUpperBound();

@@ -4,20 +4,13 @@
 #include <zv/spline.h>
 #include <zv/std_fcurve.h>
 
+#include "fcurve/cfc_linear_fit.h"
 #include "fcurve/fcurve_lock.h"
 #include "fcurve/std_fcurve_impl.h"
 
 #include <cmath>
 
 namespace {
-
-bool Ascending(const ZvPoint2dArray& p) {
-  for (unsigned int i = 0; i < p.size; ++i) {
-    if (!std::isfinite(p[i].x) || !std::isfinite(p[i].y)) return false;
-    if (i > 0 && !(p[i].x > p[i - 1].x)) return false;
-  }
-  return true;
-}
 
 // A key through (x, y) with handles at the given slopes, reaching `left` and `right` in X.
 void AddKey(ZvStdFCurveImpl& s, double x, double y, double leftReach, double leftSlope,
@@ -95,26 +88,10 @@ void CubicC2(ZvStdFCurveImpl& s, const ZvPoint2dArray& p) {
   AddCubicKeys(s, p, slopes.data);
 }
 
-// Greedy lines: a line runs from an anchor through the next point while the points after it
-// stay within the tolerance vertically; the first one that does not closes the segment at the
-// point before it.
 void LinearFit(ZvStdFCurveImpl& s, const ZvPoint2dArray& p, double tolerance) {
-  const unsigned int n = p.size;
-  auto addPoint = [&s](const ZvPoint2<double>& q) {
+  CFCGreedyLinearFit(p, tolerance, [&s](const ZvPoint2<double>& q) {
     AddKey(s, q.x, q.y, 0.0, 0.0, 0.0, 0.0, ZvBaseFCurve::LinearSegment);
-  };
-  addPoint(p[0]);
-  unsigned int anchor = 0;
-  for (unsigned int j = anchor + 2; j < n; ++j) {
-    const ZvPoint2<double>& a = p[anchor];
-    const ZvPoint2<double>& b = p[anchor + 1];
-    const double y = a.y + (p[j].x - a.x) * (b.y - a.y) / (b.x - a.x);
-    if (std::fabs(y - p[j].y) > tolerance) {
-      addPoint(p[j - 1]);
-      anchor = j - 1;
-    }
-  }
-  if (n > 1) addPoint(p[n - 1]);
+  });
 }
 
 // One cubic segment from the first point to the last, handles at the thirds of the chord.
@@ -163,7 +140,7 @@ ZvStdFCurve::ZvStdFCurve(const ZvPoint2dArray& points, DPMethod method, double t
     : ZvStdFCurve(points.size ? points[0].y : 0.0, firstSegmentKind) {
   ZvStdFCurveImpl& s = *m_impl;
   const unsigned int n = points.size;
-  if (n == 0 || !Ascending(points) || std::isnan(tolerance)) return;
+  if (n == 0 || !CFCPointsAscend(points) || std::isnan(tolerance)) return;
   if (n == 1) {
     AddKey(s, points[0].x, points[0].y, 0.0, 0.0, 0.0, 0.0,
            method == DPLinearFitC0 ? LinearSegment : CubicSegment);
@@ -230,31 +207,6 @@ void ReduceRange(ZvStdFCurve& curve, ZvStdFCurveImpl& s, double start, double en
 unsigned int ZvStdFCurve::ReduceNumKeys(double start, double end, double tolerance) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
-  if (s.readOnly || !std::isfinite(start) || !std::isfinite(end) || std::isnan(tolerance)) {
-    return 0;
-  }
-  if (start > end) {
-    const double t = start;
-    start = end;
-    end = t;
-  }
-  const unsigned int n = s.keys.size;
-  if (n < 2) return 1;
-  const double first = s.keys[0].parameter, last = s.keys[n - 1].parameter;
-  if (s.extrapolation == CycleExtrapolation || s.extrapolation == CycleWithOffsetExtrapolation) {
-    double startCycle, endCycle;
-    const double foldedStart = s.CycleOffsetFold(start, startCycle, true);
-    const double foldedEnd = s.CycleOffsetFold(end, endCycle, false);
-    if (startCycle == endCycle) {
-      ReduceRange(*this, s, foldedStart, foldedEnd, tolerance);
-    } else if (end - start <= last - first) {
-      ReduceRange(*this, s, first, foldedEnd, tolerance);
-      ReduceRange(*this, s, foldedStart, last, tolerance);
-    } else {
-      ReduceRange(*this, s, first, last, tolerance);
-    }
-    return 1;
-  }
-  ReduceRange(*this, s, start, end, tolerance);
-  return 1;
+  return s.ReduceOverFoldedRanges(
+      start, end, tolerance, [&](double a, double b) { ReduceRange(*this, s, a, b, tolerance); });
 }

@@ -9,6 +9,7 @@
 #include <zv/std_fcurve.h>
 
 #include "fcurve/cfc_base_impl.h"
+#include "fcurve/cfc_extrapolation.h"
 #include "fcurve/cubic_segment.h"
 
 #include <cstdint>
@@ -32,25 +33,36 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
   // The four control points with which a cubic segment from key i is evaluated.
   void GetSegmentControls(unsigned int i, ZvPoint2<double>* p) const;
 
-  // ---- Point evaluation (std_fcurve_eval.cpp) ----
+  // ---- Point evaluation (std_fcurve_eval.cpp, the scheme in cfc_extrapolation.h) ----
 
-  // The segment that starts at key i, for t strictly inside it.
-  double EvalJustAfterIndex(double t, unsigned int i) const;
+  // The segment that starts at key i, for t strictly inside it; with `keep` a cubic segment
+  // built anew replaces the one remembered.
+  double EvalSegment(double t, unsigned int i, bool keep) const;
+  double EvalJustAfterIndex(double t, unsigned int i) const { return EvalSegment(t, i, true); }
   double GetValueBeforeFirstKeyWhenLinear(double t) const;
   double GetValueAfterLastKeyWhenLinear(double t) const;
+  double KeyRightValue(unsigned int i) const { return keys[i].rightValue; }
+  unsigned int SegmentKind(unsigned int i) const { return keys[i].segmentKind; }
+  static constexpr bool kHasCubicSegments = true;
+  double KeyArrivingValue(unsigned int i) const { return EffectiveLeftValue(i); }
+  // The offset cycle runs from the first right value, its left limits from the first left one.
+  double CycleOffset(bool left) const {
+    const unsigned int n = keys.size;
+    return keys[n - 1].rightValue - (left ? keys[0].leftValue : keys[0].rightValue);
+  }
   // Plain evaluation, constant beyond the keys: right-continuous and left limit.
-  double EvalRight(double t) const;
-  double EvalLeft(double t) const;
-  double EvalRightUsingExtrapolationMethod(double t) const;
-  double EvalLeftUsingExtrapolationMethod(double t) const;
+  double EvalRight(double t) const { return CFCEvalPlain(*this, t, false); }
+  double EvalLeft(double t) const { return CFCEvalPlain(*this, t, true); }
+  double EvalRightUsingExtrapolationMethod(double t) const {
+    return CFCEvalRightUsingExtrapolationMethod(*this, t);
+  }
+  double EvalLeftUsingExtrapolationMethod(double t) const {
+    return CFCEvalLeftUsingExtrapolationMethod(*this, t);
+  }
   // Snap t to a key within the snap tolerance, then the right-continuous value (or with `left`
   // the left limit) with extrapolation: the whole of the curve's Eval and EvalLeft but the lock
   // and the clamp.
-  double EvalSnapped(double t, bool left) const;
-  // Brings t into the keyed range for the cycle methods and counts the periods (two keys or
-  // more). The right version sends a whole number of periods to the last key, the left version
-  // to the first.
-  double CycleOffsetFold(double t, double& cycles, bool left) const;
+  double EvalSnapped(double t, bool left) const { return CFCEvalSnapped(*this, t, left); }
   double Clamp(double v) const {
     if (v <= minClamp) return minClamp;
     if (v >= maxClamp) return maxClamp;
@@ -140,14 +152,7 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
 
  private:
   double EvaluatedRightX(unsigned int i) const;
-  // EvalJustAfterIndex; with `keep` a cubic segment built anew replaces the one kept.
-  double EvalSegment(double t, unsigned int i, bool keep) const;
   double EvalCubicSegment(double t, unsigned int i, bool keep) const;
-  // Away from every key, one search answers for the snap and for the evaluation, and the side
-  // of the limit does not matter. 1 with the value in v; 0 when t needs no snap but the method
-  // must fold it; -1, with the hint as it was, when t lies near a key and must be snapped
-  // first.
-  int EvalClearOfKeys(double t, double& v) const;
 
   // The last cubic segment evaluated whose handles are the stored ones, with copies of the
   // key fields it was built from. It is used only while those fields are the same to the bit,

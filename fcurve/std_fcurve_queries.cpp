@@ -1,6 +1,7 @@
 // ZvStdFCurve: questions about keys, and the flags, clamps and methods of the curve.
 #include <zv/std_fcurve.h>
 
+#include "fcurve/cfc_curve_queries.h"
 #include "fcurve/fcurve_lock.h"
 #include "fcurve/std_fcurve_impl.h"
 
@@ -58,106 +59,6 @@ unsigned int ZvStdFCurve::GetKeyInfoFromParameter(double parameter, KeyInfo* inf
   return GetKeyInfoFromIndex(i, info);
 }
 
-unsigned int ZvStdFCurve::GetKeyParameter(unsigned int index, double& parameter) const {
-  ZvFCurveLockGuard guard(*this);
-  if (index >= m_impl->keys.size) return 0;
-  parameter = m_impl->keys[index].parameter;
-  return 1;
-}
-
-unsigned int ZvStdFCurve::GetKeyIndex(double parameter, unsigned int& index) const {
-  ZvFCurveLockGuard guard(*this);
-  return m_impl->GetClosestKeyIndexInCenteredInterval(parameter, 0.0, index);
-}
-
-unsigned int ZvStdFCurve::GetNumKeys() const {
-  ZvFCurveLockGuard guard(*this);
-  return m_impl->keys.size;
-}
-
-unsigned int ZvStdFCurve::GetKeyParameters(double start, double end, ZvDoubleArray& parameters,
-                                           int excludeStart, int excludeEnd) const {
-  ZvFCurveLockGuard guard(*this);
-  if (zvIsSameParameter(start, end) && (excludeStart != 0) != (excludeEnd != 0)) {
-    excludeStart = excludeEnd = 0;
-  }
-  unsigned int first, last;
-  if (!m_impl->GetKeyIndicesInInterval(start, end, first, last, excludeStart, excludeEnd)) {
-    return 0;
-  }
-  for (unsigned int i = first; i <= last; ++i)
-    parameters.Add(m_impl->keys[i].parameter);
-  return last - first + 1;
-}
-
-unsigned int ZvStdFCurve::IsKeyParameter(double parameter, double tolerance) const {
-  ZvFCurveLockGuard guard(*this);
-  unsigned int i;
-  return m_impl->GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i);
-}
-
-unsigned int ZvStdFCurve::GetAllKeyParameters(ZvDoubleArray& parameters) const {
-  ZvFCurveLockGuard guard(*this);
-  for (unsigned int i = 0; i < m_impl->keys.size; ++i)
-    parameters.Add(m_impl->keys[i].parameter);
-  return m_impl->keys.size;
-}
-
-unsigned int ZvStdFCurve::GetNextKeyParameter(double parameter, double& next, int inclusive) const {
-  ZvFCurveLockGuard guard(*this);
-  const ZvStdFCurveImpl& s = *m_impl;
-  if (s.keys.size == 0) return 0;
-  int found;
-  unsigned int at = s.LocateParameter(parameter, found);
-  if (found && inclusive) --at;
-  if (at >= s.keys.size) return 0;
-  next = s.keys[at].parameter;
-  return 1;
-}
-
-unsigned int ZvStdFCurve::GetPrevKeyParameter(double parameter, double& prev, int inclusive) const {
-  ZvFCurveLockGuard guard(*this);
-  const ZvStdFCurveImpl& s = *m_impl;
-  if (s.keys.size == 0) return 0;
-  int found;
-  unsigned int at = s.LocateParameter(parameter, found);
-  if (found && !inclusive) --at;
-  if (at == 0) return 0;
-  prev = s.keys[at - 1].parameter;
-  return 1;
-}
-
-unsigned int ZvStdFCurve::GetNearestKeyParameter(double parameter, double& nearest) const {
-  ZvFCurveLockGuard guard(*this);
-  const ZvStdFCurveImpl& s = *m_impl;
-  const unsigned int n = s.keys.size;
-  if (n == 0) return 0;
-  int found;
-  const unsigned int at = s.LocateParameter(parameter, found);
-  unsigned int i;
-  if (found) {
-    i = at - 1;
-  } else if (at == 0) {
-    i = 0;
-  } else if (at >= n) {
-    i = n - 1;
-  } else {
-    // Of two equally near keys, the later.
-    i = s.keys[at].parameter - parameter <= parameter - s.keys[at - 1].parameter ? at : at - 1;
-  }
-  nearest = s.keys[i].parameter;
-  return 1;
-}
-
-unsigned int ZvStdFCurve::GetNearestKeyParameterInCenteredInterval(double& parameter,
-                                                                   double tolerance) const {
-  ZvFCurveLockGuard guard(*this);
-  unsigned int i;
-  if (!m_impl->GetClosestKeyIndexInCenteredInterval(parameter, tolerance, i)) return 0;
-  parameter = m_impl->keys[i].parameter;
-  return 1;
-}
-
 unsigned int ZvStdFCurve::SetClampingValues(double minValue, double maxValue) {
   ZvFCurveLockGuard guard(*this);
   if (m_impl->readOnly || !(minValue <= maxValue)) return 0;
@@ -171,53 +72,6 @@ unsigned int ZvStdFCurve::GetClampingValues(double& minValue, double& maxValue) 
   minValue = m_impl->minClamp;
   maxValue = m_impl->maxClamp;
   return 1;
-}
-
-unsigned int ZvStdFCurve::GetSmallestKeyParameter(double& parameter) const {
-  ZvFCurveLockGuard guard(*this);
-  if (m_impl->keys.size == 0) return 0;
-  parameter = m_impl->keys[0].parameter;
-  return 1;
-}
-
-unsigned int ZvStdFCurve::IsSmallestKeyParameter(double parameter) const {
-  ZvFCurveLockGuard guard(*this);
-  return m_impl->keys.size && zvIsSameParameter(parameter, m_impl->keys[0].parameter);
-}
-
-unsigned int ZvStdFCurve::GetLargestKeyParameter(double& parameter) const {
-  ZvFCurveLockGuard guard(*this);
-  if (m_impl->keys.size == 0) return 0;
-  parameter = m_impl->keys[m_impl->keys.size - 1].parameter;
-  return 1;
-}
-
-unsigned int ZvStdFCurve::IsLargestKeyParameter(double parameter) const {
-  ZvFCurveLockGuard guard(*this);
-  const unsigned int n = m_impl->keys.size;
-  return n && zvIsSameParameter(parameter, m_impl->keys[n - 1].parameter);
-}
-
-double ZvStdFCurve::GetMinusInfinityVal() const {
-  ZvFCurveLockGuard guard(*this);
-  return m_impl->keys.size ? m_impl->keys[0].leftValue : m_impl->valueWhenNoKeys;
-}
-
-double ZvStdFCurve::GetPlusInfinityVal() const {
-  ZvFCurveLockGuard guard(*this);
-  const unsigned int n = m_impl->keys.size;
-  return n ? m_impl->keys[n - 1].rightValue : m_impl->valueWhenNoKeys;
-}
-
-unsigned int ZvStdFCurve::SetReadOnlyConstraint(int on) {
-  ZvFCurveLockGuard guard(*this);
-  m_impl->readOnly = on ? 1 : 0;
-  return 1;
-}
-
-unsigned int ZvStdFCurve::IsReadOnly() const {
-  ZvFCurveLockGuard guard(*this);
-  return m_impl->readOnly;
 }
 
 unsigned int ZvStdFCurve::SetConstraint(double& parameter, KeyConstraint constraints, int on,
@@ -276,17 +130,6 @@ unsigned int ZvStdFCurve::SetExtrapolationMethod(ExtrapolationMethod method) {
   return 1;
 }
 
-ZvBaseFCurve::ExtrapolationMethod ZvStdFCurve::GetExtrapolationMethod() const {
-  ZvFCurveLockGuard guard(*this);
-  return static_cast<ExtrapolationMethod>(m_impl->extrapolation);
-}
-
-double ZvStdFCurve::FoldParameter(double parameter) const {
-  ZvFCurveLockGuard guard(*this);
-  m_impl->FoldParameter(parameter);
-  return parameter;
-}
-
 // Not stopped by the read-only flag. Re-setting every handle lets the constraint take hold at
 // once.
 unsigned int ZvStdFCurve::SetDefaultBezierTangentConstraint(int on) {
@@ -301,20 +144,4 @@ unsigned int ZvStdFCurve::SetDefaultBezierTangentConstraint(int on) {
   return 1;
 }
 
-unsigned int ZvStdFCurve::IsDefautlBezierTangentConstraintOn() const {
-  ZvFCurveLockGuard guard(*this);
-  return m_impl->defaultBezierTangentConstraint;
-}
-
-unsigned int ZvStdFCurve::SetAsTimeFCurve(int on) {
-  ZvFCurveLockGuard guard(*this);
-  const unsigned int flag = on ? 1 : 0;
-  if (m_impl->readOnly || m_impl->timeCurve == flag) return 0;
-  m_impl->timeCurve = flag;
-  return 1;
-}
-
-unsigned int ZvStdFCurve::IsTimeFCurve() const {
-  ZvFCurveLockGuard guard(*this);
-  return m_impl->timeCurve;
-}
+ZV_CFC_KEY_QUERY_SLOTS(ZvStdFCurve)

@@ -3,6 +3,7 @@
 #include <zv/std_fcurve.h>
 
 #include "fcurve/fcurve_lock.h"
+#include "fcurve/key_user_data_transit.h"
 #include "fcurve/std_fcurve_impl.h"
 
 #include <cfloat>
@@ -98,24 +99,9 @@ unsigned int ZvStdFCurve::ResampleSequence(double start, double end, double step
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
   if (s.readOnly || !std::isfinite(start) || !std::isfinite(end)) return 0;
-  using Engine = ZvStdFCurveImpl::Engine;
-  const unsigned int n = s.keys.size;
-  if ((s.extrapolation != CycleExtrapolation && s.extrapolation != CycleWithOffsetExtrapolation) ||
-      n < 2) {
-    return Engine::ResampleKeys(s, start, end, step, keepExistingKeys, *this);
-  }
-  const double first = s.keys[0].parameter, last = s.keys[n - 1].parameter;
-  double startCycle, endCycle;
-  const double foldedStart = s.CycleOffsetFold(start, startCycle, true);
-  const double foldedEnd = s.CycleOffsetFold(end, endCycle, false);
-  if (startCycle == endCycle) {
-    return Engine::ResampleKeys(s, foldedStart, foldedEnd, step, keepExistingKeys, *this);
-  }
-  if (end - start <= last - first) {
-    if (!Engine::ResampleKeys(s, first, foldedEnd, step, keepExistingKeys, *this)) return 0;
-    return Engine::ResampleKeys(s, foldedStart, last, step, keepExistingKeys, *this);
-  }
-  return Engine::ResampleKeys(s, first, last, step, keepExistingKeys, *this);
+  return s.ForFoldedRanges(start, end, [&](double a, double b) {
+    return ZvStdFCurveImpl::Engine::ResampleKeys(s, a, b, step, keepExistingKeys, *this);
+  });
 }
 
 unsigned int ZvStdFCurve::SmoothSequence(double start, double end, const double* kernel,
@@ -139,11 +125,7 @@ unsigned int ZvStdFCurve::MirrorParameters() {
   if (n == 0) return 1;
   const double sum = s.keys[0].parameter + s.keys[n - 1].parameter;
   // The user data sets travel with their keys, so they are taken out first.
-  ZvDynArray<CFCUserDataSet*> sets(n);
-  for (unsigned int i = 0; i < n; ++i) {
-    const CFCUserDataSet* set = GetUserDataSet(s.keys[i].parameter);
-    sets.Add(set ? new CFCUserDataSet(*set) : nullptr);
-  }
+  CFCKeyUserDataInTransit sets(*this, n, [&s](unsigned int i) { return s.keys[i].parameter; });
   ZvAltDynArray<CFCStdKey> mirrored(n);
   for (unsigned int j = 0; j < n; ++j) {
     const unsigned int i = n - 1 - j;
@@ -164,12 +146,7 @@ unsigned int ZvStdFCurve::MirrorParameters() {
   s.valueWhenNoKeys = s.keys[n - 1].rightValue;
   s.keys = mirrored;
   s.searchHint = 0;
-  RemoveAllKeyUserData();
-  for (unsigned int j = 0; j < n; ++j) {
-    CFCUserDataSet* set = sets[n - 1 - j];
-    if (set) SetUserDataSet(*set, s.keys[j].parameter);
-    delete set;
-  }
+  sets.GiveBackReversed([&s](unsigned int j) { return s.keys[j].parameter; });
   ReapplyHandleConstraint(s);
   return 1;
 }

@@ -64,13 +64,15 @@ int ZvOval2f::Stroke(const ZvGC& gc, ZvRaster<unsigned char>& raster) const {
   return Shared::OnOutline(*this, [&](const ZvPath2f& path) { return path.Stroke(gc, raster); });
 }
 
-// The soft fill of this shape comes with the soft fill of paths' feathered outlines, later.
-int ZvOval2f::SoftFill(const ZvGC&, ZvRaster<unsigned char>&, int (*)()) const {
-  return 0;
+int ZvOval2f::SoftFill(const ZvGC& gc, ZvRaster<unsigned char>& raster, int (*callback)()) const {
+  return Shared::OnOutline(
+      *this, [&](const ZvPath2f& path) { return path.SoftFill(gc, raster, callback); });
 }
-int ZvOval2f::SoftFill(const ZvGC&, ZvRaster<float>&, int (*)()) const {
-  return 0;
+int ZvOval2f::SoftFill(const ZvGC& gc, ZvRaster<float>& raster, int (*callback)()) const {
+  return Shared::OnOutline(
+      *this, [&](const ZvPath2f& path) { return path.SoftFill(gc, raster, callback); });
 }
-int ZvOval2f::SoftFill(const ZvGC&, ZvRaster<short>&, int (*)()) const {
-  return 0;
+int ZvOval2f::SoftFill(const ZvGC& gc, ZvRaster<short>& raster, int (*callback)()) const {
+  return Shared::OnOutline(
+      *this, [&](const ZvPath2f& path) { return path.SoftFill(gc, raster, callback); });
 }

@@ -9,10 +9,8 @@ bool IsWellFormedBlock(const unsigned char* codes, unsigned int count) {
   while (i < count) {
     if (codes[i] != kStart) return false;
     ++i;
-    bool closed = false;
     while (i < count && codes[i] != kStart) {
-      // A closed end is the subpath's last point.
-      if (closed || codes[i] > kCodeMask) return false;
+      if (codes[i] > kCodeMask) return false;
       const unsigned int d = Decode(codes[i]).degree;
       if (d == 0 || count - i < d) return false;
       const unsigned int base = Base(d);
@@ -20,7 +18,6 @@ bool IsWellFormedBlock(const unsigned char* codes, unsigned int count) {
         if (codes[i + k] != base + k) return false;
       const unsigned int end = codes[i + d - 1];
       if (end != base + d - 1 && end != base + d) return false;
-      closed = end == base + d;
       i += d;
     }
   }

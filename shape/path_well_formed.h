@@ -7,9 +7,10 @@
 namespace zv_path {
 
 // True when the codes parse: index 0 (if any) starts a subpath; after every node comes either
-// a new start or the first code of a segment, whose degree then fixes the codes of its points;
-// a closed end code ends its subpath; and no code carries the bits above the segment code
-// (locks are not persisted, and nothing sets bit 6).
+// a new start or the first code of a segment, whose degree then fixes the codes of its points
+// (its end node open or closed: drawing on after a close leaves a closed end inside a subpath);
+// and no code carries the bits above the segment code (locks are not persisted, and nothing
+// sets bit 6).
 bool IsWellFormedBlock(const unsigned char* codes, unsigned int count);
 
 }  // namespace zv_path

@@ -9,8 +9,8 @@
 // never evaluates the curve. As with the cubic free functions of <zv/bezier_tool.h>, the point
 // count is a pure function of the control points and the tolerance, and the last point added
 // is the last control point itself. For a cubic the counts agree with ZvBezierTool_FlattenCubic2f.
-// Like the cubic free functions, a flatten never grows its array beyond 2^24 points: when one
-// of its pieces would, it throws std::bad_alloc (the pieces before it stay added).
+// Like the cubic free functions, a flatten that would grow its array beyond 2^24 points throws
+// std::bad_alloc before adding anything.
 //
 // Fitting. OpenFit and ClosedFit turn a polyline (pen input, samples) into Bezier segments
 // appended to a path. The polyline is cut at sharp corners; each stretch between corners is
@@ -181,6 +181,8 @@ class ZV_API ZvBezierTool {
   void ContextInitTwo();
   void OFDInnerLoop();
   void PMSOFD(const ZvPoint2<double>* p, unsigned int depth);
+  // The points PMSOFD would add for the same piece and depth, without adding them.
+  unsigned long long CountPoints(const ZvPoint2<double>* p, unsigned int depth);
   void Emit(const ZvPoint2<double>& q);
   // Row k of the difference triangle starts here; row k holds degree + 1 - k entries.
   ZvPoint2<double>* Row(unsigned int k);

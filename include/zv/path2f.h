@@ -114,6 +114,10 @@ class ZV_API ZvPath2f : public ZvShape2f {
   int SoftFill(const ZvGC& gc, ZvRaster<unsigned char>& raster, int (*callback)()) const override;
   int SoftFill(const ZvGC& gc, ZvRaster<float>& raster, int (*callback)()) const override;
   int SoftFill(const ZvGC& gc, ZvRaster<short>& raster, int (*callback)()) const override;
+  // The path and the outline's round joins and caps are flattened whole before the fill clips
+  // them, so the cost of a stroke grows with the square root of the path's size and of
+  // gc.lineWidth over the tolerance: keep both within what the raster can show (near the float
+  // range a cubic or a join costs about a million points).
   int Stroke(const ZvGC& gc, ZvRaster<unsigned char>& raster) const override;
   // Block layout (n points, 9n + 16 bytes):
   //   0  u32  body length 9n + 12    4  u16  kind 1    6  u16  0    8  u32  n

@@ -72,7 +72,7 @@ class ZV_API ZvRect2f : public ZvShape2f {
   ZvShape2f& ShearX(double a, double b) override;
   ZvShape2f& ShearY(double a, double b) override;
   ZvShape2f& Transform(const ZvTransfo4& transform) override;
-  // Flatten, Sample, AAFill and Stroke work on the outline path (SetupPathRep).
+  // Flatten, Sample, AAFill, SoftFill and Stroke work on the outline path (SetupPathRep).
   unsigned int Flatten(const ZvGC& gc, ZvPoint2fArray& points,
                        ZvPointTagArray& tags) const override;
   unsigned int Sample(const ZvGC& gc, ZvPoint2fArray& points, ZvPointTagArray& tags) const override;

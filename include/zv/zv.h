@@ -21,10 +21,12 @@
 #include <zv/quat.h>
 #include <zv/quat_fcurve.h>
 #include <zv/raster.h>
+#include <zv/raw_fcurve.h>
 #include <zv/rect2f.h>
 #include <zv/shape.h>
 #include <zv/spline.h>
 #include <zv/std_fcurve.h>
+#include <zv/step_fcurve.h>
 #include <zv/trace.h>
 #include <zv/transfo4.h>
 #include <zv/vectorizer.h>

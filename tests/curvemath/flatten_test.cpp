@@ -1,6 +1,7 @@
 // Point counts, order and positions of cubic and gamma flattening.
 #include <gtest/gtest.h>
 
+#include <zv/bezier_fit.h>
 #include <zv/bezier_tool.h>
 
 #include <new>
@@ -249,6 +250,11 @@ TEST(FlattenCubic, BadInputEndsWithABoundedPolylineOrNothing) {
   const P3 huge3[4] = {{0, 0, 0}, {3e37, 3e38, 1}, {-3e38, 1e37, 2}, {3e38, -3e38, 3}};
   ZvPoint3dArray spatial(1);
   EXPECT_THROW(ZvBezierTool_FlattenCubic3d(huge3, 0.5, &spatial, 0), std::bad_alloc);
+  ZvBezierTool tool;
+  const ZvPoint2<float> quintic[6] = {{0, 0},      {3e38f, 0},  {0, 3e38f},
+                                      {-3e38f, 0}, {0, -3e38f}, {1, 1}};
+  EXPECT_THROW(tool.Flatten(quintic, 0, 5, 1e-30, &floats, 1), std::bad_alloc);
+  EXPECT_EQ(floats.size, 1u);
   // A corrupt gamma piece with an almost empty x range walks at most one unit of u.
   const P2 g[4] = {{0, 1}, {1e-300, -0.5}, {1e-290, 0.5}, {1e-305, 0}};
   EXPECT_LE(ZvBezierTool_FlattenGamma(g, 0.1, &out, 0), 154u);

@@ -258,14 +258,14 @@ void ExpectRefusedOrWellFormed(const Bytes& block) {
 
 TEST(Path2fBuffer, BoundedReaderHandsOnlyWellFormedPaths) {
   // Codes that break the path's rules are refused: an illegal code, a segment cut short by a
-  // new start, a closed end before the end of its subpath, a missing start, a lock bit.
+  // new start, a closed end inside a segment, a missing start, a lock bit.
   const ZvPath2f loop = LockedLoop();  // codes 1 8 9 10 8 9 11
   const Bytes good = Block(loop);
   const std::size_t codesAt = 12 + 8 * loop.NumPoints();
   const struct {
     std::size_t at;
     unsigned char code;
-  } broken[] = {{2, 2}, {3, 1}, {3, 11}, {0, 3}, {1, 9}, {6, 10 | 0x80}, {5, 0x49}};
+  } broken[] = {{2, 2}, {3, 1}, {2, 11}, {0, 3}, {1, 9}, {6, 10 | 0x80}, {5, 0x49}};
   unsigned int consumed = 0;
   for (const auto& b : broken) {
     Bytes block = good;

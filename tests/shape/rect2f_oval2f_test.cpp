@@ -296,12 +296,26 @@ TEST(FrameShapes, FillsThroughTheShape) {
         EXPECT_TRUE(x >= 2 && x < 8 && y >= 2 && y < 6) << x << "," << y;
       }
   EXPECT_EQ(painted, 24);
-  // The antialiased fill goes through the outline path; the soft fill is not there yet.
+  // The antialiased and soft fills go through the outline path, and give what the path does.
   ZvRaster<unsigned char> aa(10, 8, 0);
   EXPECT_EQ(r.AAFill(gc, aa, nullptr, nullptr), 1);
   EXPECT_EQ(aa.GetVal(4, 4), 255);
   EXPECT_EQ(aa.GetVal(0, 0), 0);
-  EXPECT_EQ(ZvOval2f(P(5, 4), 6, 6).SoftFill(ZvGC(), aa, nullptr), 0);
+  ZvGC soft;
+  soft.featherInner = 2;
+  const ZvOval2f oval(P(16, 12), 9, 7);
+  ZvPath2f outline;
+  oval.SetupPathRep(outline);
+  ZvRaster<float> viaShape(32, 24, 0.5f), viaPath(32, 24, 0.5f);
+  EXPECT_EQ(oval.SoftFill(soft, viaShape, nullptr), 1);
+  EXPECT_EQ(outline.SoftFill(soft, viaPath, nullptr), 1);
+  EXPECT_EQ(viaShape.GetVal(16, 12), 1.0f);
+  for (int i = 0; i < viaShape.GetSize(); ++i)
+    ASSERT_EQ(viaShape.GetVal(i), viaPath.GetVal(i)) << i;
+  ZvRaster<short> rectSoft(10, 8, 0);
+  EXPECT_EQ(r.SoftFill(soft, rectSoft, nullptr), 1);
+  EXPECT_GT(rectSoft.GetVal(2, 2), 0);
+  EXPECT_EQ(rectSoft.GetVal(0, 0), 0);
 }
 
 }  // namespace
