@@ -2,7 +2,9 @@
 // that kind from a trusted body or from a bounded whole block.
 #include <zv/fcurve.h>
 #include <zv/quat_fcurve.h>
+#include <zv/raw_fcurve.h>
 #include <zv/std_fcurve.h>
+#include <zv/step_fcurve.h>
 
 #include "fcurve/buffer_bytes.h"
 
@@ -41,12 +43,17 @@ unsigned int ReadBounded(ZvBaseFCurve& curve, const void* buffer, std::size_t si
   return static_cast<Curve&>(curve).ReadFromBuffer(buffer, size);
 }
 
-// The blank curves of the kinds the library builds; a kind missing here is refused like an
-// unknown one.
+// The blank curve of each kind.
 const KindReader kReaders[] = {
+    {ZvBaseFCurve::BooleanKind, [] { return static_cast<ZvBaseFCurve*>(new ZvBooleanFCurve(1.0)); },
+     &ReadBounded<ZvBooleanFCurve>},
+    {ZvBaseFCurve::IntegerKind, [] { return static_cast<ZvBaseFCurve*>(new ZvIntegerFCurve(0.0)); },
+     &ReadBounded<ZvIntegerFCurve>},
     {ZvBaseFCurve::StdKind,
      [] { return static_cast<ZvBaseFCurve*>(new ZvStdFCurve(0.0, ZvBaseFCurve::CubicSegment)); },
      &ReadBounded<ZvStdFCurve>},
+    {ZvBaseFCurve::RawKind, [] { return static_cast<ZvBaseFCurve*>(new ZvRawFCurve(0.0)); },
+     &ReadBounded<ZvRawFCurve>},
     {ZvBaseFCurve::QuatKind, [] { return static_cast<ZvBaseFCurve*>(new ZvQuatFCurve(0)); },
      &ReadBounded<ZvQuatFCurve>},
 };

@@ -4,7 +4,9 @@
 #define ZV_TESTS_FCURVE_CURVE_BLOCKS_H
 
 #include <zv/quat_fcurve.h>
+#include <zv/raw_fcurve.h>
 #include <zv/std_fcurve.h>
+#include <zv/step_fcurve.h>
 
 #include <gtest/gtest.h>
 
@@ -157,6 +159,27 @@ inline ZvStdFCurve RichStdCurve() {
   return curve;
 }
 
+// Step curves of a few keys with locks and user data.
+inline ZvBooleanFCurve SteppedBoolean() {
+  ZvBooleanFCurve curve(1.0);
+  curve.CreateKey(0.5, 0.0);
+  curve.CreateKey(1.5, 1.0);
+  double t = 1.5;
+  curve.SetConstraint(t, ZvBaseFCurve::ValueLock, 1, 0.0);
+  curve.SetFCurveUserData(MakeUID(6), Bytes("on"), 2);
+  return curve;
+}
+
+inline ZvIntegerFCurve SteppedInteger() {
+  ZvIntegerFCurve curve(3.0);
+  for (int i = 0; i < 4; ++i)
+    curve.CreateKey(i * 0.75, i * i - 5.0);
+  double t = 0.75;
+  curve.SetConstraint(t, ZvBaseFCurve::WholeKeyLock, 1, 0.0);
+  curve.SetKeyUserData(t, MakeUID(7), Bytes("step"), 4, 0.0);
+  return curve;
+}
+
 // A rotation block of the older form, "0010", which has no component: two keys out of time
 // order, spins with the top bits set (masked off on reading), parameter locks.
 inline ByteVec QuatBlockWithoutComponent() {
@@ -190,6 +213,9 @@ inline std::vector<std::pair<std::string, ByteVec>> SeedBlocks() {
       {"std_empty", BlockOf(ZvStdFCurve())},
       {"std_rich", BlockOf(RichStdCurve())},
       {"quat", BlockOf(*RotationView())},
+      {"boolean", BlockOf(SteppedBoolean())},
+      {"integer", BlockOf(SteppedInteger())},
+      {"raw", BlockOf(ZvRawFCurve(0.0, 1.0, 2.0, 3.0))},
       {"quat_v0010", QuatBlockWithoutComponent()},
   };
   for (unsigned int stamp : {1u, 256u, 257u, 259u, 261u, 262u})
