@@ -17,26 +17,60 @@
 #include <cstdint>
 #include <cstring>
 
+// The `Count`-byte little-endian number at p, and its store. On a little-endian host that is
+// one unaligned copy, which decoding a run of records from one local pointer needs to be fast;
+// elsewhere the bytes are assembled one by one.
+template <int Count>
+inline std::uint64_t zvLoadLE(const unsigned char* p) {
+#if defined(__BYTE_ORDER__) && __BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__
+  std::uint64_t v = 0;
+  std::memcpy(&v, p, Count);
+#else
+  std::uint64_t v = 0;
+  for (int i = 0; i < Count; ++i)
+    v |= static_cast<std::uint64_t>(p[i]) << (8 * i);
+#endif
+  return v;
+}
+
+template <int Count>
+inline unsigned char* zvStoreLE(unsigned char* p, std::uint64_t v) {
+#if defined(__BYTE_ORDER__) && __BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__
+  std::memcpy(p, &v, Count);
+#else
+  for (int i = 0; i < Count; ++i)
+    p[i] = static_cast<unsigned char>(v >> (8 * i));
+#endif
+  return p + Count;
+}
+
 class ZvByteWriter {
  public:
   explicit ZvByteWriter(void* block) : start_(static_cast<unsigned char*>(block)), at_(start_) {}
 
+  // Each write goes through a local pointer: stores through the block's unsigned char pointer
+  // could alias the member, which would keep the compiler from merging a field's byte stores
+  // into one.
   void U8(std::uint8_t v) { *at_++ = v; }
-  void U16(std::uint16_t v) {
-    at_[0] = static_cast<unsigned char>(v);
-    at_[1] = static_cast<unsigned char>(v >> 8);
-    at_ += 2;
-  }
-  void U32(std::uint32_t v) {
-    for (int i = 0; i < 4; ++i)
-      at_[i] = static_cast<unsigned char>(v >> (8 * i));
-    at_ += 4;
-  }
+  void U16(std::uint16_t v) { at_ = zvStoreLE<2>(at_, v); }
+  void U32(std::uint32_t v) { at_ = zvStoreLE<4>(at_, v); }
+  void U64(std::uint64_t v) { at_ = zvStoreLE<8>(at_, v); }
   // The bit pattern of the float stored at `f`.
   void F32(const float* f) {
     std::uint32_t bits;
     std::memcpy(&bits, f, 4);
     U32(bits);
+  }
+  void Bytes(const void* data, std::size_t count) {
+    if (count) std::memcpy(at_, data, count);
+    at_ += count;
+  }
+  // The next `count` bytes, for a nested block that its own writer fills; the writer moves past
+  // them.
+  unsigned char* Run(std::size_t count) {
+    unsigned char* p = at_;
+    at_ += count;
+    return p;
   }
   std::size_t Written() const { return static_cast<std::size_t>(at_ - start_); }
 
@@ -63,23 +97,22 @@ class ZvByteReader {
 
   // Reads without asking: the caller asked Has() for the run first.
   std::uint8_t U8() { return *Take(1); }
-  std::uint16_t U16() {
-    const unsigned char* p = Take(2);
-    return static_cast<std::uint16_t>(p[0] | (p[1] << 8));
-  }
-  std::uint32_t U32() {
-    const unsigned char* p = Take(4);
-    std::uint32_t v = 0;
-    for (int i = 0; i < 4; ++i)
-      v |= static_cast<std::uint32_t>(p[i]) << (8 * i);
-    return v;
-  }
+  std::uint16_t U16() { return static_cast<std::uint16_t>(zvLoadLE<2>(Take(2))); }
+  std::uint32_t U32() { return static_cast<std::uint32_t>(zvLoadLE<4>(Take(4))); }
+  std::uint64_t U64() { return zvLoadLE<8>(Take(8)); }
   // Stores the next 32-bit pattern into the float at `f`.
   void F32(float* f) {
     const std::uint32_t bits = U32();
     std::memcpy(f, &bits, 4);
   }
   void Skip(std::size_t count) { Take(count); }
+  // The next `count` bytes where they lie, without a copy.
+  const unsigned char* Bytes(std::size_t count) { return Take(count); }
+  // A reader of the next `count` bytes alone, bounded like this one; this one does not move.
+  // A nested block is read through it so that its contents cannot reach past its own length.
+  ZvByteReader Part(std::size_t count) const {
+    return bounded_ ? ZvByteReader(at_, count) : ZvByteReader(at_);
+  }
 
   std::size_t Consumed() const { return static_cast<std::size_t>(at_ - start_); }
 

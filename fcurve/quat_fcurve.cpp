@@ -185,14 +185,3 @@ unsigned int ZvQuatFCurve::EvalInverse(double, double& parameter, int) const {
 unsigned int ZvQuatFCurve::MirrorParameters() {
   return 0;
 }
-
-// The persistent block of this kind comes with curve persistence.
-unsigned int ZvQuatFCurve::GetBufferSize() const {
-  return 0;
-}
-unsigned int ZvQuatFCurve::WriteToBuffer(void*) const {
-  return 0;
-}
-unsigned int ZvQuatFCurve::ReadFromBufferBody(const void*) {
-  return 0;
-}

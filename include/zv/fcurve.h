@@ -23,7 +23,10 @@
 #include <zv/point.h>
 
 #include <atomic>
+#include <cstddef>
 
+class ZvByteReader;
+class ZvByteWriter;
 class ZvTransfo4;
 
 class ZV_API ZvBaseFCurve {
@@ -322,8 +325,16 @@ class ZV_API ZvBaseFCurve {
   // Locks the source and deep-copies its user data.
   ZvBaseFCurve(const ZvBaseFCurve& other);
 
+  // The user data block inside a curve's block, for the readers and writers of every kind.
+  void WriteUserData(ZvByteWriter& out) const;
+  // Reads the u32 length and, when it is not 0, the block's body within that length; moves past
+  // the length the block states. 0 when the block does not fit or is refused, else 4 + length.
+  unsigned int ReadUserDataBlock(ZvByteReader& in);
+
  private:
   CFCUserDataStore& GetOrCreateUserDataStore();
+  // The reader behind ReadUserDataFromBufferBody.
+  unsigned int ReadUserDataBody(ZvByteReader& in);
 
   mutable ZvCriticalSection m_lock;
   CFCUserDataStore* m_userData;
@@ -435,5 +446,32 @@ class ZV_API ZvBaseFCurve {
   unsigned int SetAsTimeFCurve(int on) override;                                                   \
   unsigned int IsTimeFCurve() const override;                                                      \
   unsigned int Set(const ZvBaseFCurve& curve) override;
+
+// ---- Persistent blocks ----
+//
+// A curve's block is a u32 body length, little-endian, followed by the body, which opens with a
+// u32 version stamp and, from stamp 256 on, the u32 kind (the standard curve's oldest blocks,
+// stamp 1, carry no kind). All numbers are little-endian, so a block is the same from 32-bit and
+// 64-bit builds; a double that is not finite is written and read as 0.0. GetBufferSize counts the
+// whole block, WriteToBuffer fills a caller's block of that size and returns the size, and
+// ReadFromBufferBody, given the body, returns the body bytes it consumed, or 0 with the curve
+// unchanged when a stamp, kind, identifier or tag is not what the kind expects. The body readers
+// trust the caller that the block is complete; the bounded readers check it.
+
+// The size of the length field in front of a body: 4.
+ZV_API unsigned int ZvBaseFCurve_GetBufferBodyLengthSize();
+// The kind a body holds: StdKind for a first word below 256, else the second word when it is a
+// known kind, else 0.
+ZV_API unsigned int ZvBaseFCurve_GetKindFromBufferBody(const void* body);
+// A new curve of the body's kind read from the trusted body: 1 with the curve in *out, which the
+// caller owns and deletes; 0 with *out null for an unknown kind, a refused body or any failure,
+// allocation included (nothing is thrown). A null argument answers 0 with *out untouched.
+ZV_API unsigned int ZvBaseFCurve_CreateFromBufferBody(const void* body, ZvBaseFCurve** out);
+// The bounded factory: reads the whole block of `size` bytes at `buffer`, length field included.
+// Null with `consumed` 0 when the stored length exceeds `size`, when the contents would be read
+// past the body's end, and wherever ZvBaseFCurve_CreateFromBufferBody fails; otherwise the new
+// curve (the caller owns it) with `consumed` = 4 + the stored length.
+ZV_API ZvBaseFCurve* ZvBaseFCurve_CreateFromBuffer(const void* buffer, std::size_t size,
+                                                   unsigned int& consumed);
 
 #endif

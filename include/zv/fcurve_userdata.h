@@ -10,6 +10,9 @@
 #include <cstring>
 #include <map>
 
+class ZvBaseFCurve;
+class ZvByteReader;
+
 // 16-byte identifier of one user data item.
 struct _zvUID {
   unsigned int Data1;
@@ -107,6 +110,10 @@ class ZV_API CFCUserDataSet {
   unsigned int ReadFromBufferBody(const void* body);
 
  private:
+  friend class ZvBaseFCurve;
+  // The reader behind ReadFromBufferBody, also run bounded inside a curve's block.
+  unsigned int ReadBody(ZvByteReader& in);
+
   ItemMap m_items;
 };
 

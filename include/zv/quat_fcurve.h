@@ -24,6 +24,7 @@
 #include <zv/point.h>
 #include <zv/quat.h>
 
+#include <cstddef>
 #include <vector>
 
 class ZV_API ZvQuatCurve {
@@ -142,9 +143,12 @@ class ZV_API ZvQuatCurve {
 // CreateKey sets a whole key: on an existing key its tension, continuity, bias, spins and locks
 // return to 0 (set them on the rotation curve's ZvQuatKey).
 //
-// The persistent block of this kind comes with curve persistence; until then GetBufferSize,
-// WriteToBuffer and ReadFromBufferBody answer 0. SmoothSequence, ReduceNumKeys and
-// MirrorParameters also answer 0 and change nothing.
+// The persistent block ("1010") holds the component, the rotation curve's keys (time, angles in
+// radians, tension, continuity, bias, spins and locks), its value without keys, read-only flag
+// and extrapolation, and this view's user data: 52 + 48 n + U bytes. Reading replaces the
+// rotation curve's contents, as every view of it sees, and takes the component; the older block
+// ("0010") keeps the component. SmoothSequence, ReduceNumKeys and MirrorParameters answer 0 and
+// change nothing.
 //
 // Cut, Paste and Append move whole rotations (all three angles of the keys). Cut puts keys with
 // the evaluated rotation at both ends, gives `cutOut` (a rotation view, whose rotation is
@@ -273,6 +277,10 @@ class ZV_API ZvQuatFCurve : public ZvBaseFCurve {
   unsigned int GetBufferSize() const override;
   unsigned int WriteToBuffer(void* buffer) const override;
   unsigned int ReadFromBufferBody(const void* body) override;
+  // Reads a whole block of `size` bytes, length field included, refusing one whose length exceeds
+  // `size` or whose contents would be read past its body: the bytes taken (4 + the stored
+  // length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
+  unsigned int ReadFromBuffer(const void* buffer, std::size_t size);
   unsigned int ScaleAndShiftValues(double scale, double offset) override;
   // Writes the largest float to `parameter` and returns 0: a rotation angle has no inverse.
   unsigned int EvalInverse(double value, double& parameter, int clamped) const override;
@@ -287,6 +295,8 @@ class ZV_API ZvQuatFCurve : public ZvBaseFCurve {
  private:
   void MoveTail(unsigned int index, double delta);
   void DropKeys(unsigned int first, unsigned int last);
+  // The reader behind ReadFromBufferBody and ReadFromBuffer.
+  unsigned int ReadBody(ZvByteReader& in);
 
   ZvQuatCurve* m_curve;
   unsigned int m_component;

@@ -18,15 +18,20 @@
 // request for tangents or segment kind likewise (tangents 0, segment kind 1).
 //
 // Every public operation takes the curve's recursive lock; operations on two curves lock this
-// curve first. Operations that can fail return 0 and leave the curve unchanged. Persistence
-// comes with the curve persistence blocks: until then GetBufferSize, WriteToBuffer and
-// ReadFromBufferBody answer 0.
+// curve first. Operations that can fail return 0 and leave the curve unchanged.
+//
+// Persistence. The block (version 264) holds the value without keys, the clamps, the keys
+// (parameter, value), extrapolation, the read-only flag, the user data and the time-curve flag:
+// 55 + 16 n + U bytes. GetBufferSize first drops every key whose parameter is not above the one
+// kept before it. ReadFromBufferBody takes the older versions from 256 on as well.
 #ifndef ZV_RAW_FCURVE_H
 #define ZV_RAW_FCURVE_H
 
 #include <zv/api.h>
 #include <zv/fcurve.h>
 #include <zv/point.h>
+
+#include <cstddef>
 
 class ZvRawFCurveImpl;
 class ZvFCurveLockGuard;
@@ -65,8 +70,15 @@ class ZV_API ZvRawFCurve : public ZvBaseFCurve {
   // The box of key `index` and the segments touching it: what must be redrawn when it changes.
   unsigned int ComputeKeyExtent(unsigned int index, ZvExtent2<double>& extent) const;
 
+  // Reads a whole block of `size` bytes, length field included, refusing one whose length exceeds
+  // `size` or whose contents would be read past its body: the bytes taken (4 + the stored
+  // length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
+  unsigned int ReadFromBuffer(const void* buffer, std::size_t size);
+
  private:
   ZvRawFCurve(const ZvRawFCurve& other, const ZvFCurveLockGuard& sourceLock);
+  // The reader behind ReadFromBufferBody and ReadFromBuffer.
+  unsigned int ReadBody(ZvByteReader& in);
 
   ZvRawFCurveImpl* m_impl;
 

@@ -26,17 +26,26 @@
 // polyline at regular steps and replaces the contents of its arrays. Under the cycle methods a
 // box showing more than a million periods is refused with 0.
 //
-// Persistence is not available yet: GetBufferSize, WriteToBuffer and ReadFromBufferBody refuse
-// with 0 and change nothing. ScaleAndOffsetParameters scales, mirrors and shifts the whole
-// curve, and offsets part of the keys as a drag of ZvFCurveKeyMover would (a key that would land
-// on a key that stays does not move, nor do those behind it); it refuses with 0 a scale of part
-// of the keys, which needs the key stretcher.
+// Persistence. The block (version 264) holds the curve-wide values, 60 bytes a key, the flags,
+// extrapolation, read-only flag, the keys' extra bytes, the user data block, the tangent
+// constraint and the time-curve flag: 68 + 64 n + U bytes for n keys and a user data block of U,
+// of which the writer fills all but the last four, which it zeroes. GetBufferSize first drops
+// every key whose parameter is not above the one kept before it (their per-key user data go
+// along), so a curve writes only ascending keys. ReadFromBufferBody takes every older version as
+// well; it consumes 60 + 64 n + U body bytes of a block of today.
+//
+// ScaleAndOffsetParameters scales, mirrors and shifts the whole curve, and offsets part of the
+// keys as a drag of ZvFCurveKeyMover would (a key that would land on a key that stays does not
+// move, nor do those behind it); it refuses with 0 a scale of part of the keys, which needs the
+// key stretcher.
 #ifndef ZV_STD_FCURVE_H
 #define ZV_STD_FCURVE_H
 
 #include <zv/api.h>
 #include <zv/fcurve.h>
 #include <zv/point.h>
+
+#include <cstddef>
 
 class ZvStdFCurveImpl;
 class ZvFCurveLockGuard;
@@ -170,6 +179,10 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   unsigned int GetBufferSize() const override;
   unsigned int WriteToBuffer(void* buffer) const override;
   unsigned int ReadFromBufferBody(const void* body) override;
+  // Reads a whole block of `size` bytes, length field included, refusing one whose length exceeds
+  // `size` or whose contents would be read past its body: the bytes taken (4 + the stored
+  // length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
+  unsigned int ReadFromBuffer(const void* buffer, std::size_t size);
   unsigned int ScaleAndShiftValues(double scale, double offset) override;
   // The parameter at which a bijective curve takes the value; the last argument is ignored.
   unsigned int EvalInverse(double value, double& parameter, int clamped) const override;
@@ -292,6 +305,8 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   // Copies under the source's lock, held from before the user data is copied until the keys are.
   ZvStdFCurve(const ZvStdFCurve& other, const ZvFCurveLockGuard& sourceLock);
   friend class ZvStdTgtMoverImpl;  // a drag writes handles that are valid only as a pair
+  // The reader behind ReadFromBufferBody and ReadFromBuffer.
+  unsigned int ReadBody(ZvByteReader& in);
 
   ZvStdFCurveImpl* m_impl;
 

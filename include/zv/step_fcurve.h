@@ -33,14 +33,20 @@
 // shifted (the first key takes that of the value before the first key).
 //
 // Every public operation takes the curve's recursive lock; operations on two curves lock this
-// curve first. Operations that fail return 0 and leave the curve unchanged. Persistence comes
-// with the curve persistence blocks: until then GetBufferSize, WriteToBuffer and
-// ReadFromBufferBody answer 0.
+// curve first. Operations that fail return 0 and leave the curve unchanged.
+//
+// Persistence. A block (version 258) holds the value without keys, the value before the first
+// key, extrapolation, the read-only flag, the keys (parameter, value, flags) and the user data:
+// 36 + 11 n + U bytes for the boolean curve, 42 + 14 n + U for the integer curve. GetBufferSize
+// first drops every key whose parameter is not above the one kept before it. The clamps and the
+// time-curve flag are not part of the block: a read curve has those of a new curve.
 #ifndef ZV_STEP_FCURVE_H
 #define ZV_STEP_FCURVE_H
 
 #include <zv/api.h>
 #include <zv/fcurve.h>
+
+#include <cstddef>
 
 class ZvStepFCurveImpl;
 class ZvFCurveLockGuard;
@@ -59,9 +65,15 @@ class ZV_API ZvBooleanFCurve : public ZvBaseFCurve {
 
   // The value before the first key.
   int GetValueBeforeFirstKey() const;
+  // Reads a whole block of `size` bytes, length field included, refusing one whose length exceeds
+  // `size` or whose contents would be read past its body: the bytes taken (4 + the stored
+  // length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
+  unsigned int ReadFromBuffer(const void* buffer, std::size_t size);
 
  private:
   ZvBooleanFCurve(const ZvBooleanFCurve& other, const ZvFCurveLockGuard& sourceLock);
+  // The reader behind ReadFromBufferBody and ReadFromBuffer.
+  unsigned int ReadBody(ZvByteReader& in);
 
   ZvStepFCurveImpl* m_impl;
 
@@ -81,9 +93,15 @@ class ZV_API ZvIntegerFCurve : public ZvBaseFCurve {
   ZV_BASE_FCURVE_OVERRIDES
 
   int GetValueBeforeFirstKey() const;
+  // Reads a whole block of `size` bytes, length field included, refusing one whose length exceeds
+  // `size` or whose contents would be read past its body: the bytes taken (4 + the stored
+  // length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
+  unsigned int ReadFromBuffer(const void* buffer, std::size_t size);
 
  private:
   ZvIntegerFCurve(const ZvIntegerFCurve& other, const ZvFCurveLockGuard& sourceLock);
+  // The reader behind ReadFromBufferBody and ReadFromBuffer.
+  unsigned int ReadBody(ZvByteReader& in);
 
   ZvStepFCurveImpl* m_impl;
 

@@ -90,7 +90,6 @@ TEST_F(QuatViews, SlotsWithoutMeaningAnswerAsAnAngleCurve) {
   EXPECT_EQ(hi, DBL_MAX);
   EXPECT_EQ(x.SetAsTimeFCurve(0), 1u);
   EXPECT_EQ(x.IsBijective(), 0u);
-  EXPECT_EQ(x.GetBufferSize(), 0u);
 
   ZvBaseFCurve::FCurveInfo info{};
   info.mask = ZvBaseFCurve::FCurveInfo::KindMask | ZvBaseFCurve::FCurveInfo::NumKeysMask |

@@ -45,6 +45,18 @@ void* operator new(std::size_t n) {
 void* operator new[](std::size_t n) {
   return zv_test::Allocate(n);
 }
+// The non-throwing forms fail on the same count, answering null; they must be replaced too, or
+// their blocks would come from another allocator than the one that frees them.
+void* operator new(std::size_t n, const std::nothrow_t&) noexcept {
+  try {
+    return zv_test::Allocate(n);
+  } catch (const std::bad_alloc&) {
+    return nullptr;
+  }
+}
+void* operator new[](std::size_t n, const std::nothrow_t&) noexcept {
+  return operator new(n, std::nothrow);
+}
 void operator delete(void* p) noexcept {
   std::free(p);
 }

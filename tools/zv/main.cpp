@@ -4,9 +4,11 @@
 //   zv demo [-o FILE]            the built-in scene
 //   zv fit [options] [FILE]      pen points through a path builder, out as SVG path data
 //   zv trace [options] PNG       a PNG's dark regions traced into an SVG path
+//   zv curve [options] [KEYS]    a function curve sampled to CSV, plotted, saved as a block
 //
 // Every failure is one line on standard error and a non-zero exit: 1 for bad input or output,
 // 2 for a bad command line.
+#include "curve.h"
 #include "demo.h"
 #include "fit.h"
 #include "offset.h"
@@ -241,8 +243,9 @@ int main(int argc, char** argv) {
     if (command == "demo") return Demo(args);
     if (command == "fit") return ZvFitCommand(argc, argv);
     if (command == "trace") return ZvTraceCommand(argc - 2, argv + 2);
+    if (command == "curve") return ZvCurveCommand(argc, argv);
     if (command == "help" || command == "--help" || command == "-h") {
-      std::cout << kUsage;
+      std::cout << kUsage << kZvCurveUsage;
       return 0;
     }
     throw UsageError{command.empty() ? "no command given" : "unknown command '" + command + "'"};

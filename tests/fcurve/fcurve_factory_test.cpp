@@ -1,0 +1,116 @@
+// The curve factories and the bounded readers: kinds, refusals, truncated blocks, blocks in a
+// row, and the fuzzing seeds, which are the blocks written here.
+#include <zv/std_fcurve.h>
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <fstream>
+#include <iterator>
+#include <memory>
+
+#include "tests/fcurve/curve_blocks.h"
+
+TEST(FCurveFactory, KindsOfBodies) {
+  const auto body = [](std::uint32_t stamp, std::uint32_t kind) {
+    return BlockBuilder().U32(stamp).U32(kind).body;
+  };
+  const ByteVec oldest = body(1, 99), raw = body(264, 30), unknown = body(264, 21),
+                zero = body(0, 20);
+  EXPECT_EQ(ZvBaseFCurve_GetKindFromBufferBody(oldest.data()), 20u);
+  EXPECT_EQ(ZvBaseFCurve_GetKindFromBufferBody(raw.data()), 30u);
+  EXPECT_EQ(ZvBaseFCurve_GetKindFromBufferBody(unknown.data()), 0u);
+  EXPECT_EQ(ZvBaseFCurve_GetKindFromBufferBody(zero.data()), 20u);
+  EXPECT_EQ(ZvBaseFCurve_GetBufferBodyLengthSize(), 4u);
+
+  ZvBaseFCurve* sentinel = reinterpret_cast<ZvBaseFCurve*>(&sentinel);
+  ZvBaseFCurve* out = sentinel;
+  EXPECT_EQ(ZvBaseFCurve_CreateFromBufferBody(nullptr, &out), 0u);
+  EXPECT_EQ(out, sentinel);
+  EXPECT_EQ(ZvBaseFCurve_CreateFromBufferBody(raw.data(), nullptr), 0u);
+  EXPECT_EQ(ZvBaseFCurve_CreateFromBufferBody(unknown.data(), &out), 0u);
+  EXPECT_EQ(out, nullptr);
+  // Stamp 0 names the standard curve, which refuses it.
+  out = sentinel;
+  EXPECT_EQ(ZvBaseFCurve_CreateFromBufferBody(zero.data(), &out), 0u);
+  EXPECT_EQ(out, nullptr);
+
+  const ByteVec block = BlockOf(RichStdCurve());
+  ASSERT_EQ(ZvBaseFCurve_CreateFromBufferBody(block.data() + 4, &out), 1u);
+  std::unique_ptr<ZvBaseFCurve> curve(out);
+  EXPECT_EQ(curve->GetKind(), ZvBaseFCurve::StdKind);
+  EXPECT_EQ(BlockOf(*curve), block);
+}
+
+TEST(FCurveFactory, BoundedReadsTakeBlocksInARow) {
+  ByteVec row = BlockOf(RichStdCurve());
+  const std::size_t first = row.size();
+  const ByteVec second = StdBlock(257);
+  row.insert(row.end(), second.begin(), second.end());
+  unsigned int consumed = 0;
+  std::unique_ptr<ZvBaseFCurve> a(ZvBaseFCurve_CreateFromBuffer(row.data(), row.size(), consumed));
+  ASSERT_NE(a, nullptr);
+  EXPECT_EQ(consumed, first);
+  std::unique_ptr<ZvBaseFCurve> b(
+      ZvBaseFCurve_CreateFromBuffer(row.data() + consumed, row.size() - consumed, consumed));
+  ASSERT_NE(b, nullptr);
+  EXPECT_EQ(consumed, second.size());
+  EXPECT_EQ(b->GetNumKeys(), 3u);
+  EXPECT_EQ(ZvBaseFCurve_CreateFromBuffer(nullptr, 100, consumed), nullptr);
+  EXPECT_EQ(consumed, 0u);
+}
+
+TEST(FCurveFactory, EveryTruncatedBlockIsRefused) {
+  for (const auto& seed : SeedBlocks()) {
+    SCOPED_TRACE(seed.first);
+    const ByteVec& block = seed.second;
+    ZvBaseFCurve* probe = nullptr;
+    ASSERT_EQ(ZvBaseFCurve_CreateFromBufferBody(block.data() + 4, &probe), 1u);
+    // What the reader needs: its length field and the body bytes it consumes.
+    const std::size_t needed = 4 + probe->ReadFromBufferBody(block.data() + 4);
+    delete probe;
+    ZvStdFCurve target = RichStdCurve();
+    const ByteVec before = BlockOf(target);
+    for (std::size_t cut = 0; cut < block.size(); ++cut) {
+      ByteVec prefix(block.begin(), block.begin() + static_cast<std::ptrdiff_t>(cut));
+      unsigned int consumed = 1;
+      // The length field asks for more than there is.
+      EXPECT_EQ(ZvBaseFCurve_CreateFromBuffer(prefix.data(), cut, consumed), nullptr) << cut;
+      EXPECT_EQ(consumed, 0u);
+      EXPECT_EQ(target.ReadFromBuffer(prefix.data(), cut), 0u);
+      if (cut < 4) continue;
+      // The length field agrees, and the contents run out.
+      const std::uint32_t length = static_cast<std::uint32_t>(cut - 4);
+      std::memcpy(prefix.data(), &length, 4);  // little-endian on every target
+      std::unique_ptr<ZvBaseFCurve> curve(
+          ZvBaseFCurve_CreateFromBuffer(prefix.data(), cut, consumed));
+      EXPECT_EQ(curve != nullptr, cut >= needed) << cut;
+      EXPECT_EQ(consumed, curve ? cut : 0u);
+      if (cut < needed) {
+        EXPECT_EQ(target.ReadFromBuffer(prefix.data(), cut), 0u) << cut;
+      }
+    }
+    EXPECT_EQ(BlockOf(target), before);
+  }
+}
+
+TEST(FCurveFactory, FuzzSeedsAreTheWrittenBlocks) {
+  // ZV_WRITE_FUZZ_SEEDS=1 rewrites the committed seeds; otherwise they must match the writers.
+  std::string dir = __FILE__;
+  for (int up = 0; up < 3; ++up)
+    dir = dir.substr(0, dir.find_last_of('/'));
+  dir += "/fuzz/corpus/fuzz_fcurve_buffer/";
+  const bool write = std::getenv("ZV_WRITE_FUZZ_SEEDS") != nullptr;
+  for (const auto& seed : SeedBlocks()) {
+    const std::string file = dir + seed.first;
+    if (write) {
+      std::ofstream(file, std::ios::binary)
+          .write(reinterpret_cast<const char*>(seed.second.data()),
+                 static_cast<std::streamsize>(seed.second.size()));
+    }
+    std::ifstream in(file, std::ios::binary);
+    ASSERT_TRUE(in.good()) << file;
+    const ByteVec stored((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
+    EXPECT_EQ(stored, seed.second) << file;
+  }
+}

@@ -1,0 +1,106 @@
+// Curve blocks under allocation failure. A test-only global operator new throws on the k-th
+// allocation after it is armed; each read runs for k = 0, 1, 2, ... until it completes without
+// the failure firing. The body reader lets the failure through and leaves its curve as it was;
+// the factories catch it and answer null. Under AddressSanitizer, leak detection catches anything
+// a failure leaves behind.
+#include <zv/std_fcurve.h>
+
+#include <gtest/gtest.h>
+
+#include <functional>
+#include <memory>
+
+#include "tests/fcurve/curve_blocks.h"
+#include "tests/support/failing_allocator.h"
+
+using zv_test::Arm;
+using zv_test::Disarm;
+
+namespace {
+
+// Runs `op` with the k-th allocation failing, for every k until none fails, calling `check` with
+// whether the operation threw. Returns the number of failures.
+int ForEachFailure(const std::function<void()>& op, const std::function<void(bool threw)>& check) {
+  for (long k = 0;; ++k) {
+    Arm(k);
+    bool threw = false;
+    try {
+      op();
+    } catch (const std::bad_alloc&) {
+      threw = true;
+    }
+    if (!Disarm()) return static_cast<int>(k);
+    check(threw);
+    if (::testing::Test::HasFatalFailure()) return static_cast<int>(k);
+  }
+}
+
+}  // namespace
+
+TEST(FCurveBufferAllocFailure, BodyReaderThrowsAndChangesNothing) {
+  for (const auto& seed : SeedBlocks()) {
+    SCOPED_TRACE(seed.first);
+    const unsigned char* body = seed.second.data() + 4;
+    // A curve of the block's kind, holding what the block holds, reads the block again.
+    std::unique_ptr<ZvBaseFCurve> target;
+    const auto fresh = [&] {
+      ZvBaseFCurve* made = nullptr;
+      ASSERT_EQ(ZvBaseFCurve_CreateFromBufferBody(body, &made), 1u);
+      target.reset(made);
+      // Unlike the block, so that a half-done read would show.
+      target->SetFCurveUserData(MakeUID(99), Bytes("other"), 5);
+    };
+    fresh();
+    const ByteVec before = BlockOf(*target);
+    unsigned int read = 0;
+    const int failures = ForEachFailure([&] { read = target->ReadFromBufferBody(body); },
+                                        [&](bool threw) {
+                                          // An item's bytes lost while copying are dropped in
+                                          // silence; anything else throws.
+                                          if (threw) {
+                                            EXPECT_EQ(BlockOf(*target), before);
+                                          }
+                                          EXPECT_EQ(target->GetLockCount(), 0u);
+                                          fresh();
+                                        });
+    EXPECT_GT(failures, 0);
+    EXPECT_NE(read, 0u);
+  }
+}
+
+TEST(FCurveBufferAllocFailure, FactoriesAnswerNull) {
+  for (const auto& seed : SeedBlocks()) {
+    SCOPED_TRACE(seed.first);
+    const ByteVec& block = seed.second;
+    ZvBaseFCurve* out = nullptr;
+    unsigned int result = 0;
+    int failures =
+        ForEachFailure([&] { result = ZvBaseFCurve_CreateFromBufferBody(block.data() + 4, &out); },
+                       [&](bool threw) {
+                         EXPECT_FALSE(threw);
+                         if (result == 0) {
+                           EXPECT_EQ(out, nullptr);
+                         }
+                         delete out;
+                         out = nullptr;
+                       });
+    EXPECT_GT(failures, 0);
+    ASSERT_EQ(result, 1u);
+    const std::unique_ptr<ZvBaseFCurve> reference(out);
+
+    ZvBaseFCurve* curve = nullptr;
+    unsigned int consumed = 0;
+    failures = ForEachFailure(
+        [&] { curve = ZvBaseFCurve_CreateFromBuffer(block.data(), block.size(), consumed); },
+        [&](bool threw) {
+          EXPECT_FALSE(threw);
+          EXPECT_EQ(consumed, curve ? block.size() : 0u);
+          delete curve;
+          curve = nullptr;
+        });
+    EXPECT_GT(failures, 0);
+    ASSERT_NE(curve, nullptr);
+    EXPECT_EQ(BlockOf(*curve), BlockOf(*reference));
+    delete curve;
+  }
+}
