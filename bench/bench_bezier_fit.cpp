@@ -29,31 +29,14 @@
 #include <string>
 #include <vector>
 
-#include "tests/curvemath/bezier_fit_strokes.h"
-
-#if ZV_HAVE_2GEOM
-#include <2geom/bezier-utils.h>
-#endif
+#include "bench/pen_strokes.h"
 
 namespace {
 
 using P2 = ZvPoint2<double>;
 
-constexpr int kStrokes = 200;
-constexpr unsigned int kPointsPerStroke = 300;
 constexpr double kTolerance = 1.0;
 constexpr double kCornerCos2 = 0.5;
-
-const std::vector<ZvPoint2fArray>& Strokes() {
-  static const std::vector<ZvPoint2fArray> strokes = [] {
-    std::mt19937 rng(20261122);
-    std::vector<ZvPoint2fArray> v;
-    for (int i = 0; i < kStrokes; ++i)
-      v.push_back(PenStroke(rng, kPointsPerStroke, 3.0, 0.3));
-    return v;
-  }();
-  return strokes;
-}
 
 // A fitted stroke as a list of segments, each its control points.
 using Chain = std::vector<std::vector<P2>>;
@@ -104,20 +87,6 @@ Method ZvMethod(unsigned int degree) {
 
 #if ZV_HAVE_2GEOM
 constexpr unsigned int kMaxBeziers = 1000;
-
-const std::vector<std::vector<Geom::Point>>& GeomStrokes() {
-  static const std::vector<std::vector<Geom::Point>> strokes = [] {
-    std::vector<std::vector<Geom::Point>> v;
-    for (const ZvPoint2fArray& s : Strokes()) {
-      std::vector<Geom::Point> g;
-      for (unsigned int i = 0; i < s.size; ++i)
-        g.emplace_back(s[i].x, s[i].y);
-      v.push_back(g);
-    }
-    return v;
-  }();
-  return strokes;
-}
 
 Method GeomMethod() {
   Method m;

@@ -120,6 +120,10 @@ void ZvBezierTool::ContextInitTwo() {
 
 void ZvBezierTool::OFDInnerLoop() {
   const unsigned int d = degree;
+  // Pieces are walked one at a time here, so the cap is checked piece by piece.
+  const unsigned int size = useDouble ? outDouble->size : outFloat->size;
+  if (size > kZvMaxFlattenPoints || numSteps - 2 > kZvMaxFlattenPoints - size)
+    throw std::bad_alloc();
   ZvPoint2<double> q = Row(0)[0];
   for (unsigned int i = 2; i < numSteps; ++i) {
     q += forward[1];

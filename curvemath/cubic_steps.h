@@ -11,8 +11,15 @@
 #include <cmath>
 #include <cstdint>
 #include <cstring>
+#include <new>
 
 #include "core/vec.h"
+
+// The most points a flatten grows its output array to. 2^24 points resolve any curve a raster
+// can show; a flatten asked for more (coordinates near the float range, a tolerance near 0)
+// would otherwise take all the memory there is before failing. Past the cap a flatten fails
+// the way an allocation does, before allocating.
+constexpr unsigned int kZvMaxFlattenPoints = 1u << 24;
 
 // Is q outside the range of four control coordinates grown by grow on both sides?
 inline bool zvIsOutsideGrownRange(double c0, double c1, double c2, double c3, double q,

@@ -5,6 +5,8 @@
 
 #include "curvemath/cubic_steps.h"
 
+#include <cmath>
+
 namespace {
 
 // Plane curves in double. This form alone caps forward differencing at 2^10 steps per piece;
@@ -116,6 +118,45 @@ void CubicMidpointSubdivision(const typename F::Geom::Point* p, unsigned int dep
   }
 }
 
+inline double zvManhattanLength(const ZvPoint2<double>& v) {
+  return std::fabs(v.x) + std::fabs(v.y);
+}
+inline double zvManhattanLength(const ZvPoint3<double>& v) {
+  return std::fabs(v.x) + std::fabs(v.y) + std::fabs(v.z);
+}
+
+// The interior points a flatten adds, without adding them: the same halvings and step counts.
+template <class F>
+unsigned long long CountInterior(const typename F::Geom::Point* p, unsigned int depth,
+                                 double factor) {
+  if (depth == 0) {
+    unsigned int levels = zvCubicLevels<typename F::Geom>(p, factor);
+    if (levels > F::kMaxLevels) levels = F::kMaxLevels;
+    return (1u << (levels & 31u)) - 1;
+  }
+  typename F::Geom::Point left[4], right[4];
+  zvSplitCubicAtHalf(p, left, right);
+  return CountInterior<F>(left, depth - 1, factor) + 1 + CountInterior<F>(right, depth - 1, factor);
+}
+
+// Fails before anything is added when the flatten would pass the cap. A piece's step count
+// grows with its deviation, which its control polygon bounds, so a curve short against the
+// tolerance needs at most 2^11 steps in each of at most 2^10 pieces; only longer curves, or
+// arrays already near the cap, are counted exactly.
+template <class F>
+void CheckRoom(const typename F::Geom::Point* p, unsigned int depth, double factor,
+               unsigned int size) {
+  // Lengths taken coordinate by coordinate: never shorter, and no square roots on the way.
+  double reach = 0.0;
+  for (int i = 0; i < 3; ++i)
+    reach += zvManhattanLength(p[i + 1] - p[i]);
+  reach *= factor;
+  constexpr unsigned long long kShortBound = (1ull << 21) + (1ull << 10) + 2;
+  if (reach < 1048576.0 && kShortBound <= kZvMaxFlattenPoints - size) return;
+  const unsigned long long need = CountInterior<F>(p, depth, factor) + 2;
+  if (size > kZvMaxFlattenPoints || need > kZvMaxFlattenPoints - size) throw std::bad_alloc();
+}
+
 template <class F>
 unsigned int FlattenCubic(const typename F::Source* src, double tolerance, typename F::Array* out,
                           int skipFirst) {
@@ -124,10 +165,11 @@ unsigned int FlattenCubic(const typename F::Source* src, double tolerance, typen
   const typename F::Source first = src[0], last = src[3];
   const typename F::Geom::Point p[4] = {F::Widen(src[0]), F::Widen(src[1]), F::Widen(src[2]),
                                         F::Widen(src[3])};
-  const unsigned int before = out->size;
-  if (!skipFirst) out->Add(first);
   double factor;
   const unsigned int depth = zvCubicSubdivisionDepth<typename F::Geom>(p, tolerance, factor);
+  CheckRoom<F>(p, depth, factor, out->size);
+  const unsigned int before = out->size;
+  if (!skipFirst) out->Add(first);
   if (depth > 0) {
     CubicMidpointSubdivision<F>(p, depth, factor, *out);
   } else {

@@ -1,8 +1,14 @@
-// Feeds arbitrary bytes to the bounded shape reader and, when a path comes out, walks its
-// structure the way hosts and the other path operations do: the codes of a foreign block may
-// say anything, and no query may leave the arrays because of them. A written block must read
-// back to the same bytes.
+// Feeds arbitrary bytes to the bounded shape reader and, when a shape comes out, checks what
+// the reader promises and walks it the way hosts and the other operations do. A path must have
+// codes that parse, without lock bits; its queries may not leave the arrays. A rectangle or an
+// oval may hold any floats (infinities, NaNs, huge values): its fills run on a small raster,
+// where no conversion may write outside. A written block must read back to the same bytes.
+#include <zv/gc.h>
+#include <zv/oval2f.h>
 #include <zv/path2f.h>
+#include <zv/rect2f.h>
+
+#include "tests/shape/path_fixtures.h"
 
 #include <cstddef>
 #include <cstdint>
@@ -55,6 +61,27 @@ void Walk(ZvPath2f& path) {
   path.Closeto();
 }
 
+// The direct fills and the handle queries of a three-corner shape, in both orientations.
+void Frame(const ZvShape2f& shape) {
+  ZvGC gc;
+  ZvRaster<unsigned char> raster(24, 17, 0);
+  ZvRaster<float> soft(9, 31, 0.0f);
+  for (int flag = 0; flag < 2; ++flag) {
+    raster.SetOrientationFlag(flag);
+    shape.Fill(gc, raster, nullptr, nullptr);
+    shape.Fill(gc, soft, nullptr, nullptr);
+  }
+  if (const ZvOval2f* oval =
+          static_cast<const ZvOval2f*>(shape.QueryShapeKind(ZvShape2f::KindOval)))
+    oval->RadialFill(gc, raster);
+  if (const ZvRect2f* rect =
+          static_cast<const ZvRect2f*>(shape.QueryShapeKind(ZvShape2f::KindRect)))
+    rect->RadialFill(gc, raster);
+  ZvPoint2<float> p;
+  for (unsigned int i = 0; i < 10; ++i)
+    shape.GetPoint(i, p);
+}
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
@@ -65,19 +92,22 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     return 0;
   }
   if (consumed > size) std::abort();
-  ZvPath2f* path = static_cast<ZvPath2f*>(shape->QueryShapeKind(ZvShape2f::KindPath));
-  if (path) {
-    // What is read is written back identically, bar the bytes a writer leaves at 0.
-    std::vector<unsigned char> block(path->GetBufferSize());
-    path->WriteToBuffer(block.data());
-    unsigned int again = 0;
-    ZvShape2f* copy = ZvShape2f_CreateFromBuffer(block.data(), block.size(), again);
-    if (!copy || again != block.size()) std::abort();
-    std::vector<unsigned char> second(block.size());
-    copy->WriteToBuffer(second.data());
-    if (second != block) std::abort();
-    delete copy;
+  // What is read is written back identically, bar the bytes a writer leaves at 0.
+  std::vector<unsigned char> block(shape->GetBufferSize());
+  shape->WriteToBuffer(block.data());
+  unsigned int again = 0;
+  ZvShape2f* copy = ZvShape2f_CreateFromBuffer(block.data(), block.size(), again);
+  if (!copy || again != block.size()) std::abort();
+  std::vector<unsigned char> second(block.size());
+  copy->WriteToBuffer(second.data());
+  if (second != block) std::abort();
+  delete copy;
+  if (ZvPath2f* path = static_cast<ZvPath2f*>(shape->QueryShapeKind(ZvShape2f::KindPath))) {
+    // A foreign block is handed over only when its codes parse, without lock bits.
+    if (!PathInvariantHolds(*path) || Codes(*path, 255) != Codes(*path, 63)) std::abort();
     Walk(*path);
+  } else {
+    Frame(*shape);
   }
   delete shape;
   return 0;

@@ -13,6 +13,8 @@
 
 #include <cstdint>
 
+class ZvGC;
+
 struct CFillVertex {
   double x;
   double y;
@@ -62,6 +64,10 @@ class CFillContext {
   // row, or three when `three`.
   void AllocateCoverageRows4x4(int first, int end, bool three);
   void AllocateCoverageRows8x8(int first, int end, bool three);
+
+  // The soft fill's filter of `taps` = 2 radius + 1 weights sampled from the context's feather
+  // profile and normalised to sum 1, and its cumulative table (one zero entry past the end).
+  void BuildFeatheringFilters(int radius, int taps, const ZvGC& gc);
 
   // Sets the samples x0..x1 (inclusive) of sub-sample row `row` in the newest coverage row,
   // widening [minCell, maxCell] to the cells touched.

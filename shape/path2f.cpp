@@ -22,6 +22,12 @@ ZvPath2f::ZvPath2f(const ZvPath2f& source, unsigned int first, unsigned int last
   {
     ZvShapeLock guard(source);
     if (first > last || last >= source.points.size) return;
+    // Ends inside a segment move to its nodes, inwards, so that only whole segments are copied.
+    const CodeInfo head = Decode(source.codes[first]);
+    if (!IsNode(source.codes[first])) first += head.degree - head.position;
+    const CodeInfo tail = Decode(source.codes[last]);
+    if (!IsNode(source.codes[last])) last -= tail.position;
+    if (first > last) return;
     points.Add(source.points.data + first, last - first + 1);
     codes.Add(source.codes.data + first, last - first + 1);
   }
@@ -153,33 +159,35 @@ void ZvPath2f::Moveto(const ZvPoint2<float>& p) {
   currentSubpathOpen = 1;
 }
 
-void ZvPath2f::Lineto(const ZvPoint2<float>& p) {
+void ZvPath2f::AppendSegment(const ZvPoint2<float>* p, unsigned int degree) {
   ZvShapeLock guard(*this);
-  Append(&p, 1, static_cast<unsigned char>(Base(1)));
+  // A segment needs a point to start from: on an empty path there is none.
+  if (points.size == 0) return;
+  Append(p, degree, static_cast<unsigned char>(Base(degree)));
+}
+
+void ZvPath2f::Lineto(const ZvPoint2<float>& p) {
+  AppendSegment(&p, 1);
 }
 
 void ZvPath2f::Curveto(const ZvPoint2<float>& c, const ZvPoint2<float>& end) {
   const ZvPoint2<float> p[2] = {c, end};
-  ZvShapeLock guard(*this);
-  Append(p, 2, static_cast<unsigned char>(Base(2)));
+  AppendSegment(p, 2);
 }
 
 void ZvPath2f::Curveto(const ZvPoint2<float>& c1, const ZvPoint2<float>& c2,
                        const ZvPoint2<float>& end) {
   const ZvPoint2<float> p[3] = {c1, c2, end};
-  ZvShapeLock guard(*this);
-  Append(p, 3, static_cast<unsigned char>(Base(3)));
+  AppendSegment(p, 3);
 }
 
 void ZvPath2f::AltCurveto(const ZvPoint2<float>* p, unsigned int degree) {
   if (degree < 1 || degree > kMaxDegree) return;
-  ZvShapeLock guard(*this);
-  Append(p, degree, static_cast<unsigned char>(Base(degree)));
+  AppendSegment(p, degree);
 }
 
 void ZvPath2f::AltAltCurveto(const ZvPoint2fArray& array, unsigned int first, unsigned int degree) {
   if (degree < 1 || degree > kMaxDegree) return;
   if (first > array.size || degree > array.size - first) return;  // also catches overflow
-  ZvShapeLock guard(*this);
-  Append(array.data + first, degree, static_cast<unsigned char>(Base(degree)));
+  AppendSegment(array.data + first, degree);
 }

@@ -21,8 +21,11 @@ ZvPoint2<float> Lerp(const ZvPoint2<float>& a, const ZvPoint2<float>& b, double 
 unsigned int ZvPath2f::Sample(const ZvGC& gc, ZvPoint2fArray& out, ZvPointTagArray& tags) const {
   ZvShapeLock guard(*this);
   if (points.size == 0) return 0;
-  const unsigned int before = out.size;
+  const unsigned int before = out.size, tagsBefore = tags.size;
   const double spacing = gc.sampleSpacing;
+  // A spacing that is not positive, or a length that is not finite, would ask for samples
+  // without end; so would any request past the cap.
+  bool tooMany = !(spacing > 0.0);
   ZvBezierTool tool;
   ZvPoint2fArray flat(64);
   ZvDoubleArray chords(64);
@@ -39,6 +42,10 @@ unsigned int ZvPath2f::Sample(const ZvGC& gc, ZvPoint2fArray& out, ZvPointTagArr
     const double length = chords[chords.size - 1];
     double n = std::floor(length / spacing);
     if (std::fmod(length, spacing) > 0.5 * spacing) n += 1.0;
+    if (tooMany || !(n + (out.size - before) <= kMaxSamples)) {
+      tooMany = true;
+      return;
+    }
     if (!(length > spacing) || !(n > 1.0)) {
       out.Add(flat[flat.size - 1]);
       tags.Add(ZvPointTag_Last);
@@ -71,6 +78,11 @@ unsigned int ZvPath2f::Sample(const ZvGC& gc, ZvPoint2fArray& out, ZvPointTagArr
       tags[tags.size - 1] = ZvPointTag_Last;
     }
   });
+  if (tooMany) {
+    out.Chop(before);
+    tags.Chop(tagsBefore);
+    return 0;
+  }
   return out.size - before;
 }
 

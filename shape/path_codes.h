@@ -74,6 +74,30 @@ inline unsigned char OpenFromClosed(unsigned char byte) {
   return static_cast<unsigned char>(byte - 1);
 }
 
+// The handles next to a node: the first inner control point of a segment of degree 2 or more
+// (codes 5, 8, 12, 17, 23, 30, 38) and the last one (5, 9, 14, 20, 27, 35, 44), as bit masks
+// relative to code 5. A quadratic's single handle is both.
+constexpr std::uint64_t kFirstHandleMask = 8623755401ull;
+constexpr std::uint64_t kLastHandleMask = 550833783313ull;
+
+constexpr bool InHandleMask(std::uint64_t mask, unsigned int code) {
+  return code >= 5 && code - 5 <= 39 && ((mask >> (code - 5)) & 1u);
+}
+
+// Whether a subpath starts anywhere in first..last, last being an index of the path.
+inline bool StartsIn(const unsigned char* codes, unsigned int first, unsigned int last) {
+  for (unsigned int i = first; i <= last; ++i)
+    if ((codes[i] & kCodeMask) == kStart) return true;
+  return false;
+}
+
+// The end node byte of a rewritten segment whose end node had `old`: the open code given, made
+// the closed one when `old` closed its subpath, and bits 6 and 7 of `old` kept.
+inline unsigned char EndNodeByte(unsigned int openCode, unsigned char old) {
+  const unsigned int closed = IsClosedEnd(old & kCodeMask) ? 1u : 0u;
+  return static_cast<unsigned char>((old & kKeepBits) | (openCode + closed));
+}
+
 // 1e-7 in single precision, bounds included, on each axis.
 template <class P>
 bool Coincide(const P& a, const P& b) {

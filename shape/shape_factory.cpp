@@ -1,9 +1,12 @@
 // Shapes from persistent blocks: the trusted body readers and the bounded whole-block reader.
+#include <zv/oval2f.h>
 #include <zv/path2f.h>
+#include <zv/rect2f.h>
 
 #include <new>
 
 #include "core/le_bytes.h"
+#include "shape/path_well_formed.h"
 
 unsigned int ZvShape2f_GetBufferBodyLengthSize() {
   return 4;
@@ -18,12 +21,19 @@ ZvShape2f::Kind ZvShape2f_GetKindFromBufferBody(const void* body) {
 
 namespace {
 
-// The empty object of a kind. Rectangles, ovals and property paths join here with their
-// classes; until then their blocks are refused like unknown kinds.
+// The body of a rectangle or an oval: the kind word and three points.
+const unsigned int kFrameBodyLength = 28;
+
+// The empty object of a kind. Property paths join here with their class; until then their
+// blocks are refused like unknown kinds.
 ZvShape2f* NewShapeOfKind(ZvShape2f::Kind kind) {
   switch (kind) {
     case ZvShape2f::KindPath:
       return new ZvPath2f(1);
+    case ZvShape2f::KindRect:
+      return new ZvRect2f();
+    case ZvShape2f::KindOval:
+      return new ZvOval2f();
     default:
       return nullptr;
   }
@@ -71,6 +81,15 @@ ZvShape2f* ZvShape2f_CreateFromBuffer(const void* buffer, std::size_t size,
       shape = path;
       ZvByteReader in(body, length);
       read = path->ReadBody(in);
+      // A foreign block must also describe a path that the path's own queries can walk.
+      if (read && (path->currentSubpathOpen > 1 ||
+                   !zv_path::IsWellFormedBlock(path->codes.data, path->codes.size)))
+        read = 0;
+    } else if ((kind == ZvShape2f::KindRect || kind == ZvShape2f::KindOval) &&
+               head.Has(kFrameBodyLength - 2)) {
+      // Fixed size: once the body is known to hold it, the trusted reader is safe.
+      shape = NewShapeOfKind(static_cast<ZvShape2f::Kind>(kind));
+      read = shape->ReadFromBufferBody(body);
     }
   } catch (...) {
     read = 0;

@@ -116,19 +116,42 @@ class ArrayBase {
     const unsigned int old = size;
     size = n;
     if ((capacity >> 1) < n && n <= capacity) return;
-    unsigned int cap = capacity;
-    while (cap > n)
-      cap >>= 1;
     if (n > 0x80000000u) throw std::bad_alloc();
-    // A capacity of 0 would never double; it starts again from 1.
-    while (cap < n)
-      cap = cap ? cap << 1 : 1;
-    if (cap == 0) cap = 1;
+    const unsigned int cap = HalvedOrDoubled(capacity, n);
     T* block = Block::Allocate(cap);
     Block::Copy(block, data, old < n ? old : n);
     delete[] data;
     data = block;
     capacity = cap;
+  }
+
+  // Replacing a run in two steps, for a caller that changes several arrays together and must
+  // allocate for all of them before changing any. SpliceBlock answers the block that a size of
+  // n moves to (a larger one when n does not fit, a smaller one when less than half of the
+  // present block would be used, as removals shrink) or null when the present block serves; it
+  // may throw and changes nothing. Splice then replaces `removeCount` elements at `at` by
+  // `insertCount` unset ones for the caller to fill (zeroed in record arrays), taking over the
+  // block SpliceBlock answered for the same n; it allocates nothing.
+  T* SpliceBlock(unsigned int n) const {
+    if ((capacity >> 1) <= n && n <= capacity) return nullptr;
+    if (n > 0x80000000u) throw std::bad_alloc();
+    return Block::Allocate(HalvedOrDoubled(capacity, n));
+  }
+  void Splice(unsigned int at, unsigned int removeCount, unsigned int insertCount, T* block) {
+    const unsigned int n = size - removeCount + insertCount;
+    const unsigned int tail = size - at - removeCount;
+    if (block) {
+      Block::Copy(block, data, at);
+      Block::Copy(block + at + insertCount, data + at + removeCount, tail);
+      delete[] data;
+      data = block;
+      capacity = HalvedOrDoubled(capacity, n);
+    } else {
+      Block::Move(data + at + insertCount, data + at + removeCount, tail);
+      if (n < size) Block::Clear(data + n, size - n);
+    }
+    Block::Clear(data + at, insertCount);
+    size = n;
   }
 
   void Chop(unsigned int n) {
@@ -199,6 +222,15 @@ class ArrayBase {
   bool Aliases(const T* p) const { return p >= data && p < data + size; }
 
  private:
+  // The capacity a fresh block for n elements gets: halved until at most n, then doubled until
+  // it holds n. A capacity of 0 would never double; it starts again from 1.
+  static unsigned int HalvedOrDoubled(unsigned int cap, unsigned int n) {
+    while (cap > n)
+      cap >>= 1;
+    while (cap < n)
+      cap = cap ? cap << 1 : 1;
+    return cap ? cap : 1;
+  }
   void AddGrowing(const T& value) {
     // The value may live in the block that Resize is about to free.
     if (Aliases(&value)) {

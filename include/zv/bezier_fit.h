@@ -9,6 +9,8 @@
 // never evaluates the curve. As with the cubic free functions of <zv/bezier_tool.h>, the point
 // count is a pure function of the control points and the tolerance, and the last point added
 // is the last control point itself. For a cubic the counts agree with ZvBezierTool_FlattenCubic2f.
+// Like the cubic free functions, a flatten never grows its array beyond 2^24 points: when one
+// of its pieces would, it throws std::bad_alloc (the pieces before it stay added).
 //
 // Fitting. OpenFit and ClosedFit turn a polyline (pen input, samples) into Bezier segments
 // appended to a path. The polyline is cut at sharp corners; each stretch between corners is

@@ -29,6 +29,10 @@
 // no such cap. The 2f form computes in double and rounds each point to float as it is added.
 // The tolerance must be positive. A negative one yields P0 and P3 only; zero yields at most the
 // deepest subdivision (1023 midpoints) with no walk inside the pieces.
+//
+// No flatten grows its output array beyond 2^24 points: one that would (coordinates near the
+// float range, a vanishing tolerance) throws std::bad_alloc before adding anything, as a failed
+// allocation would.
 // ---------------------------------------------------------------------------------------------
 
 ZV_API unsigned int ZvBezierTool_FlattenCubic2d(const ZvPoint2<double>* p, double tolerance,

@@ -1,5 +1,7 @@
 // User data attached to a function curve: opaque byte items keyed by a
 // 16-byte identifier, either on the curve as a whole or on one of its keys.
+// Whether an item owns its bytes or refers to the caller's is chosen per
+// value (CFCUserDataValue); a referring value must not outlive the bytes.
 #ifndef ZV_FCURVE_USERDATA_H
 #define ZV_FCURVE_USERDATA_H
 

@@ -4,7 +4,16 @@
 // or strokes a shape; operations take it by constant reference and never keep it. It owns its
 // feather profile, a curve with a lock and a heap store, so copying a context is not free:
 // change one field on one copy rather than copying per call. Read-only sharing between threads
-// is safe; writing is not.
+// is safe; writing is not (soft fills write briefly into the context they are given).
+//
+// Units. Every operation first maps the shape's points by `transform`; distances below
+// (tolerances, spacing, line width, feather distances) are measured after that mapping, that
+// is in pixels when the result is a raster. `featherRadius` alone counts sub-samples of the
+// antialiasing grid (a quarter or an eighth of a pixel). Angles elsewhere in the library are
+// degrees.
+//
+// Rasters. A fill or stroke overwrites every pixel it touches with its coverage and leaves all
+// others as they were; it never blends with what a pixel held. Clear or composite yourself.
 //
 // ZvIsoView maps between world and view coordinates through a pair of mutually inverse
 // transforms. Its edits never leave a singular transform: an edit whose inverse fails is
@@ -19,13 +28,19 @@
 
 class ZV_API ZvGC {
  public:
+  // Values of fillRule, capStyle, joinStyle and samplingRate. The fields stay plain ints.
+  enum FillRule { EvenOddRule = 0, NonZeroRule = 1 };
+  enum CapStyle { RoundCap = 0, SquareCap = 1, FlatCap = 2 };
+  enum JoinStyle { BevelJoin = 0, MiterJoin = 1, RoundJoin = 2 };
+  enum SamplingRate { Sampling4x4 = 4, Sampling8x8 = 8 };
+
   ZvGC();
   ZvGC(const ZvGC& other);  // deep copy of the feather profile
   ZvGC& operator=(const ZvGC& other);
   ~ZvGC();
 
-  // Chord tolerance of the flatteners. Stroking uses max(0.25, value), and its square as the
-  // equality threshold of offset vectors.
+  // Chord tolerance of the flatteners, in pixels. The fills and stroking use max(0.25, value),
+  // and stroking its square as the equality threshold of offset vectors.
   double flattenTolerance;    // 1.0
   double sampleSpacing;       // 1.0: distance aimed at between samples
   double propertyTolerance;   // 0.1: flatten and extension tolerance of property curves
@@ -33,15 +48,15 @@ class ZV_API ZvGC {
   double pointMergeDistance;  // 0.5: builders merge closer input points; morpher step
   double fitTolerance;        // 0.82139380484, unrounded: error bound of the Bezier fitters
   double miterLimit;          // 1.0; values below 1.0 count as 1.0
-  double lineWidth;           // 1.0; the half width is 0.5 times this
+  double lineWidth;           // 1.0 pixel; the half width is 0.5 times this
   double featherInner;        // 0.0 \ soft fill: the two feather distances,
   double featherOuter;        // 0.0 / whose sum is the filter width
   int featherRadius;          // 0: antialiased fill blur in sub-samples, clamped to 0..4 or 0..8
-  int samplingRate;           // 4: 4x4 coverage cells; any other value 8x8
+  int samplingRate;           // Sampling4x4 (4): 4x4 coverage cells; any other value 8x8
   double opacity;             // 1.0: multiplies the output of AAFill and SoftFill
-  int fillRule;               // 1: non-zero winding; 0 even-odd
-  int capStyle;               // 2: 0 round, 1 square, 2 flat
-  int joinStyle;              // 1: 0 bevel, 1 miter, 2 round
+  int fillRule;               // NonZeroRule (1) or EvenOddRule (0)
+  int capStyle;               // FlatCap (2), RoundCap (0) or SquareCap (1)
+  int joinStyle;              // MiterJoin (1), BevelJoin (0) or RoundJoin (2)
   int taper;                  // 0; non-zero: stroke width goes to zero at subpath ends
   int clipToShape;            // 1; exactly 1: soft fill ends multiplied by the shape's coverage
   ZvTransfo4 transform;       // identity: applied to shape points before everything above

@@ -44,8 +44,10 @@ class ZV_API ZvPath2f : public ZvShape2f {
   explicit ZvPath2f(unsigned int reserve = 1);
   ZvPath2f(const ZvPath2f& other);
   // Points first..last of `source`, made well formed: the first point starts a subpath, and a
-  // cut through a closed subpath opens it and frees its tangent locks. An empty path when the
-  // range is not inside the source.
+  // cut through a closed subpath opens it and frees its tangent locks. Ends that fall inside a
+  // segment (on a control point) move inwards to the segment's nodes, so that only whole
+  // segments are copied. An empty path when the range is not inside the source or holds no
+  // node.
   ZvPath2f(const ZvPath2f& source, unsigned int first, unsigned int last);
   // A five-point closed polyline starting at corner 2 of the rectangle (defined with ZvRect2f).
   explicit ZvPath2f(const ZvRect2f& rect);
@@ -92,7 +94,11 @@ class ZV_API ZvPath2f : public ZvShape2f {
   ZvShape2f& Transform(const ZvTransfo4& transform) override;
   unsigned int Flatten(const ZvGC& gc, ZvPoint2fArray& points,
                        ZvPointTagArray& tags) const override;
+  // Samples every gc.sampleSpacing pixels of arc length along each subpath. At most kMaxSamples
+  // in one call: a path that would need more (a spacing not above 0, a length that is not
+  // finite) gets none, the arrays keep their sizes and the result is 0.
   unsigned int Sample(const ZvGC& gc, ZvPoint2fArray& points, ZvPointTagArray& tags) const override;
+  static constexpr unsigned int kMaxSamples = 1u << 24;
   int Fill(const ZvGC& gc, ZvRaster<unsigned char>& raster, int (*callback)(),
            const IntBbox2l* box) const override;
   int Fill(const ZvGC& gc, ZvRaster<float>& raster, int (*callback)(),
@@ -119,18 +125,77 @@ class ZV_API ZvPath2f : public ZvShape2f {
   // empty and answers 0.
   unsigned int ReadFromBufferBody(const void* body) override;
 
-  // ---- Editing slots added by paths ---------------------------------------------------------
+  // ---- Editing (in place, under the lock for the whole call) --------------------------------
+  // Every edit keeps the path well formed: the codes parse, closed subpaths stay closed (their
+  // start and last point move together) and G1-locked nodes keep their handles in line. A
+  // refusal answers 0 and changes nothing; so does an index outside the path. An edit that runs
+  // out of memory lets std::bad_alloc through and leaves the path as it was. "Coincide" means
+  // within 1e-7 on each axis in single precision.
+
+  // Moves point `index` to p, dragging what is tied to it. A locked node takes both handles
+  // along by the same delta (the outgoing one is projected back in line if rounding broke the
+  // alignment). A handle beside a locked node turns its partner handle to the opposite side:
+  // with `scale` non-zero the ratio of the two handle lengths is kept, with 0 the partner's
+  // length. The start or last point of a closed subpath moves both.
+  void ReplacePoint(unsigned int index, const ZvPoint2<float>& p, int scale);
+  // Stores p at `index` and nothing else, locks or not.
+  void ReplacePointIgnoringLock(unsigned int index, const ZvPoint2<float>& p);
+  // Sets the handles around `node` to node - v and node + v (at a closed subpath's start or end,
+  // the last handle and the first one). 0 when `node` is not a node, or ends an open subpath.
+  int ReplaceTangentVectorDirections(unsigned int node, const ZvPoint2<float>& v);
+
+  // Replaces the segment holding `index` by the Bezier of `degree` + 1 `points`, whose first and
+  // last must coincide with the segment's ends (else 0). A line or quadratic is refused at a
+  // locked end. The new handles go through ReplacePoint when the old segment had handles of its
+  // own, so a locked neighbour follows them. A degree above 8 answers 1 after cutting the
+  // segment down: a segment of degree 3 or more keeps only its first and last handle and becomes
+  // a cubic on them, a quadratic becomes a line, a line stays. Degree 0 over a segment of zero
+  // length answers 1 and changes nothing. A lone start point has no segment to replace: 0.
   virtual int ReplaceSegment(unsigned int index, const ZvPoint2<float>* points,
                              unsigned int degree);
+  // The section between nodes start < end of one subpath becomes one line. Refused at a locked
+  // node. Replacing the whole of a closed subpath leaves a closing line on its start.
   virtual int ReplaceSubpathSection(unsigned int start, unsigned int end);
+  // The section becomes one cubic with control points c1 and c2 (through ReplacePoint when the
+  // section had points to hold them, so locked ends turn their partners). Locks are not refused.
   virtual int ReplaceSubpathSection(unsigned int start, unsigned int end, const ZvPoint2<float>& c1,
                                     const ZvPoint2<float>& c2);
+  // The section becomes the stretch between nodes first < last of one subpath of `source`, whose
+  // ends must coincide with this section's ends. A locked end needs a handle of its own from the
+  // source (a segment of degree 3 or more on that side), else 0. The end code is made closed or
+  // open to fit this path. Locks this path, then the source.
   virtual int ReplaceSubpathSection(unsigned int start, unsigned int end, const ZvPath2f& source,
                                     unsigned int first, unsigned int last);
+  // Removes the whole subpath holding `index`; the last subpath's openness then follows the new
+  // last subpath.
   virtual int RemoveSubpath(unsigned int index);
+  // Cuts out the section between nodes start < end of one subpath: the subpath is opened (a
+  // closed one is cut open even in its middle) and the locks at both nodes are released. A cut
+  // through the middle leaves two subpaths; a part of a single point vanishes.
   virtual int RemoveSubpathSection(unsigned int start, unsigned int end);
 
+  // ---- Parallel polylines -------------------------------------------------------------------
+  // All points are taken as the vertices of one polygon, whatever their codes: the path counts as
+  // closed when its first and last points agree within 1e-6 per axis, and an open one is wrapped
+  // too (its first vertex takes the edge from the last point). Each vertex moves by exactly the
+  // distance along the normalised sum of the unit normals of its two edges, the normal of an
+  // edge from a to b being (a.y - b.y, b.x - a.x) / |b - a|: to the left of the direction of
+  // travel for a positive distance, in a y-up frame. There is no miter correction, so a corner
+  // lands at the distance from its vertex and not on the offset of its edges. A zero-length edge
+  // has no normal, and where the two normals cancel the vertex stays. The outputs must hold as
+  // many points as this path, and are written by ReplacePoint(k, q, 1); a closed path's last
+  // output point repeats the first. 0, nothing written, when an output holds another number of
+  // points or the path has fewer than 2. Locks this path, then the outputs.
+
+  // `offset` to the left, or to the right when `reverse` is non-zero.
+  int GetSimilarPath(float offset, int reverse, ZvPath2f& output) const;
+  // For a closed polyline: `inward` to the right into `first`, `outward` to the left into
+  // `second`.
+  int GetInwardOutwardPaths(float inward, float outward, ZvPath2f& first, ZvPath2f& second) const;
+
   // ---- Drawing (each appends under the lock) ------------------------------------------------
+  // A segment starts at the path's last point, so on an empty path the segment calls append
+  // nothing: start with Moveto.
   void Moveto(const ZvPoint2<float>& p);  // starts a subpath and marks it open
   void Lineto(const ZvPoint2<float>& p);
   void Curveto(const ZvPoint2<float>& c, const ZvPoint2<float>& end);  // quadratic
@@ -266,12 +331,15 @@ class ZV_API ZvPath2f : public ZvShape2f {
   template <class T>
   int StrokeImp(const ZvGC& gc, ZvRaster<T>& raster) const;
   friend class ZvPath2fMeasure;  // the measuring code reads the arrays directly
+  friend class ZvOval2f;         // its outline is the one built by SetToOvalOutline
   friend ZvShape2f* ZvShape2f_CreateFromBuffer(const void*, std::size_t, unsigned int&);
   // The body reader behind ReadFromBufferBody and the bounded factory.
   unsigned int ReadBody(ZvByteReader& in);
   // Makes room for `count` more points in both arrays, or restores them and rethrows.
   void GrowBoth(unsigned int count);
   void Append(const ZvPoint2<float>* p, unsigned int count, unsigned char firstCode);
+  // Appends a segment of `degree` points; nothing on an empty path.
+  void AppendSegment(const ZvPoint2<float>* p, unsigned int degree);
   unsigned int SubpathStart(unsigned int index) const;
   unsigned int SubpathEnd(unsigned int index) const;
   int IsSubpathBoundary(unsigned int index) const;
@@ -280,7 +348,7 @@ class ZV_API ZvPath2f : public ZvShape2f {
 // A cursor over the subpaths of a path it does not own.
 class ZV_API ZvPath2fIter {
  public:
-  explicit ZvPath2fIter(const ZvPath2f& path) : path(&path), next(0) {}
+  explicit ZvPath2fIter(const ZvPath2f& source) : path(&source), next(0) {}
   // The next subpath's first and last index; 0 when there is none left.
   int GetNextSubPathIndices(unsigned int& first, unsigned int& last);
   void Reset() { next = 0; }

@@ -2,6 +2,11 @@
 //
 // Points are plain values of float or double. Arrays of them are contiguous, so a cubic Bezier is
 // handed around as a pointer to four consecutive points.
+//
+// Coordinates carry no unit of their own. A shape's points become raster pixels through the
+// drawing context's transform (gc.h); in a raster, x grows along a row, y from row to row, and
+// the centre of pixel (i, j) lies at (i + 0.5, j + 0.5). Geometry that tests equality does so
+// within 1e-9 in double and 1e-7 in single precision.
 #ifndef ZV_POINT_H
 #define ZV_POINT_H
 

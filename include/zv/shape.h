@@ -84,7 +84,11 @@ class ZV_API ZvShape2f {
                                ZvPointTagArray& tags) const = 0;
   virtual unsigned int Sample(const ZvGC& gc, ZvPoint2fArray& points,
                               ZvPointTagArray& tags) const = 0;
-  // Rasterising. The callback may end a fill early by answering non-zero.
+  // Rasterising, in the pixels of `raster` after gc.transform (see gc.h). Each overwrites the
+  // pixels it touches with its coverage (full scale: 255, 1.0 or 16384) and leaves the rest
+  // as they were. The callback, called after each row, may end a fill early by answering
+  // non-zero; what is painted stays. Result 1 when the fill ran to its end; 0 when the shape
+  // misses the raster or the callback ended it.
   virtual int Fill(const ZvGC& gc, ZvRaster<unsigned char>& raster, int (*callback)(),
                    const IntBbox2l* box) const = 0;
   virtual int Fill(const ZvGC& gc, ZvRaster<float>& raster, int (*callback)(),
@@ -128,14 +132,16 @@ class ZV_API ZvShape2f {
 ZV_API unsigned int ZvShape2f_GetBufferBodyLengthSize();
 // The kind named by a body; KindNone for an unknown code.
 ZV_API ZvShape2f::Kind ZvShape2f_GetKindFromBufferBody(const void* body);
+// The factories' shapes are new objects owned by the caller, who deletes them.
 // Builds the shape a trusted body describes. `consumed` receives the body bytes read. Null, with
 // `consumed` 0, for an unknown kind, a body its reader refuses or a failed allocation: nothing is
 // thrown.
 ZV_API ZvShape2f* ZvShape2f_CreateFromBufferBody(const void* body, unsigned int& consumed);
 // The same for a whole block of `size` bytes from an untrusted source (a file, the network):
-// the block is refused when its length prefix exceeds `size`, or when its contents would be read
-// past the block's end. On success `consumed` is the size of the whole block, prefix included,
-// so that a caller can step to what follows; on failure null and 0.
+// the block is refused when its length prefix exceeds `size`, when its contents would be read
+// past the block's end, or when it describes a shape that breaks the kind's own rules (for a
+// path: segment codes that do not parse, or lock bits). On success `consumed` is the size of the
+// whole block, prefix included, so that a caller can step to what follows; on failure null and 0.
 ZV_API ZvShape2f* ZvShape2f_CreateFromBuffer(const void* buffer, std::size_t size,
                                              unsigned int& consumed);
 

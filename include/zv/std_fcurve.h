@@ -224,7 +224,9 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   unsigned int GetEvaluatedKeyTgtHandles(double parameter, ZvPoint2<double>& left,
                                          ZvPoint2<double>& right, double tolerance) const;
   // Sets a handle, relative to the key. Refused when it would fold the adjacent segment, or
-  // when the key's tangent direction or length is locked.
+  // when the key's tangent direction or length is locked. Only that handle moves: on a key with
+  // tangent continuity the other handle stays where it was, so the key may stop being smooth
+  // until the host moves the other handle too (or uses SetKeyTgtHandles).
   unsigned int SetKeyTgtHandle(double parameter, KeySide side, const ZvPoint2<double>& handle,
                                double tolerance);
   unsigned int SetKeyTgtHandles(double parameter, const ZvPoint2<double>& left,

@@ -13,6 +13,8 @@
 // (Translate, Scale, Rotate, Shear) post-multiplies: it acts on points before the existing
 // transform, that is in the transform's local frame, and returns the object itself.
 //
+// Angles are degrees, counter-clockwise when y points up (so clockwise on a y-down screen).
+//
 // A plain value: no kind flags, no cached inverse, no lock.
 #ifndef ZV_TRANSFO4_H
 #define ZV_TRANSFO4_H

@@ -12,16 +12,23 @@
 #include <zv/fill.h>
 #include <zv/gc.h>
 #include <zv/matrix.h>
+#include <zv/motion_path.h>
+#include <zv/oval2f.h>
 #include <zv/path2f.h>
+#include <zv/path_builder.h>
 #include <zv/point.h>
 #include <zv/polyline.h>
+#include <zv/quat.h>
+#include <zv/quat_fcurve.h>
 #include <zv/raster.h>
 #include <zv/raw_fcurve.h>
+#include <zv/rect2f.h>
 #include <zv/shape.h>
 #include <zv/spline.h>
 #include <zv/std_fcurve.h>
 #include <zv/step_fcurve.h>
 #include <zv/trace.h>
 #include <zv/transfo4.h>
+#include <zv/vectorizer.h>
 
 #endif

@@ -138,6 +138,32 @@ TEST(ArrayEditing, RemoveShrinksToTheSmallestChainValue) {
   EXPECT_TRUE(a.size == 3 && a.capacity == 4 && a[1] == 7.0);
 }
 
+// A splice gets its block first, from the removals' rule when it shrinks and the doubling rule
+// when it grows, and then moves the elements around the gap without allocating.
+TEST(ArrayEditing, SpliceAllocatesBeforeItMoves) {
+  ZvULongArray a(16);
+  for (unsigned int i = 0; i < 16; ++i)
+    a.Add(i);
+  EXPECT_EQ(a.SpliceBlock(8), nullptr);  // half full stays
+  unsigned int* block = a.SpliceBlock(20);
+  ASSERT_NE(block, nullptr);
+  EXPECT_EQ(a.size, 16u);
+  a.Splice(3, 2, 6, block);  // 3 4 out, a gap of 6: 20 elements in a block of 32
+  ASSERT_TRUE(a.size == 20 && a.capacity == 32 && a.data == block);
+  EXPECT_TRUE(a[2] == 2 && a[9] == 5 && a[19] == 15);
+  a.Splice(0, 13, 0, a.SpliceBlock(7));  // 7 left of 32: halved down to 8
+  ASSERT_TRUE(a.size == 7 && a.capacity == 8);
+  EXPECT_TRUE(a[0] == 9 && a[6] == 15);
+  a.Splice(6, 1, 1, a.SpliceBlock(7));  // in place
+  EXPECT_TRUE(a.size == 7 && a.capacity == 8 && a[5] == 14);
+
+  ZvAltDynArray<double> r(8);
+  for (int i = 0; i < 6; ++i)
+    r.Add(1.0 + i);
+  r.Splice(1, 2, 1, r.SpliceBlock(5));
+  EXPECT_TRUE(r.size == 5 && r[1] == 0.0 && r[2] == 4.0 && r.data[5] == 0.0);
+}
+
 TEST(ArrayEditing, RemoveOnCapacityOneOnlyDropsTheCount) {
   ZvDoubleArray a(1);
   a.Add(42.0);

@@ -1,6 +1,9 @@
 // Point counts, order and positions of cubic and gamma flattening.
 #include <gtest/gtest.h>
+
 #include <zv/bezier_tool.h>
+
+#include <new>
 
 #include <cstring>
 #include <random>
@@ -236,6 +239,16 @@ TEST(FlattenCubic, BadInputEndsWithABoundedPolylineOrNothing) {
   EXPECT_EQ(Flatten(p, -1.0, out), 2u);
   EXPECT_EQ(ZvBezierTool_FlattenCubic2d(nullptr, 1.0, &out, 0), 0u);
   EXPECT_EQ(ZvBezierTool_FlattenCubic2d(p, 1.0, nullptr, 0), 0u);
+  // A cubic near the float range asks for billions of points: refused before anything is added,
+  // as a failed allocation would be, in every form.
+  const ZvPoint2<float> huge[4] = {{0, 0}, {3e37f, 3e38f}, {-3e38f, 1e37f}, {3e38f, -3e38f}};
+  ZvPoint2fArray floats(1);
+  floats.Add(1, 2);
+  EXPECT_THROW(ZvBezierTool_FlattenCubic2f(huge, 0.5, &floats, 1), std::bad_alloc);
+  EXPECT_EQ(floats.size, 1u);
+  const P3 huge3[4] = {{0, 0, 0}, {3e37, 3e38, 1}, {-3e38, 1e37, 2}, {3e38, -3e38, 3}};
+  ZvPoint3dArray spatial(1);
+  EXPECT_THROW(ZvBezierTool_FlattenCubic3d(huge3, 0.5, &spatial, 0), std::bad_alloc);
   // A corrupt gamma piece with an almost empty x range walks at most one unit of u.
   const P2 g[4] = {{0, 1}, {1e-300, -0.5}, {1e-290, 0.5}, {1e-305, 0}};
   EXPECT_LE(ZvBezierTool_FlattenGamma(g, 0.1, &out, 0), 154u);

@@ -211,6 +211,41 @@ TEST(Path2f, RangeConstructorMakesAWellFormedPath) {
   EXPECT_EQ(none.NumPoints(), 0u);
 }
 
+TEST(Path2f, RangeEndsInsideASegmentMoveToItsNodes) {
+  ZvPath2f line;  // Moveto, then a cubic: a range ending on a control point keeps no part of it
+  line.Moveto(P(0, 0));
+  line.Curveto(P(1, 1), P(2, 1), P(3, 0));
+  line.Lineto(P(4, 0));
+  const struct {
+    unsigned int first, last;
+    Codeset codes;
+  } ranges[] = {{0, 2, {1}}, {0, 1, {1}}, {1, 4, {1, 3}},
+                {2, 3, {1}}, {1, 2, {}},  {0, 4, {1, 8, 9, 10, 3}}};
+  for (const auto& r : ranges) {
+    const ZvPath2f part(line, r.first, r.last);
+    EXPECT_EQ(Codes(part), r.codes) << r.first << ".." << r.last;
+    EXPECT_TRUE(PathInvariantHolds(part));
+  }
+  EXPECT_EQ(ZvPath2f(line, 1, 4).GetPoint(0).x, 3.0f);  // the cubic's end node starts the copy
+}
+
+TEST(Path2f, SegmentsNeedAStartPoint) {
+  // On an empty path there is no point for a segment to start from: nothing is appended.
+  ZvPath2f path;
+  const ZvPoint2<float> pts[3] = {P(1, 1), P(2, 2), P(3, 3)};
+  ZvPoint2fArray array;
+  array.Add(pts, 3);
+  path.Lineto(P(1, 1));
+  path.Curveto(P(1, 1), P(2, 2));
+  path.Curveto(P(1, 1), P(2, 2), P(3, 3));
+  path.AltCurveto(pts, 3);
+  path.AltAltCurveto(array, 0, 2);
+  EXPECT_EQ(path.NumPoints(), 0u);
+  path.Moveto(P(0, 0));
+  path.Lineto(P(1, 1));
+  EXPECT_EQ(Codes(path), (Codeset{1, 3}));
+}
+
 TEST(Path2f, CopiesAreIndependentAndSiblingsShareTopology) {
   ZvPath2f path = ThreeSubpaths();
   path.LockG1(6);

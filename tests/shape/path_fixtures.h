@@ -10,6 +10,13 @@ inline ZvPoint2<float> P(float x, float y) {
   return ZvPoint2<float>{x, y};
 }
 
+// Whether two points lie within 1e-7 of each other on each axis, in single precision, as the
+// ends of a closed subpath must.
+inline bool Coincide(const ZvPoint2<float>& a, const ZvPoint2<float>& b) {
+  const float dx = a.x - b.x, dy = a.y - b.y;
+  return dx >= -1e-7f && dx <= 1e-7f && dy >= -1e-7f && dy <= 1e-7f;
+}
+
 // The path's own arrays, reached through a derived class: a pointer to a protected member
 // named through the derived class has the base class's member type.
 struct PathArrays : ZvPath2f {

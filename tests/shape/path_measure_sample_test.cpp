@@ -3,6 +3,8 @@
 #include <zv/gc.h>
 #include <zv/path2f.h>
 
+#include <cmath>
+
 #include "tests/shape/path_fixtures.h"
 
 namespace {
@@ -35,6 +37,42 @@ TEST(PathMeasureSample, EvenSpacingLeavesTheFarEndOut) {
   EXPECT_EQ(2.5f, pts[8].x);
   EXPECT_EQ(0u, ZvPath2f().Sample(gc, pts, tags));
   EXPECT_EQ(9u, pts.size);  // nothing added
+}
+
+TEST(PathMeasureSample, RequestsWithoutEndAreRefusedWhole) {
+  // A spacing that is not positive, a length that is not finite, or more samples than the cap:
+  // nothing is appended (not even the subpaths that could be sampled) and the result is 0.
+  ZvPath2f two = Segment(0, 0, 10, 0);
+  two.Moveto(P(0, 5));
+  two.Lineto(P(3e38f, 5));
+  ZvPath2f far = Segment(0, 0, 10, 0);
+  far.Moveto(P(0, 5));
+  far.Lineto(P(2e7f, 5));
+  const struct {
+    ZvPath2f path;
+    double spacing;
+  } cases[] = {{Segment(0, 0, 10, 0), 0.0},
+               {Segment(0, 0, 10, 0), -1.0},
+               {Segment(0, 0, 10, 0), std::nan("")},
+               {two, 1.0},
+               {far, 1.0}};
+  for (const auto& c : cases) {
+    ZvGC gc;
+    gc.sampleSpacing = c.spacing;
+    ZvPoint2fArray pts;
+    ZvPointTagArray tags;
+    pts.Add(1, 1);
+    tags.Add(ZvPointTag_First);
+    EXPECT_EQ(0u, c.path.Sample(gc, pts, tags)) << c.spacing;
+    EXPECT_EQ(1u, pts.size);
+    EXPECT_EQ(1u, tags.size);
+  }
+  // Just under the cap is sampled.
+  ZvGC gc;
+  ZvPoint2fArray pts;
+  ZvPointTagArray tags;
+  EXPECT_EQ(ZvPath2f::kMaxSamples - 1,
+            Segment(0, 0, ZvPath2f::kMaxSamples - 1, 0).Sample(gc, pts, tags));
 }
 
 TEST(PathMeasureSample, SubpathsAreSampledInTheContextsFrame) {

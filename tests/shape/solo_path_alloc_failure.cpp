@@ -8,6 +8,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cmath>
 #include <functional>
 #include <memory>
 #include <vector>
@@ -243,6 +244,106 @@ TEST(PathAllocFailure, ConstructorsReleaseWhatTheyHold) {
                             threwCleanly);
   EXPECT_GT(failures, 0);
   ASSERT_NE(made, nullptr);
-  EXPECT_EQ(Codes(*made), (std::vector<int>{1, 9, 10, 8, 9, 10}));
+  // Index 4 is a cubic's first control point: the copy starts at that cubic's end node.
+  EXPECT_EQ(Codes(*made), (std::vector<int>{1, 8, 9, 10}));
   delete made;
+}
+
+namespace {
+
+// Paths whose arrays are exactly full (16 points in blocks of 16), so that any insertion needs
+// a larger block and any removal of more than 8 points a smaller one. The first has a locked
+// smooth loop between an open polyline and a longer one; the second a closed 12-gon before an
+// open polyline.
+ZvPath2f FullLoopPath() {
+  ZvPath2f path(1);
+  path.Moveto(P(0, 0));
+  path.Lineto(P(10, 0));
+  path.Lineto(P(10, 10));
+  path.Moveto(P(20, 0));
+  path.Curveto(P(25, -5), P(30, -5), P(35, 0));
+  path.Curveto(P(40, 5), P(15, 5), P(20, 0));
+  path.Closeto();
+  path.LockG1(6);
+  path.Moveto(P(50, 50));
+  for (int i = 1; i <= 5; ++i)
+    path.Lineto(P(50.0f + i, 50.0f + i * i));
+  return path;
+}
+
+ZvPath2f FullPolygonPath() {
+  ZvPath2f path(1);
+  path.Moveto(P(10, 0));
+  for (int i = 1; i < 11; ++i)
+    path.Lineto(P(10 * std::cos(i * 0.5712f), 10 * std::sin(i * 0.5712f)));
+  path.Lineto(P(10, 0));
+  path.Closeto();
+  path.Moveto(P(30, 0));
+  for (int i = 1; i < 4; ++i)
+    path.Lineto(P(30.0f + i, float(i * i)));
+  return path;
+}
+
+struct Edit {
+  const char* name;
+  ZvPath2f (*source)();
+  Step step;
+  bool changes = true;  // replacing a section by itself only allocates its copy
+};
+
+std::vector<Edit> Edits() {
+  static const ZvPoint2<float> octic[9] = {P(0, 0), P(1, 1), P(2, 2), P(3, 3), P(4, 4),
+                                           P(5, 5), P(6, 6), P(7, 7), P(10, 0)};
+  static const ZvPoint2<float> quartic[5] = {P(20, 0), P(22, -6), P(25, -7), P(31, -6), P(35, 0)};
+  static const ZvPath2f stretch = [] {
+    ZvPath2f s;
+    s.Moveto(quartic[0]);
+    s.AltCurveto(quartic + 1, 4);
+    return s;
+  }();
+  return {
+      {"ReplaceSegment grows", FullLoopPath, [](ZvPath2f& p) { p.ReplaceSegment(1, octic, 8); }},
+      {"ReplaceSegment beside a lock", FullLoopPath,
+       [](ZvPath2f& p) { p.ReplaceSegment(4, quartic, 4); }},
+      {"ReplaceSubpathSection cubic", FullLoopPath,
+       [](ZvPath2f& p) { p.ReplaceSubpathSection(0, 2, P(1, 5), P(9, 5)); }},
+      {"ReplaceSubpathSection stretch", FullLoopPath,
+       [](ZvPath2f& p) { p.ReplaceSubpathSection(3, 6, stretch, 0, 4); }},
+      {"ReplaceSubpathSection from itself", FullLoopPath,
+       [](ZvPath2f& p) { p.ReplaceSubpathSection(3, 6, p, 3, 6); }, false},
+      {"ReplaceSubpathSection line shrinks", FullPolygonPath,
+       [](ZvPath2f& p) { p.ReplaceSubpathSection(0, 11); }},
+      {"RemoveSubpathSection shrinks", FullPolygonPath,
+       [](ZvPath2f& p) { p.RemoveSubpathSection(0, 9); }},
+      {"RemoveSubpath shrinks", FullPolygonPath, [](ZvPath2f& p) { p.RemoveSubpath(3); }},
+      {"GetSimilarPath", FullPolygonPath,
+       [](ZvPath2f& p) {
+         const ZvPath2f source(p);
+         source.GetSimilarPath(2.0f, 0, p);
+       }},
+  };
+}
+
+}  // namespace
+
+// Every allocation an edit makes comes before its first change: a failure at any of them lets
+// std::bad_alloc through and leaves the path exactly as it was, lock bits included.
+TEST(PathAllocFailure, FailedEditsLeaveThePathAsItWas) {
+  for (const Edit& edit : Edits()) {
+    const ZvPath2f source = edit.source();
+    ASSERT_EQ(PathArrays::Points(source).capacity, PathArrays::Points(source).size) << edit.name;
+    ZvPath2f expected(source);
+    edit.step(expected);
+    ASSERT_EQ(Snapshot(expected) == Snapshot(source), !edit.changes) << edit.name;
+    const State entry = Snapshot(source);
+    std::unique_ptr<ZvPath2f> path;
+    const int failures = ForEachFailureOnCopy(source, path, edit.step, [&](bool threw) {
+      EXPECT_TRUE(threw) << edit.name;
+      EXPECT_TRUE(Snapshot(*path) == entry) << edit.name;
+      EXPECT_TRUE(PathInvariantHolds(*path)) << edit.name;
+      EXPECT_EQ(path->GetLockCount(), 0u) << edit.name;
+    });
+    EXPECT_GT(failures, 0) << edit.name;
+    EXPECT_TRUE(Snapshot(*path) == Snapshot(expected)) << edit.name;
+  }
 }

@@ -11,8 +11,10 @@ namespace zv_test {
 
 inline long g_countdown = -1;  // allocations left before the failure; -1 when disarmed
 inline bool g_fired = false;
+inline void (*g_observer)(std::size_t) = nullptr;  // sees the size of every allocation
 
 inline void* Allocate(std::size_t n) {
+  if (g_observer) g_observer(n);
   if (g_countdown == 0) {
     g_countdown = -1;
     g_fired = true;

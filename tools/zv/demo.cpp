@@ -61,6 +61,10 @@ ZvRaster<unsigned char> ZvRenderDemo() {
   }
   o.opacity = 1.0;
   o.rate = 8;
+  // Right: a soft-filled circle, its edge faded inwards over 16 pixels.
+  o.soft = 16;
+  Draw(Circle(565, 205, 28), o, r);
+  o.soft = 0;
   // Bottom: a zigzag stroked with miter, round and bevel joins and flat, round and square caps.
   o.fill = false;
   o.strokeWidth = 14;

@@ -2,13 +2,18 @@
 //
 //   zv render [options] [FILE]   SVG path data from FILE (or standard input) to a PNG
 //   zv demo [-o FILE]            the built-in scene
+//   zv fit [options] [FILE]      pen points through a path builder, out as SVG path data
+//   zv trace [options] PNG       a PNG's dark regions traced into an SVG path
 //
 // Every failure is one line on standard error and a non-zero exit: 1 for bad input or output,
 // 2 for a bad command line.
 #include "demo.h"
+#include "fit.h"
+#include "offset.h"
 #include "png_write.h"
 #include "render.h"
 #include "svg_path.h"
+#include "trace.h"
 
 #include <cerrno>
 #include <cmath>
@@ -25,6 +30,7 @@ namespace {
 const char kUsage[] =
     "usage: zv render [options] [FILE]   render SVG path data (FILE or standard input)\n"
     "       zv demo [-o FILE]            render the built-in scene (default zv-demo.png)\n"
+    "       zv trace [options] PNG       trace a PNG's dark regions into an SVG path\n"
     "render options:\n"
     "  -o, --output FILE        PNG to write (required)\n"
     "  --size WxH               raster size in pixels (default 256x256)\n"
@@ -35,9 +41,30 @@ const char kUsage[] =
     "  --rate 4|8               antialiasing sub-samples per pixel side (default 8)\n"
     "  --feather R              feather radius in sub-samples, 0..rate (default 0)\n"
     "  --opacity A              fill opacity (default 1)\n"
+    "  --soft W                 soft fill: the edge blurred inwards over W pixels (default 0)\n"
     "  --stroke W               stroke with line width W pixels (default 0: no stroke)\n"
     "  --join miter|round|bevel --cap flat|round|square --miter-limit M --taper\n"
-    "  --invert                 dark shapes on white\n";
+    "  --tolerance T            fill curves to within T pixels (default 0.05); below 0.25 the\n"
+    "                           tool flattens curves itself: about 15% more time on a 64 px\n"
+    "                           icon, 1% at 1024 px\n"
+    "  --offset D               also draw the parallel polylines D units to each side\n"
+    "  --invert                 dark shapes on white\n"
+    "usage: zv fit [options] [FILE]      pen points ('x y [pressure]' a line; FILE or standard\n"
+    "                                    input) fed one by one to a path builder, out as SVG\n"
+    "                                    path data\n"
+    "fit options:\n"
+    "  -o, --output FILE        path data to write (default standard output)\n"
+    "  --builder linear|cubic|fit  the builder (default fit: least-squares cubics)\n"
+    "  --tolerance E            fit error in pixels (default 1)\n"
+    "  --close                  close the subpath\n"
+    "  --at-end                 commit once at the end, not after every point (fewer segments)\n"
+    "  --png FILE --size WxH    also draw the points and the path (default 512x512)\n"
+    "trace options:\n"
+    "  -o, --output FILE        SVG to write (default: standard output)\n"
+    "  --threshold N            grey values below N are dark (default 128)\n"
+    "  --invert                 trace the light regions instead\n"
+    "  --fit TOL                fit cubics within TOL pixels (default: exact pixel edges)\n"
+    "  --min-area A             drop contours enclosing less than A square pixels\n";
 
 struct UsageError {
   std::string message;
@@ -121,6 +148,7 @@ int Render(Args& args) {
   std::string input, output;
   int width = 256, height = 256;
   bool invert = false;
+  double offset = 0.0;
   while (args.More()) {
     const std::string a = args.Next();
     if (a == "-o" || a == "--output") {
@@ -147,6 +175,9 @@ int Render(Args& args) {
       o.feather = Integer(a, args.Value(a), 0, 8);
     } else if (a == "--opacity") {
       o.opacity = Number(a, args.Value(a));
+    } else if (a == "--soft") {
+      o.soft = Number(a, args.Value(a));
+      if (o.soft < 0 || o.soft > 256) throw UsageError{"option --soft expects 0 to 256 pixels"};
     } else if (a == "--stroke") {
       o.strokeWidth = Number(a, args.Value(a));
     } else if (a == "--join") {
@@ -157,8 +188,13 @@ int Render(Args& args) {
       o.miterLimit = Number(a, args.Value(a));
     } else if (a == "--taper") {
       o.taper = true;
+    } else if (a == "--tolerance") {
+      o.tolerance = Number(a, args.Value(a));
+      if (o.tolerance < 0.001) throw UsageError{"option --tolerance expects at least 0.001"};
     } else if (a == "--invert") {
       invert = true;
+    } else if (a == "--offset") {
+      offset = Number(a, args.Value(a));
     } else if (a.size() > 1 && a[0] == '-') {
       throw UsageError{"unknown option '" + a + "'"};
     } else if (input.empty()) {
@@ -189,6 +225,7 @@ int Render(Args& args) {
   }
   ZvRaster<unsigned char> raster(width, height, 0);
   ZvRenderPath(path, o, raster);
+  if (offset != 0.0) ZvRenderParallelPolylines(path, o, offset, raster);
   if (invert)
     for (int i = 0; i < raster.GetSize(); ++i)
       raster.SetVal(i, static_cast<unsigned char>(255 - raster.GetVal(i)));
@@ -202,6 +239,8 @@ int main(int argc, char** argv) {
   try {
     if (command == "render") return Render(args);
     if (command == "demo") return Demo(args);
+    if (command == "fit") return ZvFitCommand(argc, argv);
+    if (command == "trace") return ZvTraceCommand(argc - 2, argv + 2);
     if (command == "help" || command == "--help" || command == "-h") {
       std::cout << kUsage;
       return 0;

@@ -1,6 +1,7 @@
 #include "render.h"
 
 #include <zv/gc.h>
+#include <zv/transfo4.h>
 
 #include <algorithm>
 #include <vector>
@@ -18,6 +19,26 @@ ZvPath2f ClosedCopy(const ZvPath2f& path) {
   for (auto i = lasts.rbegin(); i != lasts.rend(); ++i)
     closed.CloseSubpath(*i);
   return closed;
+}
+
+// The fills' own flattening goes no finer than this many pixels.
+constexpr double kFillTolerance = 0.25;
+
+// The path mapped by `transform` and flattened at `tolerance` into a polygon per subpath.
+ZvPath2f FlattenedCopy(const ZvPath2f& path, const ZvTransfo4& transform, double tolerance) {
+  ZvPoint2dArray points;
+  ZvPointTagArray tags;
+  path.TransformAndFlattenPath(transform, tolerance, points, tags);
+  ZvPath2f polygon;
+  for (unsigned int i = 0; i < points.size; ++i) {
+    const ZvPoint2<float> p{static_cast<float>(points[i].x), static_cast<float>(points[i].y)};
+    if (tags[i] == ZvPointTag_First)
+      polygon.Moveto(p);
+    else
+      polygon.Lineto(p);
+    if (tags[i] == ZvPointTag_Last) polygon.CloseSubpath(polygon.NumPoints() - 1);
+  }
+  return polygon;
 }
 
 void KeepMaximum(ZvRaster<unsigned char>& into, const ZvRaster<unsigned char>& layer) {
@@ -45,7 +66,17 @@ void ZvRenderPath(const ZvPath2f& path, const ZvRenderOptions& options,
   gc.flattenTolerance = 0.25;
   ZvRaster<unsigned char> layer(raster.GetWidth(), raster.GetHeight(), 0);
   if (options.fill) {
-    ClosedCopy(path).AAFill(gc, layer, nullptr, nullptr);
+    gc.featherInner = options.soft;
+    // Below the fills' own flattening the tool flattens the path itself, in pixels.
+    const bool fine = options.tolerance < kFillTolerance;
+    ZvGC device(gc);
+    if (fine) device.transform = ZvTransfo4();
+    const ZvPath2f closed =
+        fine ? FlattenedCopy(ClosedCopy(path), gc.transform, options.tolerance) : ClosedCopy(path);
+    if (options.soft > 0)
+      closed.SoftFill(device, layer, nullptr);
+    else
+      closed.AAFill(device, layer, nullptr, nullptr);
     KeepMaximum(raster, layer);
   }
   if (options.strokeWidth > 0) {

@@ -19,6 +19,13 @@ struct ZvRenderOptions {
   int cap = 2;               // 0 round, 1 square, 2 flat
   double miterLimit = 4.0;
   bool taper = false;
+  // Soft fill: the edge blurred over this many pixels with the built-in feather profile, faded
+  // inwards (0: the antialiased fill).
+  double soft = 0.0;
+  // Chord tolerance of the fill's curves, in pixels. The library's fills flatten no finer than
+  // 0.25 px, which shaves visible area off curved edges; below that the tool flattens the path
+  // itself and fills the polygon.
+  double tolerance = 0.05;
 };
 
 // Draws the fill (every subpath closed, as SVG fills do) and then the stroke of `path` into

@@ -1,9 +1,12 @@
 // A recursive-descent reader of SVG path data.
 #include "svg_path.h"
 
+#include "svg_arc.h"
+
 #include <cctype>
 #include <cmath>
 #include <cstdlib>
+#include <vector>
 
 namespace {
 using P = ZvPoint2<float>;
@@ -76,6 +79,38 @@ class Reader {
     return true;
   }
 
+  // An arc flag is one character, 0 or 1, so "0010" is two flags and a number.
+  bool Flag(bool& v, std::string& error) {
+    SkipSpace();
+    if (pos < s.size() && (s[pos] == '0' || s[pos] == '1')) {
+      v = s[pos++] == '1';
+      return true;
+    }
+    if (pos == s.size()) return Fail("ends in the middle of a command", error);
+    return Fail(std::string("expects an arc flag (0 or 1), not '") + s[pos] + "'", error);
+  }
+
+  bool Arc(bool rel, P& e, std::string& error) {
+    float rx = 0, ry = 0, degrees = 0;
+    bool large = false, sweep = false;
+    if (!Number(rx, error) || !Number(ry, error) || !Number(degrees, error) ||
+        !Flag(large, error) || !Flag(sweep, error) || !Point(e, rel, error))
+      return false;
+    if (rx == 0 || ry == 0) {
+      if (!(e.x == current.x && e.y == current.y)) path.Lineto(e);
+      return true;
+    }
+    std::vector<ZvPoint2<double>> c;
+    const int n =
+        ZvSvgArcToCubics({current.x, current.y}, rx, ry, degrees, large, sweep, {e.x, e.y}, c);
+    auto f = [](const ZvPoint2<double>& q) {
+      return P{static_cast<float>(q.x), static_cast<float>(q.y)};
+    };
+    for (int i = 0; i < n; ++i)
+      path.Curveto(f(c[3 * i]), f(c[3 * i + 1]), i + 1 == n ? e : f(c[3 * i + 2]));
+    return true;
+  }
+
   bool Point(P& p, bool relative, std::string& error) {
     if (!Number(p.x, error) || !Number(p.y, error)) return false;
     if (relative) p = p + current;
@@ -144,8 +179,8 @@ class Reader {
         e = start;
         break;
       case 'A':
-        --pos;
-        return Fail("has an arc (A), which zv does not draw", error);
+        if (!Arc(rel, e, error)) return false;
+        break;
       default:
         --pos;
         return Fail(std::string("has an unknown command '") + command + "'", error);

@@ -1,0 +1,105 @@
+// Motion paths under allocation failure. A test-only global operator new throws on the k-th
+// allocation after it is armed; each operation runs for k = 0, 1, 2, ... until it completes
+// without the failure firing. The block reader reports a null path and a count of 0; an edit
+// lets std::bad_alloc through with the path exactly as it was; evaluation lets it through with
+// the path still answering the same. Every time the lock must have been released, which a
+// second thread checks. Under AddressSanitizer, leak detection catches what a failure leaves.
+#include <zv/motion_path.h>
+
+#include <gtest/gtest.h>
+
+#include <chrono>
+#include <functional>
+#include <future>
+
+#include "motion_fixtures.h"
+#include "tests/support/failing_allocator.h"
+
+using zv_test::Arm;
+using zv_test::Disarm;
+
+namespace {
+
+// Another thread can take the path's lock, so no failure left it held.
+bool Unlocked(const ZvMotionPath3d& path) {
+  auto probe = std::async(std::launch::async, [&path] { return path.NumPoints(); });
+  return probe.wait_for(std::chrono::seconds(10)) == std::future_status::ready;
+}
+
+// Runs `edit` on copies of `start` with the k-th allocation failing, for every k until it
+// succeeds; a failed run must leave the copy's block as it was.
+void EveryFailure(const ZvMotionPath3d& start, const std::function<void(ZvMotionPath3d&)>& edit) {
+  const Bytes before = Block(start);
+  for (long k = 0; k < 10000; ++k) {
+    ZvMotionPath3d path(start);
+    bool threw = false;
+    Arm(k);
+    try {
+      edit(path);
+    } catch (const std::bad_alloc&) {
+      threw = true;
+    }
+    const bool fired = Disarm();
+    ASSERT_EQ(threw, fired) << k;
+    ASSERT_TRUE(Unlocked(path)) << k;
+    if (!fired) return;
+    ASSERT_EQ(Block(path), before) << k;
+  }
+  FAIL() << "never completed";
+}
+
+}  // namespace
+
+TEST(MotionAllocFailure, EditsLeaveThePathAsItWas) {
+  const ZvMotionPath3d wave = Wave();
+  EveryFailure(wave, [](ZvMotionPath3d& p) { p.Curveto({1, 2, 3}, {4, 5, 6}, {7, 8, 9}, 9.0); });
+  EveryFailure(wave, [](ZvMotionPath3d& p) { p.Lineto({1, 2, 3}, 9.0); });
+  EveryFailure(wave, [](ZvMotionPath3d& p) {
+    p.PreCurveto({1, 2, 3}, {4, 5, 6}, {7, 8, 9}, -1.0);
+  });
+  EveryFailure(wave, [](ZvMotionPath3d& p) { p.PreLineto({1, 2, 3}, -1.0); });
+  EveryFailure(wave, [](ZvMotionPath3d& p) {
+    unsigned int index;
+    int existing;
+    p.InsertNode(1.5, 0.01, 0.01, index, existing);
+  });
+  EveryFailure(wave, [](ZvMotionPath3d& p) { p.ScaleAndOffsetInitialTimes(2.0, 1.0); });
+  EveryFailure(wave, [](ZvMotionPath3d& p) { p.SmoothSegment(3); });
+}
+
+TEST(MotionAllocFailure, EvaluationAndReadingRecover) {
+  const ZvMotionPath3d wave = Wave();
+  P3 want;
+  wave.Eval(1.7, 0.01, want);
+  for (long k = 0;; ++k) {
+    ZvMotionPath3d path(wave);
+    Arm(k);
+    P3 got{};
+    try {
+      path.Eval(1.7, 0.01, got);
+    } catch (const std::bad_alloc&) {
+    }
+    if (!Disarm()) break;
+    ASSERT_TRUE(Unlocked(path));
+    path.Eval(1.7, 0.01, got);
+    ASSERT_EQ(got.x, want.x) << k;
+    ASSERT_EQ(got.z, want.z) << k;
+  }
+
+  const Bytes block = Block(wave);
+  for (long k = 0;; ++k) {
+    unsigned int consumed = 99;
+    Arm(k);
+    ZvMotionPath3d* read = ZvMotionPath3d_CreateFromBufferBody(
+        block.data() + 4, static_cast<unsigned int>(block.size() - 4), consumed);
+    const bool fired = Disarm();
+    if (!fired) {
+      ASSERT_NE(read, nullptr);
+      EXPECT_EQ(Block(*read), block);
+      delete read;
+      break;
+    }
+    EXPECT_EQ(read, nullptr) << k;
+    EXPECT_EQ(consumed, 0u) << k;
+  }
+}
