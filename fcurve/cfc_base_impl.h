@@ -12,6 +12,10 @@
 
 #include "fcurve/cfc_key_search.h"
 
+// Most samples one resampling makes (2^20): a million keys is already more than a curve
+// editor draws, and each costs a key insertion.
+constexpr double kCFCMaxResampledKeys = 1048576.0;
+
 template <class T, class Key, class Store>
 class CFCBaseImpl : public CFCKeySearch<T, Key, Store> {
  public:
@@ -127,6 +131,7 @@ class CFCBaseImpl : public CFCKeySearch<T, Key, Store> {
     if (n == 1 && !zvIsSameParameter(keys[0].parameter, parameter)) {
       return CreateKey(parameter, value, curve);
     }
+    if (!this->FitsBetweenMergeBounds(left, right, parameter)) return 0;
     const bool inherit = keepAttributes && right - left > 1;
     unsigned short donorFlags = 0;
     CFCUserDataSet donorData;
@@ -304,7 +309,8 @@ class CFCBaseImpl : public CFCKeySearch<T, Key, Store> {
     unsigned int previous;
     if (zvIsSameParameter(start, end)) return impl.CreateNonModifyingKey(start, previous, curve);
     const double quotient = std::floor((end - start) / step);
-    if (!(quotient > -2147483648.0 && quotient < 2147483648.0)) return 0;
+    // Every sample can become a key: more than the cap are refused before any is made.
+    if (!(std::fabs(quotient) <= kCFCMaxResampledKeys)) return 0;
     const long count = static_cast<long>(quotient);
     impl.CreateNonModifyingKey(start, previous, curve);
     for (long i = 1; i <= count; ++i) {

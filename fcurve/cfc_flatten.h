@@ -29,6 +29,10 @@ namespace cfc_flatten {
 
 // More periods than this in one range would only draw a solid band; the range is refused.
 constexpr double kMaxCycles = 1e6;
+// Most keys, counted once per period, that one cyclic range draws.
+constexpr double kMaxRepeatedKeys = 16777216.0;
+// Most samples one EvalSequence gives; more are refused rather than allocated.
+constexpr double kMaxSamples = 16777216.0;
 // A value change at one parameter larger than this is drawn as a jump.
 constexpr double kJumpEpsilon = 1e-15;
 
@@ -172,9 +176,14 @@ class Assembler {
     const double period = xn - x0;
     const double kFirst = std::floor((pa - x0) / period), kLast = std::floor((pb - x0) / period);
     if (!(kLast - kFirst <= kMaxCycles)) return false;
+    // Each period repeats every key: the repeated keys are bounded too, so that the output is.
+    if (!((kLast - kFirst + 1.0) * s.keys.size <= kMaxRepeatedKeys)) return false;
     const double delta =
         s.extrapolation == ZvBaseFCurve::CycleWithOffsetExtrapolation ? s.CycleOffset(false) : 0.0;
-    for (double k = kFirst; k <= kLast; k += 1.0) {
+    // Counted in integers: far from the keys k + 1 can round back to k.
+    const long count = static_cast<long>(kLast - kFirst);
+    for (long c = 0; c <= count; ++c) {
+      const double k = kFirst + static_cast<double>(c);
       const double dx = k * period;
       double lo = pa - dx, hi = pb - dx;
       if (lo < x0) lo = x0;
@@ -462,7 +471,7 @@ namespace cfc_flatten {
 class Sampler : public PolylineSink {
  public:
   Sampler(double start, double end, double step, ZvDoubleArray& parameters, ZvDoubleArray& values)
-      : t(start), end(end), step(step), parameters(parameters), values(values) {}
+      : t(start), start(start), end(end), step(step), parameters(parameters), values(values) {}
 
   void Take(const ZvPoint2dArray& points, unsigned int from) override {
     for (unsigned int j = from; j < points.size; ++j) {
@@ -474,7 +483,7 @@ class Sampler : public PolylineSink {
           } else {
             Add(t, previous.y + (t - previous.x) * (q.y - previous.y) / (q.x - previous.x));
           }
-          t += step;
+          Advance();
         }
       }
       previous = q;
@@ -484,7 +493,7 @@ class Sampler : public PolylineSink {
 
   // The samples beyond the last point, and the last sample at the end.
   void Close() {
-    for (; end > t; t += step)
+    for (; end > t; Advance())
       Add(t, previous.y);
     Add(end, previous.y);
   }
@@ -497,8 +506,13 @@ class Sampler : public PolylineSink {
     values.Add(v);
   }
 
+  // Sample i lies at start + i * step: a running sum would stall where step is below the
+  // spacing of doubles near t.
+  void Advance() { t = start + static_cast<double>(++index) * step; }
+
   double t;
-  const double end, step;
+  const double start, end, step;
+  unsigned long index = 0;
   ZvDoubleArray& parameters;
   ZvDoubleArray& values;
   ZvPoint2<double> previous{0.0, 0.0};
@@ -522,6 +536,7 @@ unsigned int CFCEvalSequence(const Impl& s, double start, double end, double ste
     values.Add(s.EvalRightUsingExtrapolationMethod(start));
   } else {
     const double lo = start < end ? start : end, hi = start < end ? end : start;
+    if (!((hi - lo) / step <= cfc_flatten::kMaxSamples)) return 0;
     const ZvExtent2<double> box(lo, -DBL_MAX, hi, DBL_MAX);
     ZvPoint2dArray points(128);
     ZvPointTagArray tags(128);

@@ -225,7 +225,7 @@ ZvBaseFCurve* ZvQuatFCurve::SnapShot(double start, double end, ExtrapolationMeth
 
 unsigned int ZvQuatFCurve::ResampleSequence(double start, double end, double step,
                                             int keepExistingKeys, int) {
-  if (!(step > 0.0)) return 0;
+  if (!(step > 0.0) || !std::isfinite(start) || !std::isfinite(end)) return 0;
   ZvFCurveLockGuard hold(*this);
   if (m_curve->IsReadOnly()) return 0;
   // Samples of the rotation across the interval, the existing keys marked among them.
@@ -236,7 +236,9 @@ unsigned int ZvQuatFCurve::ResampleSequence(double start, double end, double ste
   };
   std::vector<Sample> samples;
   const double count = std::ceil((end - 1e-6 - start) / step);
-  if (count > 2147483647.0) return 0;
+  // Every sample becomes a key: beyond 2^20 of them, as on the other kinds, the call is refused
+  // before any is made.
+  if (count > 1048576.0) return 0;
   for (long i = 0; i < count; ++i) {
     const double t = start + static_cast<double>(i) * step;
     samples.push_back({t, m_curve->Eval(t), false});

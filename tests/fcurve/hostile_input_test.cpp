@@ -1,0 +1,171 @@
+// Curves under extreme arguments: an operation that cannot keep the keys strictly increasing
+// and finite refuses and leaves the curve as it was, and nothing runs or allocates without
+// bound.
+#include <zv/raw_fcurve.h>
+#include <zv/std_fcurve.h>
+#include <zv/step_fcurve.h>
+#include <zv/transfo4.h>
+
+#include <gtest/gtest.h>
+
+#include <cfloat>
+#include <cmath>
+#include <limits>
+#include <memory>
+#include <vector>
+
+namespace {
+
+const double kNaN = std::numeric_limits<double>::quiet_NaN();
+const double kInf = std::numeric_limits<double>::infinity();
+
+std::vector<double> KeysOf(const ZvBaseFCurve& c) {
+  ZvDoubleArray p;
+  c.GetAllKeyParameters(p);
+  return std::vector<double>(p.data, p.data + p.size);
+}
+
+// Fresh curves of every single-value kind with keys at the given parameters.
+std::vector<std::unique_ptr<ZvBaseFCurve>> AllKinds(const std::vector<double>& at) {
+  std::vector<std::unique_ptr<ZvBaseFCurve>> curves;
+  curves.emplace_back(new ZvStdFCurve());
+  curves.emplace_back(new ZvRawFCurve());
+  curves.emplace_back(new ZvIntegerFCurve());
+  curves.emplace_back(new ZvBooleanFCurve());
+  for (auto& c : curves) {
+    for (size_t i = 0; i < at.size(); ++i)
+      EXPECT_EQ(c->CreateKey(at[i], static_cast<double>(i % 2)), 1u);
+  }
+  return curves;
+}
+
+// Runs `op` on every kind and expects it to be refused with the keys untouched.
+template <class Op>
+void ExpectRefusedUnchanged(const std::vector<double>& at, Op op) {
+  for (auto& c : AllKinds(at)) {
+    SCOPED_TRACE(c->GetKind());
+    EXPECT_EQ(op(*c), 0u);
+    EXPECT_EQ(KeysOf(*c), at);
+  }
+}
+
+TEST(HostileCurveInput, MergeNeverBreaksKeyOrder) {
+  ExpectRefusedUnchanged(
+      {0, 10}, [](ZvBaseFCurve& c) { return c.MergeAndCreateKey(10, 15, 10, 1, 1, 0, 0); });
+  ExpectRefusedUnchanged(
+      {0, 10}, [](ZvBaseFCurve& c) { return c.MergeAndCreateKey(12, 20, 5, 1, 0, 0, 0); });
+  ExpectRefusedUnchanged(
+      {0, 10}, [](ZvBaseFCurve& c) { return c.MergeAndCreateKey(2, 8, kNaN, 1, 0, 0, 0); });
+  // A merge that keeps the order still works on every kind.
+  for (auto& c : AllKinds({0, 10, 20})) {
+    EXPECT_EQ(c->MergeAndCreateKey(5, 25, 15, 1, 0, 0, 0), 1u);
+    EXPECT_EQ(KeysOf(*c), (std::vector<double>{0, 15}));
+  }
+}
+
+TEST(HostileCurveInput, CutNeverLeavesEqualKeys) {
+  {
+    ZvStdFCurve c(-30, -40, 15, 32), out;
+    const std::vector<double> before = KeysOf(c);
+    c.Cut(-30, 14.999999999999998, out);
+    const std::vector<double> k = KeysOf(c);
+    for (size_t i = 1; i < k.size(); ++i)
+      EXPECT_LT(k[i - 1], k[i]);
+    EXPECT_EQ(c.IsValid(), 1u);
+  }
+  for (auto& c : AllKinds({1, 2})) {
+    std::unique_ptr<ZvBaseFCurve> out(c->Clone());
+    c->Cut(-62.5, 0.99999999999999989, *out);
+    const std::vector<double> k = KeysOf(*c);
+    for (size_t i = 1; i < k.size(); ++i)
+      EXPECT_LT(k[i - 1], k[i]) << c->GetKind();
+  }
+}
+
+TEST(HostileCurveInput, WholeCurveMovesRefuseToMergeOrOverflowKeys) {
+  ExpectRefusedUnchanged({0, 1}, [](ZvBaseFCurve& c) { return c.ShiftParameters(1e300); });
+  ExpectRefusedUnchanged({1, 2}, [](ZvBaseFCurve& c) { return c.ScaleParameterAxis(1e308); });
+  ExpectRefusedUnchanged({1, 1.1}, [](ZvBaseFCurve& c) { return c.ScaleParameterAxis(5e-324); });
+  ExpectRefusedUnchanged({0, 1, 1e17}, [](ZvBaseFCurve& c) { return c.MirrorParameters(); });
+  ExpectRefusedUnchanged({DBL_MAX / 2, DBL_MAX},
+                         [](ZvBaseFCurve& c) { return c.MirrorParameters(); });
+}
+
+TEST(HostileCurveInput, KeyReductionReturnsNearTheLargestDouble) {
+  for (auto& c : AllKinds({DBL_MAX / 4, DBL_MAX / 2, DBL_MAX * 0.75, DBL_MAX})) {
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    c->ReduceNumKeys(-DBL_MAX, DBL_MAX, 0.5);
+    c->ReduceNumKeys(DBL_MAX / 3, DBL_MAX, 1e300);
+    const std::vector<double> k = KeysOf(*c);
+    for (size_t i = 1; i < k.size(); ++i)
+      EXPECT_LT(k[i - 1], k[i]);
+  }
+}
+
+TEST(HostileCurveInput, CycleSamplingOverTooManyPeriodsIsRefused) {
+  for (auto& c : AllKinds({2, 4, 15})) {
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    ZvExtent2<double> box;
+    box.AddPoint(ZvPoint2<double>{0, -10});
+    box.AddPoint(ZvPoint2<double>{1e18, 10});
+    ZvTransfo4 id;
+    ZvPoint2dArray points;
+    ZvPointTagArray tags;
+    ZvBoolArray extrapolated;
+    EXPECT_EQ(c->FlattenFromTo(box, id, 0.01, points, tags, extrapolated, 0), 0u);
+    EXPECT_EQ(points.size, 0u);
+    ZvDoubleArray params, values;
+    EXPECT_EQ(c->EvalSequence(0, 1e18, 1e12, 0.01, params, values, 0), 0u);
+    EXPECT_EQ(c->EvalSequence(0, 100, 1e-12, 0.01, params, values, 0), 0u);
+  }
+}
+
+TEST(HostileCurveInput, ResamplingIsBoundedByTheKeyCap) {
+  for (auto& c : AllKinds({0, 1e6})) {
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    EXPECT_EQ(c->ResampleSequence(0, 1e6, 1e-13, 0, 0), 0u);
+    EXPECT_EQ(c->ResampleSequence(0, 4.29e9, 1e-3, 0, 0), 0u);
+    EXPECT_EQ(KeysOf(*c), (std::vector<double>{0, 1e6}));
+    EXPECT_EQ(c->ResampleSequence(0, 1e6, 1e5, 0, 0), 1u);
+    EXPECT_EQ(c->GetNumKeys(), 11u);
+  }
+}
+
+TEST(HostileCurveInput, NonFiniteParametersAreNeverStored) {
+  ZvStdFCurve a(kNaN, 1, 2, 3);
+  EXPECT_EQ(a.GetNumKeys(), 0u);
+  ZvStdFCurve b(0, 1, kInf, 3);
+  EXPECT_EQ(b.GetNumKeys(), 0u);
+  ZvStdFCurve d(kNaN, 1.0, 1.0, ZvBaseFCurve::CubicSegment);
+  EXPECT_EQ(d.GetNumKeys(), 0u);
+  ZvRawFCurve r(kInf, 1.0);
+  EXPECT_EQ(r.GetNumKeys(), 0u);
+  ZvRawFCurve r2(0, 1, kNaN, 2);
+  EXPECT_EQ(r2.GetNumKeys(), 0u);
+  for (auto& c : AllKinds({0, 1})) {
+    EXPECT_EQ(c->CreateKey(kNaN, 0), 0u);
+    EXPECT_EQ(c->CreateKey(-kInf, 0), 0u);
+    EXPECT_EQ(c->CreateNonModifyingKey(kInf, 1), 0u);
+    EXPECT_EQ(c->ShiftParameters(kInf), 0u);
+    EXPECT_EQ(KeysOf(*c), (std::vector<double>{0, 1}));
+  }
+}
+
+TEST(HostileCurveInput, KeyQueriesAtNaNFindNoKey) {
+  for (auto& c : AllKinds({0, 1, 2})) {
+    SCOPED_TRACE(c->GetKind());
+    unsigned int index = 7;
+    EXPECT_EQ(c->GetKeyIndex(kNaN, index), 0u);
+    double p = kNaN, v;
+    EXPECT_EQ(c->IsKeyParameter(kNaN, 1.0), 0u);
+    EXPECT_EQ(c->GetNearestKeyParameter(kNaN, p), 0u);
+    EXPECT_EQ(c->GetNextKeyParameter(kNaN, p, 1), 0u);
+    EXPECT_EQ(c->GetPrevKeyParameter(kNaN, p, 1), 0u);
+    EXPECT_EQ(c->GetKeyValue(kNaN, ZvBaseFCurve::RightSide, v, 1.0), 0u);
+    EXPECT_EQ(c->SetKeyValue(kNaN, ZvBaseFCurve::RightSide, 1, 1.0), 0u);
+    EXPECT_EQ(c->RemoveKey(kNaN, 1.0), 0u);
+    EXPECT_EQ(c->GetNumKeys(), 3u);
+  }
+}
+
+}  // namespace
