@@ -29,10 +29,12 @@ namespace cfc_flatten {
 
 // More periods than this in one range would only draw a solid band; the range is refused.
 constexpr double kMaxCycles = 1e6;
-// Most keys, counted once per period, that one cyclic range draws.
-constexpr double kMaxRepeatedKeys = 16777216.0;
-// Most samples one EvalSequence gives; more are refused rather than allocated.
-constexpr double kMaxSamples = 16777216.0;
+// Most keys, counted once per period, that one cyclic range draws (2^20): this bounds the time
+// of a drawing whose pieces are mostly clipped away.
+constexpr double kMaxRepeatedKeys = 1048576.0;
+// Most points one FlattenFromTo adds and most samples one EvalSequence gives (2^22, about
+// 100 MB of output); more are refused rather than allocated.
+constexpr unsigned int kMaxOutput = 4194304;
 // A value change at one parameter larger than this is drawn as a jump.
 constexpr double kJumpEpsilon = 1e-15;
 
@@ -131,7 +133,8 @@ class Assembler {
         points(points),
         tags(tags),
         flags(flags),
-        sink(sink) {}
+        sink(sink),
+        first(points.size) {}
 
   // Hands what is left to the sink.
   void Finish() {
@@ -166,7 +169,7 @@ class Assembler {
       const double b = pa > xn ? pa : xn;
       Line(b, s.EvalRightUsingExtrapolationMethod(b), pb, s.EvalRightUsingExtrapolationMethod(pb));
     }
-    return true;
+    return !overflow;
   }
 
  private:
@@ -189,6 +192,7 @@ class Assembler {
       if (lo < x0) lo = x0;
       if (hi > xn) hi = xn;
       if (lo <= hi) KeyedRange(lo, hi, dx, k * delta);
+      if (overflow) return false;
     }
     return true;
   }
@@ -278,7 +282,11 @@ class Assembler {
   // With a sink, a full buffer goes to it, keeping its last point, to which the next piece
   // joins.
   void Drain() {
-    if (sink == nullptr || points.size < kPortion) return;
+    if (sink == nullptr) {
+      if (points.size - first > kMaxOutput) overflow = true;
+      return;
+    }
+    if (points.size < kPortion) return;
     sink->Take(points, taken);
     const unsigned int last = points.size - 1;
     points[0] = points[last];
@@ -300,7 +308,9 @@ class Assembler {
   ZvPointTagArray& tags;
   ZvBoolArray& flags;
   PolylineSink* const sink;
+  const unsigned int first;
   unsigned int taken = 0;
+  bool overflow = false;  // more points than kMaxOutput: the drawing is abandoned
   ZvPoint2<double> pen{0.0, 0.0};
   bool hasPen = false;
 };
@@ -536,7 +546,7 @@ unsigned int CFCEvalSequence(const Impl& s, double start, double end, double ste
     values.Add(s.EvalRightUsingExtrapolationMethod(start));
   } else {
     const double lo = start < end ? start : end, hi = start < end ? end : start;
-    if (!((hi - lo) / step <= cfc_flatten::kMaxSamples)) return 0;
+    if (!((hi - lo) / step <= cfc_flatten::kMaxOutput)) return 0;
     const ZvExtent2<double> box(lo, -DBL_MAX, hi, DBL_MAX);
     ZvPoint2dArray points(128);
     ZvPointTagArray tags(128);

@@ -92,6 +92,21 @@ TEST(HostileCurveInput, WholeCurveMovesRefuseToMergeOrOverflowKeys) {
 }
 
 TEST(HostileCurveInput, KeyReductionReturnsNearTheLargestDouble) {
+  // Cubic runs are refitted; with parameters and values near the largest double the fit
+  // overflows, and the reduction must still move on and keep the order.
+  const double at[] = {DBL_MAX / 8, DBL_MAX / 4, DBL_MAX / 2, DBL_MAX * 0.75, DBL_MAX};
+  for (int variant = 0; variant < 4; ++variant) {
+    ZvStdFCurve c;
+    for (int i = 0; i < 5; ++i) {
+      c.CreateKey(variant & 1 ? at[i] : -at[4 - i],
+                  variant & 2 ? (i % 2 ? DBL_MAX : -DBL_MAX) : i * 1.0);
+    }
+    c.ReduceNumKeys(-DBL_MAX, DBL_MAX, 0.5);
+    c.ReduceNumKeys(-DBL_MAX, DBL_MAX, 1e308);
+    const std::vector<double> k = KeysOf(c);
+    for (size_t i = 1; i < k.size(); ++i)
+      EXPECT_LT(k[i - 1], k[i]);
+  }
   for (auto& c : AllKinds({DBL_MAX / 4, DBL_MAX / 2, DBL_MAX * 0.75, DBL_MAX})) {
     c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
     c->ReduceNumKeys(-DBL_MAX, DBL_MAX, 0.5);
