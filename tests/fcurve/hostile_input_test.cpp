@@ -154,6 +154,19 @@ TEST(HostileCurveInput, ResamplingIsBoundedByTheKeyCap) {
     EXPECT_EQ(c->ResampleSequence(0, 1e6, 1e5, 0, 0), 1u);
     EXPECT_EQ(c->GetNumKeys(), 11u);
   }
+  // A downward step makes the same keys as an upward one (they are placed in ascending order).
+  for (auto& c : AllKinds({0, 10}, false)) {
+    EXPECT_EQ(c->ResampleSequence(10, 0, -1, 0, 0), 1u);
+    std::vector<double> expected;
+    for (int i = 0; i <= 10; ++i)
+      expected.push_back(i);
+    EXPECT_EQ(KeysOf(*c), expected) << c->GetKind();
+  }
+  // Samples in front of many keys would each move all of them: refused.
+  ZvRawFCurve many;
+  ASSERT_EQ(many.ResampleSequence(0, 1e6, 1, 0, 0), 1u);
+  EXPECT_EQ(many.ResampleSequence(-1, 0, 1e-6, 1, 0), 0u);
+  EXPECT_EQ(many.GetNumKeys(), 1000001u);
 }
 
 TEST(HostileCurveInput, NonFiniteParametersAreNeverStored) {
@@ -172,6 +185,11 @@ TEST(HostileCurveInput, NonFiniteParametersAreNeverStored) {
     EXPECT_EQ(c->CreateKey(-kInf, 0), 0u);
     EXPECT_EQ(c->CreateNonModifyingKey(kInf, 1), 0u);
     EXPECT_EQ(c->ShiftParameters(kInf), 0u);
+    std::unique_ptr<ZvBaseFCurve> snap(c->SnapShot(kNaN, 5, ZvBaseFCurve::ConstantExtrapolation));
+    if (snap) {
+      for (double p : KeysOf(*snap))
+        EXPECT_TRUE(std::isfinite(p)) << c->GetKind();
+    }
     EXPECT_EQ(KeysOf(*c), (std::vector<double>{0, 1}));
   }
 }
