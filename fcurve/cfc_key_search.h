@@ -34,6 +34,12 @@ class CFCKeySearch : public Store {
   unsigned int LocateParameter(double t, int& found) const {
     const unsigned int n = keys.size;
     const Key* k = keys.data;
+    // A NaN compares false with every key; without this it would reach the bisection, which
+    // needs two keys. It counts as lying before all of them, on none.
+    if (std::isnan(t)) {
+      found = 0;
+      return 0;
+    }
     if (k[0].parameter >= t) {
       this->searchHint = 0;
       found = zvIsSameParameter(t, k[0].parameter);

@@ -195,6 +195,12 @@ TEST(HostileCurveInput, NonFiniteParametersAreNeverStored) {
 }
 
 TEST(HostileCurveInput, KeyQueriesAtNaNFindNoKey) {
+  // One key is the case where a NaN used to reach the bisection and read past the keys.
+  for (auto& c : AllKinds({3})) {
+    unsigned int index;
+    EXPECT_EQ(c->GetKeyIndex(kNaN, index), 0u);
+    c->Eval(kNaN, 0);
+  }
   for (auto& c : AllKinds({0, 1, 2})) {
     SCOPED_TRACE(c->GetKind());
     unsigned int index = 7;
