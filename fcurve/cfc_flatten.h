@@ -32,9 +32,9 @@ constexpr double kMaxCycles = 1e6;
 // Most keys, counted once per period, that one cyclic range draws (2^20): this bounds the time
 // of a drawing whose pieces are mostly clipped away.
 constexpr double kMaxRepeatedKeys = 1048576.0;
-// Most points one FlattenFromTo adds and most samples one EvalSequence gives (2^22, about
-// 100 MB of output); more are refused rather than allocated.
-constexpr unsigned int kMaxOutput = 4194304;
+// Most points one drawing adds and most samples one EvalSequence gives (2^20, about 25 MB of
+// output and a fraction of a second to make); more are refused rather than allocated.
+constexpr unsigned int kMaxOutput = 1048576;
 // A value change at one parameter larger than this is drawn as a jump.
 constexpr double kJumpEpsilon = 1e-15;
 
@@ -431,7 +431,11 @@ unsigned int CFCFlatten(const Impl& s, const ZvTransfo4& transfo, double toleran
   // Without keys a unit piece at the constant value stands for the whole line.
   const unsigned int n = s.keys.size;
   const double pa = n ? s.keys[0].parameter : 0.0, pb = n ? s.keys[n - 1].parameter : 1.0;
-  assembler.Run(pa, pb);
+  if (!assembler.Run(pa, pb)) {  // more points than a drawing may hold
+    points.Chop(from);
+    tags.Chop(from);
+    return 0;
+  }
   if (points.size > from) tags[tags.size - 1] = ZvPointTag_Last;
   if (clamped)
     cfc_flatten::ClampInPlace(points, tags, nullptr, from, transfo, s.minClamp, s.maxClamp);

@@ -137,7 +137,8 @@ unsigned int ZvQuatFCurve::SetKeyValue(double parameter, KeySide, double value, 
 // (head) or after it (tail). Locked keys in the removed part refuse the whole operation.
 unsigned int ZvQuatFCurve::RemoveHead(double parameter) {
   ZvFCurveLockGuard hold(*this);
-  if (m_curve->IsReadOnly()) return 0;
+  // The cut leaves a key at the parameter, which must be a time.
+  if (m_curve->IsReadOnly() || !std::isfinite(parameter)) return 0;
   const unsigned int n = m_curve->GetNumKeys();
   if (n == 0) return 1;
   const double first = m_curve->GetKeyTime(0);
@@ -157,7 +158,8 @@ unsigned int ZvQuatFCurve::RemoveHead(double parameter) {
 
 unsigned int ZvQuatFCurve::RemoveTail(double parameter) {
   ZvFCurveLockGuard hold(*this);
-  if (m_curve->IsReadOnly()) return 0;
+  // The cut leaves a key at the parameter, which must be a time.
+  if (m_curve->IsReadOnly() || !std::isfinite(parameter)) return 0;
   const unsigned int n = m_curve->GetNumKeys();
   if (n == 0) return 1;
   const double last = m_curve->GetKeyTime(n - 1);

@@ -197,14 +197,15 @@ class ZV_API ZvBaseFCurve {
 
   // Right-continuous value with extrapolation.
   virtual double Eval(double parameter, int clamped) const = 0;
-  // Samples at start, start + step, ... and end. More than 2^22 samples (4194304) are refused
+  // Samples at start, start + step, ... and end. More than 2^20 samples (1048576) are refused
   // with 0 rather than allocated.
   virtual unsigned int EvalSequence(double start, double end, double step, double tolerance,
                                     ZvDoubleArray& parameters, ZvDoubleArray& values,
                                     int clamped) const = 0;
+  // Refused with 0, the arrays as they were, when the drawing would add more than 2^20 points.
   virtual unsigned int Flatten(const ZvTransfo4& transfo, double tolerance, ZvPoint2dArray& points,
                                ZvPointTagArray& tags, int clamped) const = 0;
-  // Refused with 0, the arrays as they were, when the drawing would add more than 2^22 points,
+  // Refused with 0, the arrays as they were, when the drawing would add more than 2^20 points,
   // or when under the cycle methods the box shows more than a million periods or more than 2^20
   // keys counted once per period: such a drawing is a solid band.
   virtual unsigned int FlattenFromTo(const ZvExtent2<double>& box, const ZvTransfo4& transfo,

@@ -185,6 +185,8 @@ TEST(HostileCurveInput, NonFiniteParametersAreNeverStored) {
     EXPECT_EQ(c->CreateKey(-kInf, 0), 0u);
     EXPECT_EQ(c->CreateNonModifyingKey(kInf, 1), 0u);
     EXPECT_EQ(c->ShiftParameters(kInf), 0u);
+    EXPECT_EQ(c->RemoveHead(kNaN), 0u);
+    EXPECT_EQ(c->RemoveTail(kInf), 0u);
     std::unique_ptr<ZvBaseFCurve> snap(c->SnapShot(kNaN, 5, ZvBaseFCurve::ConstantExtrapolation));
     if (snap) {
       for (double p : KeysOf(*snap))
