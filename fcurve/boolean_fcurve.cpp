@@ -37,12 +37,13 @@ unsigned int ZvBooleanFCurve::SmoothSequence(double, double, const double*, unsi
 }
 
 // Logical negation of every value, the value before the first key and the value without keys.
+// A curve without keys stays as it is.
 unsigned int ZvBooleanFCurve::MirrorValues() {
   ZvFCurveLockGuard guard(*this);
   ZvStepFCurveImpl& s = *m_impl;
   if (s.readOnly || s.AnyKeyHas(CFCFlag_ValueLock)) return 0;
-  s.valueWhenNoKeys = !s.valueWhenNoKeys;
   if (s.keys.size == 0) return 1;
+  s.valueWhenNoKeys = !s.valueWhenNoKeys;
   s.valueBeforeFirstKey = !s.valueBeforeFirstKey;
   for (unsigned int i = 0; i < s.keys.size; ++i)
     s.keys[i].value = !s.keys[i].value;

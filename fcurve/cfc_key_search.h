@@ -78,6 +78,11 @@ class CFCKeySearch : public Store {
     // k[low] < t <= k[low + length] holds throughout.
     while (length > 1) {
       const unsigned int half = length / 2;
+      // Both keys the next halving may read are fetched while this one waits for its own: on
+      // large keys the array outgrows the first-level cache.
+      const unsigned int next = (length - half) / 2;
+      __builtin_prefetch(&k[low + next]);
+      __builtin_prefetch(&k[low + half + next]);
       low += (0u - static_cast<unsigned int>(t > k[low + half].parameter)) & half;
       length -= half;
     }
