@@ -12,6 +12,13 @@
 
 #include "fcurve/cfc_key_search.h"
 
+// Most samples one resampling makes (2^20): a million keys is already more than a curve
+// editor draws, and each costs a key insertion.
+constexpr double kCFCMaxResampledKeys = 1048576.0;
+// Most key moves one resampling may cost (2^26): samples times the keys above the range, each
+// of which an insertion shifts.
+constexpr double kCFCMaxResampleMoves = 67108864.0;
+
 template <class T, class Key, class Store>
 class CFCBaseImpl : public CFCKeySearch<T, Key, Store> {
  public:
@@ -127,6 +134,7 @@ class CFCBaseImpl : public CFCKeySearch<T, Key, Store> {
     if (n == 1 && !zvIsSameParameter(keys[0].parameter, parameter)) {
       return CreateKey(parameter, value, curve);
     }
+    if (!this->FitsBetweenMergeBounds(left, right, parameter)) return 0;
     const bool inherit = keepAttributes && right - left > 1;
     unsigned short donorFlags = 0;
     CFCUserDataSet donorData;
@@ -304,10 +312,22 @@ class CFCBaseImpl : public CFCKeySearch<T, Key, Store> {
     unsigned int previous;
     if (zvIsSameParameter(start, end)) return impl.CreateNonModifyingKey(start, previous, curve);
     const double quotient = std::floor((end - start) / step);
-    if (!(quotient > -2147483648.0 && quotient < 2147483648.0)) return 0;
+    // Every sample can become a key: more than the cap are refused before any is made.
+    if (!(std::fabs(quotient) <= kCFCMaxResampledKeys)) return 0;
     const long count = static_cast<long>(quotient);
-    impl.CreateNonModifyingKey(start, previous, curve);
-    for (long i = 1; i <= count; ++i) {
+    // The samples are placed in ascending order whatever the sign of the step, so that each
+    // insertion moves only the keys above the range, never the samples already made; the
+    // number of such moves is bounded too.
+    const bool down = step < 0.0 && count > 0;
+    const double from = down ? end : start, to = down ? start : end;
+    if (impl.keys.size) {
+      int found;
+      const double above = impl.keys.size - impl.LocateParameter(from < to ? from : to, found);
+      if (!((std::fabs(quotient) + 1.0) * (above + 1.0) <= kCFCMaxResampleMoves)) return 0;
+    }
+    impl.CreateNonModifyingKey(from, previous, curve);
+    for (long j = 1; j <= count; ++j) {
+      const long i = down ? count + 1 - j : j;
       const double p = static_cast<double>(i) * step + start;
       unsigned int sample = impl.NearestKeyIndex(p);
       if (!(std::fabs(impl.keys[sample].parameter - p) <= 1e-7)) {
@@ -320,7 +340,7 @@ class CFCBaseImpl : public CFCKeySearch<T, Key, Store> {
       previous = sample;
     }
     unsigned int last;
-    impl.CreateNonModifyingKey(end, last, curve);
+    impl.CreateNonModifyingKey(to, last, curve);
     if (!keepExistingKeys && last > previous + 1) impl.RemoveKeysBetween(previous, last, curve);
     return 1;
   }

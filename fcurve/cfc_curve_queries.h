@@ -11,6 +11,8 @@
 #include "fcurve/cfc_key_search.h"
 #include "fcurve/fcurve_lock.h"
 
+#include <cmath>
+
 struct CFCQueries {
   template <class Impl>
   static unsigned int GetKeyParameters(const Impl& s, double start, double end,
@@ -36,7 +38,8 @@ struct CFCQueries {
   template <class Impl>
   static unsigned int GetNextKeyParameter(const Impl& s, double parameter, double& next,
                                           int inclusive) {
-    if (s.keys.size == 0) return 0;
+    // A NaN lies next to no key.
+    if (s.keys.size == 0 || std::isnan(parameter)) return 0;
     int found;
     unsigned int at = s.LocateParameter(parameter, found);
     if (found && inclusive) --at;
@@ -48,7 +51,7 @@ struct CFCQueries {
   template <class Impl>
   static unsigned int GetPrevKeyParameter(const Impl& s, double parameter, double& prev,
                                           int inclusive) {
-    if (s.keys.size == 0) return 0;
+    if (s.keys.size == 0 || std::isnan(parameter)) return 0;
     int found;
     unsigned int at = s.LocateParameter(parameter, found);
     if (found && !inclusive) --at;
@@ -60,7 +63,7 @@ struct CFCQueries {
   template <class Impl>
   static unsigned int GetNearestKeyParameter(const Impl& s, double parameter, double& nearest) {
     const unsigned int n = s.keys.size;
-    if (n == 0) return 0;
+    if (n == 0 || std::isnan(parameter)) return 0;
     int found;
     const unsigned int at = s.LocateParameter(parameter, found);
     unsigned int i;

@@ -29,6 +29,12 @@ namespace cfc_flatten {
 
 // More periods than this in one range would only draw a solid band; the range is refused.
 constexpr double kMaxCycles = 1e6;
+// Most keys, counted once per period, that one cyclic range draws (2^20): this bounds the time
+// of a drawing whose pieces are mostly clipped away.
+constexpr double kMaxRepeatedKeys = 1048576.0;
+// Most points one drawing adds and most samples one EvalSequence gives (2^20, about 25 MB of
+// output and a fraction of a second to make); more are refused rather than allocated.
+constexpr unsigned int kMaxOutput = 1048576;
 // A value change at one parameter larger than this is drawn as a jump.
 constexpr double kJumpEpsilon = 1e-15;
 
@@ -127,7 +133,8 @@ class Assembler {
         points(points),
         tags(tags),
         flags(flags),
-        sink(sink) {}
+        sink(sink),
+        first(points.size) {}
 
   // Hands what is left to the sink.
   void Finish() {
@@ -162,7 +169,7 @@ class Assembler {
       const double b = pa > xn ? pa : xn;
       Line(b, s.EvalRightUsingExtrapolationMethod(b), pb, s.EvalRightUsingExtrapolationMethod(pb));
     }
-    return true;
+    return !overflow;
   }
 
  private:
@@ -172,14 +179,20 @@ class Assembler {
     const double period = xn - x0;
     const double kFirst = std::floor((pa - x0) / period), kLast = std::floor((pb - x0) / period);
     if (!(kLast - kFirst <= kMaxCycles)) return false;
+    // Each period repeats every key: the repeated keys are bounded too, so that the output is.
+    if (!((kLast - kFirst + 1.0) * s.keys.size <= kMaxRepeatedKeys)) return false;
     const double delta =
         s.extrapolation == ZvBaseFCurve::CycleWithOffsetExtrapolation ? s.CycleOffset(false) : 0.0;
-    for (double k = kFirst; k <= kLast; k += 1.0) {
+    // Counted in integers: far from the keys k + 1 can round back to k.
+    const long count = static_cast<long>(kLast - kFirst);
+    for (long c = 0; c <= count; ++c) {
+      const double k = kFirst + static_cast<double>(c);
       const double dx = k * period;
       double lo = pa - dx, hi = pb - dx;
       if (lo < x0) lo = x0;
       if (hi > xn) hi = xn;
       if (lo <= hi) KeyedRange(lo, hi, dx, k * delta);
+      if (overflow) return false;
     }
     return true;
   }
@@ -269,7 +282,11 @@ class Assembler {
   // With a sink, a full buffer goes to it, keeping its last point, to which the next piece
   // joins.
   void Drain() {
-    if (sink == nullptr || points.size < kPortion) return;
+    if (sink == nullptr) {
+      if (points.size - first > kMaxOutput) overflow = true;
+      return;
+    }
+    if (points.size < kPortion) return;
     sink->Take(points, taken);
     const unsigned int last = points.size - 1;
     points[0] = points[last];
@@ -291,7 +308,9 @@ class Assembler {
   ZvPointTagArray& tags;
   ZvBoolArray& flags;
   PolylineSink* const sink;
+  const unsigned int first;
   unsigned int taken = 0;
+  bool overflow = false;  // more points than kMaxOutput: the drawing is abandoned
   ZvPoint2<double> pen{0.0, 0.0};
   bool hasPen = false;
 };
@@ -412,7 +431,11 @@ unsigned int CFCFlatten(const Impl& s, const ZvTransfo4& transfo, double toleran
   // Without keys a unit piece at the constant value stands for the whole line.
   const unsigned int n = s.keys.size;
   const double pa = n ? s.keys[0].parameter : 0.0, pb = n ? s.keys[n - 1].parameter : 1.0;
-  assembler.Run(pa, pb);
+  if (!assembler.Run(pa, pb)) {  // more points than a drawing may hold
+    points.Chop(from);
+    tags.Chop(from);
+    return 0;
+  }
   if (points.size > from) tags[tags.size - 1] = ZvPointTag_Last;
   if (clamped)
     cfc_flatten::ClampInPlace(points, tags, nullptr, from, transfo, s.minClamp, s.maxClamp);
@@ -462,7 +485,7 @@ namespace cfc_flatten {
 class Sampler : public PolylineSink {
  public:
   Sampler(double start, double end, double step, ZvDoubleArray& parameters, ZvDoubleArray& values)
-      : t(start), end(end), step(step), parameters(parameters), values(values) {}
+      : t(start), start(start), end(end), step(step), parameters(parameters), values(values) {}
 
   void Take(const ZvPoint2dArray& points, unsigned int from) override {
     for (unsigned int j = from; j < points.size; ++j) {
@@ -474,7 +497,7 @@ class Sampler : public PolylineSink {
           } else {
             Add(t, previous.y + (t - previous.x) * (q.y - previous.y) / (q.x - previous.x));
           }
-          t += step;
+          Advance();
         }
       }
       previous = q;
@@ -484,7 +507,7 @@ class Sampler : public PolylineSink {
 
   // The samples beyond the last point, and the last sample at the end.
   void Close() {
-    for (; end > t; t += step)
+    for (; end > t; Advance())
       Add(t, previous.y);
     Add(end, previous.y);
   }
@@ -497,8 +520,13 @@ class Sampler : public PolylineSink {
     values.Add(v);
   }
 
+  // Sample i lies at start + i * step: a running sum would stall where step is below the
+  // spacing of doubles near t.
+  void Advance() { t = start + static_cast<double>(++index) * step; }
+
   double t;
-  const double end, step;
+  const double start, end, step;
+  unsigned long index = 0;
   ZvDoubleArray& parameters;
   ZvDoubleArray& values;
   ZvPoint2<double> previous{0.0, 0.0};
@@ -522,6 +550,7 @@ unsigned int CFCEvalSequence(const Impl& s, double start, double end, double ste
     values.Add(s.EvalRightUsingExtrapolationMethod(start));
   } else {
     const double lo = start < end ? start : end, hi = start < end ? end : start;
+    if (!((hi - lo) / step <= cfc_flatten::kMaxOutput)) return 0;
     const ZvExtent2<double> box(lo, -DBL_MAX, hi, DBL_MAX);
     ZvPoint2dArray points(128);
     ZvPointTagArray tags(128);

@@ -34,6 +34,12 @@ class CFCKeySearch : public Store {
   unsigned int LocateParameter(double t, int& found) const {
     const unsigned int n = keys.size;
     const Key* k = keys.data;
+    // A NaN compares false with every key; without this it would reach the bisection, which
+    // needs two keys. It counts as lying before all of them, on none.
+    if (std::isnan(t)) {
+      found = 0;
+      return 0;
+    }
     if (k[0].parameter >= t) {
       this->searchHint = 0;
       found = zvIsSameParameter(t, k[0].parameter);
@@ -80,8 +86,9 @@ class CFCKeySearch : public Store {
       low += (0u - static_cast<unsigned int>(t > k[low + half].parameter)) & half;
       length -= half;
     }
-    // A key equal to t is the one above low. Equality is exact, on purpose.
-    if (!(k[low + 1].parameter > t)) {
+    // A key equal to t is the one above low. Equality is exact, on purpose; a NaN is equal to
+    // no key.
+    if (k[low + 1].parameter == t) {
       this->searchHint = low + 1;
       found = 1;
       return low + 2;
@@ -95,7 +102,8 @@ class CFCKeySearch : public Store {
   // earlier. 0 when there is none.
   int GetClosestKeyIndexInCenteredInterval(double t, double tolerance, unsigned int& index) const {
     const unsigned int n = keys.size;
-    if (n == 0) return 0;
+    // A NaN parameter or tolerance names no key.
+    if (n == 0 || std::isnan(t) || std::isnan(tolerance)) return 0;
     const double lo = t - tolerance, hi = t + tolerance;
     int found;
     unsigned int start = LocateParameter(lo, found);
@@ -285,6 +293,38 @@ class CFCKeySearch : public Store {
     if (at >= keys.size) return keys.size - 1;
     const double before = t - keys[at - 1].parameter, after = keys[at].parameter - t;
     return after < before ? at : at - 1;
+  }
+
+  // 1 when every key parameter is finite and above the one before: what every edit must leave
+  // behind, and what an edit that cannot manage it refuses on.
+  bool KeysAreOrdered() const {
+    const unsigned int n = keys.size;
+    for (unsigned int i = 0; i < n; ++i) {
+      const double p = keys[i].parameter;
+      if (!std::isfinite(p) || (i > 0 && !(p > keys[i - 1].parameter))) return false;
+    }
+    return true;
+  }
+
+  // Whether the parameters that `at(j)` gives for j = 0..n-1 would be finite and strictly
+  // increasing: whole-curve moves test the keys they would make before touching any.
+  template <class At>
+  static bool WouldBeOrdered(unsigned int n, At at) {
+    double previous = 0.0;
+    for (unsigned int j = 0; j < n; ++j) {
+      const double p = at(j);
+      if (!std::isfinite(p) || (j > 0 && !(p > previous))) return false;
+      previous = p;
+    }
+    return true;
+  }
+
+  // Whether a key at `parameter` fits strictly between the merge bounds left and right (as
+  // MergeBounds gives them), so that the merged keys stay in order.
+  bool FitsBetweenMergeBounds(long left, long right, double parameter) const {
+    if (!std::isfinite(parameter)) return false;
+    if (left >= 0 && !(parameter > keys[left].parameter)) return false;
+    return right >= static_cast<long>(keys.size) || parameter < keys[right].parameter;
   }
 
   // The last key that stays left of a merged interval and the first that stays right of it;

@@ -154,7 +154,8 @@ struct CFCSingleValueCurve {
     const Curve piece(c, start, end);
     if (s.keys.size) {
       const Curve saved(c);
-      if (!s.Cut(start, end, c)) {
+      // Rounding of the moved tail can land a key on the cut; that would break the order.
+      if (!s.Cut(start, end, c) || !s.KeysAreOrdered()) {
         c.Set(saved);
         return 0;
       }
@@ -255,6 +256,11 @@ struct CFCSingleValueCurve {
   static unsigned int ShiftParameters(Curve& c, double delta) {
     Impl& s = Of(c);
     if (s.readOnly || !std::isfinite(delta) || AnyKeyHas(s, CFCFlag_ParameterLock)) return 0;
+    // Near the largest double a shift can merge keys or overflow them.
+    if (!s.WouldBeOrdered(s.keys.size,
+                          [&s, delta](unsigned int j) { return s.keys[j].parameter + delta; })) {
+      return 0;
+    }
     s.ShiftKeyParameters(delta, c);
     return 1;
   }
@@ -264,6 +270,10 @@ struct CFCSingleValueCurve {
     // A factor of zero or below would merge or reverse the keys.
     if (s.readOnly || !(factor > 0.0) || !std::isfinite(factor) ||
         AnyKeyHas(s, CFCFlag_ParameterLock)) {
+      return 0;
+    }
+    if (!s.WouldBeOrdered(s.keys.size,
+                          [&s, factor](unsigned int j) { return s.keys[j].parameter * factor; })) {
       return 0;
     }
     s.ScaleKeyParameters(factor, c);
@@ -279,6 +289,11 @@ struct CFCSingleValueCurve {
     const unsigned int n = s.keys.size;
     if (n == 0) return 1;
     const double sum = s.keys[0].parameter + s.keys[n - 1].parameter;
+    // Far-apart keys lose their distance in the sum: mirrored, near ones would merge.
+    if (!s.WouldBeOrdered(
+            n, [&s, n, sum](unsigned int j) { return sum - s.keys[n - 1 - j].parameter; })) {
+      return 0;
+    }
     // The user data sets travel with their keys, so they are taken out first.
     CFCKeyUserDataInTransit sets(c, n, [&s](unsigned int i) { return s.keys[i].parameter; });
     Impl mirrored(s);

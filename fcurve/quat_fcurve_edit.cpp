@@ -12,11 +12,26 @@ namespace {
 
 constexpr double kLargestFloat = 3.4028234663852886e38;
 
+// Whether moving the time of every key without a parameter lock keeps all times finite and
+// strictly increasing; locked keys stay, so even a small move can pass a neighbour.
+template <class Move>
+bool MoveKeepsOrder(const ZvQuatCurve& c, Move move) {
+  double previous = 0.0;
+  bool first = true;
+  for (const ZvQuatKey& k : c.GetKeys()) {
+    const double t = k.IsParamLocked() ? k.time : move(k.time);
+    if (!std::isfinite(t) || (!first && !(t > previous))) return false;
+    previous = t;
+    first = false;
+  }
+  return true;
+}
+
 }  // namespace
 
 unsigned int ZvQuatFCurve::CreateKey(double parameter, double value) {
   ZvFCurveLockGuard hold(*this);
-  if (m_curve->IsReadOnly()) return 0;
+  if (m_curve->IsReadOnly() || !std::isfinite(parameter) || !std::isfinite(value)) return 0;
   m_curve->SetKey(parameter, m_component, value, 0.0);
   return 1;
 }
@@ -25,6 +40,7 @@ unsigned int ZvQuatFCurve::CreateNonModifyingKey(double parameter, int noFold) {
   ZvFCurveLockGuard hold(*this);
   if (m_curve->IsReadOnly()) return 0;
   if (!noFold) parameter = FoldParameter(parameter);
+  if (!std::isfinite(parameter)) return 0;
   m_curve->SetKey(parameter, m_component, m_curve->Eval(parameter, m_component), 0.0);
   return 1;
 }
@@ -33,7 +49,10 @@ unsigned int ZvQuatFCurve::MergeAndCreateKey(double start, double end, double pa
                                              double value, int excludeStart, int excludeEnd,
                                              int keepAttributes) {
   ZvFCurveLockGuard hold(*this);
-  if (m_curve->IsReadOnly()) return 0;
+  if (m_curve->IsReadOnly() || !std::isfinite(parameter) || !std::isfinite(value) ||
+      std::isnan(start) || std::isnan(end)) {
+    return 0;
+  }
   const std::vector<ZvQuatKey>& keys = m_curve->GetKeys();
   const unsigned short locks = ZvQuatKey::ParamLockFlag | ZvQuatKey::ValueLockFlag;
   unsigned int first, last;
@@ -118,7 +137,8 @@ unsigned int ZvQuatFCurve::SetKeyValue(double parameter, KeySide, double value, 
 // (head) or after it (tail). Locked keys in the removed part refuse the whole operation.
 unsigned int ZvQuatFCurve::RemoveHead(double parameter) {
   ZvFCurveLockGuard hold(*this);
-  if (m_curve->IsReadOnly()) return 0;
+  // The cut leaves a key at the parameter, which must be a time.
+  if (m_curve->IsReadOnly() || !std::isfinite(parameter)) return 0;
   const unsigned int n = m_curve->GetNumKeys();
   if (n == 0) return 1;
   const double first = m_curve->GetKeyTime(0);
@@ -138,7 +158,8 @@ unsigned int ZvQuatFCurve::RemoveHead(double parameter) {
 
 unsigned int ZvQuatFCurve::RemoveTail(double parameter) {
   ZvFCurveLockGuard hold(*this);
-  if (m_curve->IsReadOnly()) return 0;
+  // The cut leaves a key at the parameter, which must be a time.
+  if (m_curve->IsReadOnly() || !std::isfinite(parameter)) return 0;
   const unsigned int n = m_curve->GetNumKeys();
   if (n == 0) return 1;
   const double last = m_curve->GetKeyTime(n - 1);
@@ -159,7 +180,9 @@ unsigned int ZvQuatFCurve::RemoveTail(double parameter) {
 
 unsigned int ZvQuatFCurve::ShiftParameters(double delta) {
   ZvFCurveLockGuard hold(*this);
-  if (m_curve->IsReadOnly()) return 0;
+  if (m_curve->IsReadOnly() || !MoveKeepsOrder(*m_curve, [delta](double t) { return t + delta; })) {
+    return 0;
+  }
   m_curve->Shift(delta);
   TranslateAllKeyUserData(delta);
   return 1;
@@ -167,7 +190,11 @@ unsigned int ZvQuatFCurve::ShiftParameters(double delta) {
 
 unsigned int ZvQuatFCurve::ScaleParameterAxis(double factor) {
   ZvFCurveLockGuard hold(*this);
-  if (m_curve->IsReadOnly() || !m_curve->Scale(factor)) return 0;
+  if (m_curve->IsReadOnly() ||
+      !MoveKeepsOrder(*m_curve, [factor](double t) { return t * factor; }) ||
+      !m_curve->Scale(factor)) {
+    return 0;
+  }
   ScaleAllKeyUserData(factor);
   return 1;
 }

@@ -215,7 +215,8 @@ ZvBaseFCurve* ZvQuatFCurve::SnapShot(double start, double end, ExtrapolationMeth
   copy->SetExtrapolationMethod(static_cast<unsigned int>(method));
   double lastKey = 0.0;
   for (unsigned int i = 0; i < times.size; ++i) {
-    if (times[i] < start || times[i] > end) continue;
+    // Written so that a NaN bound or sample keeps nothing: no key may have a NaN time.
+    if (!(times[i] >= start && times[i] <= end) || !std::isfinite(times[i])) continue;
     if (copy->GetNumKeys() && !(std::fabs(times[i] - lastKey) > 1e-6)) continue;
     copy->SetKey(times[i], angles[i], 0.0);
     lastKey = times[i];
@@ -225,7 +226,7 @@ ZvBaseFCurve* ZvQuatFCurve::SnapShot(double start, double end, ExtrapolationMeth
 
 unsigned int ZvQuatFCurve::ResampleSequence(double start, double end, double step,
                                             int keepExistingKeys, int) {
-  if (!(step > 0.0)) return 0;
+  if (!(step > 0.0) || !std::isfinite(start) || !std::isfinite(end)) return 0;
   ZvFCurveLockGuard hold(*this);
   if (m_curve->IsReadOnly()) return 0;
   // Samples of the rotation across the interval, the existing keys marked among them.
@@ -236,7 +237,9 @@ unsigned int ZvQuatFCurve::ResampleSequence(double start, double end, double ste
   };
   std::vector<Sample> samples;
   const double count = std::ceil((end - 1e-6 - start) / step);
-  if (count > 2147483647.0) return 0;
+  // Every sample becomes a key, and each key is placed by a walk over those before it: beyond
+  // 2^14 samples the quadratic cost passes a second, and the call is refused before any is made.
+  if (!(count <= 16384.0)) return 0;
   for (long i = 0; i < count; ++i) {
     const double t = start + static_cast<double>(i) * step;
     samples.push_back({t, m_curve->Eval(t), false});

@@ -82,7 +82,7 @@ unsigned int ZvQuatFCurve::GetPrevKeyParameter(double parameter, double& prev,
 unsigned int ZvQuatFCurve::GetNearestKeyParameter(double parameter, double& nearest) const {
   ZvFCurveLockGuard hold(*this);
   const std::vector<ZvQuatKey>& keys = m_curve->GetKeys();
-  if (keys.empty()) return 0;
+  if (keys.empty() || std::isnan(parameter)) return 0;  // a NaN is near no key
   double best = keys[0].time;
   for (const ZvQuatKey& k : keys) {
     // `<=` so that of two equally near keys the later wins.
@@ -218,13 +218,15 @@ double ZvQuatFCurve::Eval(double parameter, int) const {
 unsigned int ZvQuatFCurve::EvalSequence(double start, double end, double step, double,
                                         ZvDoubleArray& parameters, ZvDoubleArray& values,
                                         int) const {
-  if (!(step > 0.0)) return 0;
+  if (!(step > 0.0) || !std::isfinite(start) || !std::isfinite(end)) return 0;
+  // Samples counted, not summed, so that a step lost in the rounding of t cannot stall the walk.
+  // Each is a spline evaluation of about a microsecond: 2^20 of them take about a second, and
+  // more are refused before the arrays are touched.
+  const double count = std::ceil((end - start) / step);
+  if (!(count <= 1048576.0)) return 0;
   ZvFCurveLockGuard hold(*this);
   parameters.Resize(0);
   values.Resize(0);
-  // Samples counted, not summed, so that a step lost in the rounding of t cannot stall the walk.
-  const double count = std::ceil((end - start) / step);
-  if (count > 2147483647.0) return 0;
   for (long i = 0; i < count; ++i) {
     const double t = start + static_cast<double>(i) * step;
     parameters.Add(t);

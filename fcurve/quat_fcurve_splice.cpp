@@ -70,6 +70,14 @@ unsigned int ZvQuatFCurve::Cut(double start, double end, ZvBaseFCurve& cutOut) {
   if (AreAnyValuesLockedInInterval(start, end, 0, 0) || AnyParameterLockFrom(*m_curve, start)) {
     return 0;
   }
+  // The keys beyond the cut move left by its width; rounding must not land one on the cut.
+  double previous = start;
+  for (const ZvQuatKey& k : m_curve->GetKeys()) {
+    if (!(k.time - end > 1e-15)) continue;
+    const double moved = k.time + (start - end);
+    if (!(moved > previous) || !std::isfinite(moved)) return 0;
+    previous = moved;
+  }
   const ZvQuatCurve piece = Piece(*m_curve, start, end);
   if (m_curve->GetNumKeys() > 0 && end > start) {
     // The key at end takes the place of the key at start: the curve goes on from start as it

@@ -12,12 +12,17 @@
 
 ZvRawFCurve::ZvRawFCurve(double valueWhenNoKeys) : m_impl(new ZvRawFCurveImpl(valueWhenNoKeys)) {}
 
+// A key that is not finite is not stored: the curve then stays without keys.
 ZvRawFCurve::ZvRawFCurve(double parameter, double value) : m_impl(new ZvRawFCurveImpl(value)) {
-  m_impl->InsertKey(0, parameter, value);
+  if (std::isfinite(parameter) && std::isfinite(value)) m_impl->InsertKey(0, parameter, value);
 }
 
 ZvRawFCurve::ZvRawFCurve(double parameter0, double value0, double parameter1, double value1)
     : m_impl(new ZvRawFCurveImpl(value0)) {
+  if (!std::isfinite(parameter0) || !std::isfinite(value0) || !std::isfinite(parameter1) ||
+      !std::isfinite(value1)) {
+    return;
+  }
   m_impl->InsertKey(0, parameter0, value0);
   if (zvIsSameParameter(parameter0, parameter1)) return;
   m_impl->InsertKey(parameter1 > parameter0 ? 1 : 0, parameter1, value1);

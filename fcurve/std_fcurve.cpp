@@ -14,6 +14,7 @@ ZvStdFCurve::ZvStdFCurve(double valueWhenNoKeys, FSKind firstSegmentKind)
 ZvStdFCurve::ZvStdFCurve(double parameter, double leftValue, double rightValue,
                          FSKind firstSegmentKind, FSKind segmentKind)
     : m_impl(new ZvStdFCurveImpl(leftValue, firstSegmentKind)) {
+  if (!std::isfinite(parameter) || !std::isfinite(leftValue) || !std::isfinite(rightValue)) return;
   CFCStdKey k{};
   k.parameter = parameter;
   k.leftValue = leftValue;
@@ -29,8 +30,15 @@ ZvStdFCurve::ZvStdFCurve(const ZvPoint2<double>& p0, const ZvPoint2<double>& p1,
                          const ZvPoint2<double>& p2, const ZvPoint2<double>& p3)
     : m_impl(new ZvStdFCurveImpl(p0.y, CubicSegment)) {
   ZvPoint2<double> p[4] = {p0, p1, p2, p3};
-  if (!(p0.x < p3.x)) return;  // not a function segment: the curve stays without keys
+  // Not a function segment, or a point beyond the doubles: the curve stays without keys.
+  auto finite = [&p]() {
+    for (const ZvPoint2<double>& q : p)
+      if (!std::isfinite(q.x) || !std::isfinite(q.y)) return false;
+    return true;
+  };
+  if (!(p0.x < p3.x) || !finite()) return;
   BezierCubicRegularize(p);
+  if (!finite()) return;
   CFCStdKey a{}, b{};
   a.parameter = p[0].x;
   a.leftValue = a.rightValue = p[0].y;
@@ -142,6 +150,7 @@ unsigned int ZvStdFCurve::MergeAndCreateKey(double start, double end, double par
       (n == 1 && !zvIsSameParameter(s.keys[0].parameter, parameter))) {
     return s.CreateKey(parameter, value, leftKind, rightKind, *this);
   }
+  if (!s.FitsBetweenMergeBounds(left, right, parameter)) return 0;
   const bool inherit = keepAttributes && right - left > 1;
   unsigned short donorFlags = 0;
   CFCUserDataSet donorData;

@@ -296,6 +296,7 @@ int ZvStdFCurveImpl::IsValid() const {
   if (minClamp > maxClamp) return 0;
   const unsigned int n = keys.size;
   if (n == 0) return 1;
+  if (!KeysAreOrdered()) return 0;
   for (unsigned int i = 0; i + 1 < n; ++i) {
     const CFCStdKey& k = keys[i];
     const CFCStdKey& next = keys[i + 1];

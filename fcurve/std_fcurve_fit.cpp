@@ -197,8 +197,11 @@ void ReduceRange(ZvStdFCurve& curve, ZvStdFCurveImpl& s, double start, double en
         s.ReduceNumKeys(i, j, tolerance, curve);
       }
     }
+    // A refit can move the run's end key off its parameter; the walk still moves on, so that
+    // it ends.
     int found;
-    i = s.LocateParameter(runEnd, found) - 1;
+    const unsigned int next = s.LocateParameter(runEnd, found) - 1;
+    i = next > i ? next : i + 1;
     b = s.LocateParameter(endParameter, found) - 1;
   }
 }

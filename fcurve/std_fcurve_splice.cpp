@@ -183,6 +183,11 @@ unsigned int ZvStdFCurve::Cut(double start, double end, ZvBaseFCurve& cutOut) {
     }
     TakeRightSide(s.keys[a], s.keys[a + 1], 0.0);
     s.DropKeys(a + 1, a + 1);
+    // Rounding of the moved tail can land a key on the cut; that would break the order.
+    if (!s.KeysAreOrdered()) {
+      Set(saved);
+      return 0;
+    }
     if (!s.ActualTangentsAreUnified(a)) ClearBits(s.keys[a], CFCFlag_TangentContinuity);
     ReapplyHandleConstraint(s);
   }

@@ -46,6 +46,11 @@ unsigned int ZvStdFCurve::ShiftParameters(double delta) {
   ZvFCurveLockGuard guard(*this);
   ZvStdFCurveImpl& s = *m_impl;
   if (s.readOnly || !std::isfinite(delta) || AnyKeyHas(s, CFCFlag_ParameterLock)) return 0;
+  // Near the largest double a shift can merge keys or overflow them.
+  if (!s.WouldBeOrdered(s.keys.size,
+                        [&s, delta](unsigned int j) { return s.keys[j].parameter + delta; })) {
+    return 0;
+  }
   s.ShiftKeyParameters(delta, *this);
   ReapplyHandleConstraint(s);
   return 1;
@@ -57,6 +62,10 @@ unsigned int ZvStdFCurve::ScaleParameterAxis(double factor) {
   // A factor of zero or below would merge or reverse the keys.
   if (s.readOnly || !(factor > 0.0) || !std::isfinite(factor) ||
       AnyKeyHas(s, CFCFlag_ParameterLock)) {
+    return 0;
+  }
+  if (!s.WouldBeOrdered(s.keys.size,
+                        [&s, factor](unsigned int j) { return s.keys[j].parameter * factor; })) {
     return 0;
   }
   s.ScaleKeyParameters(factor, *this);
@@ -124,6 +133,11 @@ unsigned int ZvStdFCurve::MirrorParameters() {
   const unsigned int n = s.keys.size;
   if (n == 0) return 1;
   const double sum = s.keys[0].parameter + s.keys[n - 1].parameter;
+  // Far-apart keys lose their distance in the sum: mirrored, near ones would merge.
+  if (!s.WouldBeOrdered(
+          n, [&s, n, sum](unsigned int j) { return sum - s.keys[n - 1 - j].parameter; })) {
+    return 0;
+  }
   // The user data sets travel with their keys, so they are taken out first.
   CFCKeyUserDataInTransit sets(*this, n, [&s](unsigned int i) { return s.keys[i].parameter; });
   ZvAltDynArray<CFCStdKey> mirrored(n);

@@ -123,6 +123,12 @@ class ZV_API ZvBaseFCurve {
   };
 
   // --- Virtual operations, in the order of the virtual table. ---
+  //
+  // Every kind keeps its key parameters finite and strictly increasing. An edit that cannot
+  // (a parameter that is NaN or infinite, a merged key that would not lie strictly between the
+  // keys that stay, a shift, scale or mirror that would overflow or round two keys onto one,
+  // a cut whose moved tail would round onto the cut) answers 0 and leaves the curve as it was.
+  // A NaN parameter names no key: the key queries answer 0 for it.
 
   virtual ZvBaseFCurve& operator=(const ZvBaseFCurve& other);
   virtual ~ZvBaseFCurve();
@@ -148,12 +154,16 @@ class ZV_API ZvBaseFCurve {
                                     double tolerance) const = 0;
   virtual unsigned int SetKeyValue(double parameter, KeySide side, double value,
                                    double tolerance) = 0;
-  // cutOut receives what was cut; it must be of the same kind, not read-only.
+  // cutOut receives what was cut; it must be of the same kind, not read-only. When the keys
+  // after the cut, moved left by its width, would round onto the cut, the result is 0 and the
+  // curve is as it was.
   virtual unsigned int Cut(double start, double end, ZvBaseFCurve& cutOut) = 0;
   virtual unsigned int RemoveTail(double parameter) = 0;
   virtual unsigned int RemoveHead(double parameter) = 0;
   virtual unsigned int Append(const ZvBaseFCurve& curve) = 0;
   virtual unsigned int Paste(const ZvBaseFCurve& curve, double start, double end) = 0;
+  // Both refuse with 0, changing nothing, when a key would leave the finite doubles or land on
+  // its neighbour (far from 0 a small shift or factor can do either).
   virtual unsigned int ShiftParameters(double delta) = 0;
   virtual unsigned int ScaleParameterAxis(double factor) = 0;
   virtual unsigned int ShiftValues(double delta) = 0;
@@ -190,11 +200,17 @@ class ZV_API ZvBaseFCurve {
 
   // Right-continuous value with extrapolation.
   virtual double Eval(double parameter, int clamped) const = 0;
+  // Samples at start, start + step, ... and end. More than 2^20 samples (1048576) are refused
+  // with 0 rather than allocated.
   virtual unsigned int EvalSequence(double start, double end, double step, double tolerance,
                                     ZvDoubleArray& parameters, ZvDoubleArray& values,
                                     int clamped) const = 0;
+  // Refused with 0, the arrays as they were, when the drawing would add more than 2^20 points.
   virtual unsigned int Flatten(const ZvTransfo4& transfo, double tolerance, ZvPoint2dArray& points,
                                ZvPointTagArray& tags, int clamped) const = 0;
+  // Refused with 0, the arrays as they were, when the drawing would add more than 2^20 points,
+  // or when under the cycle methods the box shows more than a million periods or more than 2^20
+  // keys counted once per period: such a drawing is a solid band.
   virtual unsigned int FlattenFromTo(const ZvExtent2<double>& box, const ZvTransfo4& transfo,
                                      double tolerance, ZvPoint2dArray& points,
                                      ZvPointTagArray& tags, ZvBoolArray& extrapolated,
@@ -202,12 +218,15 @@ class ZV_API ZvBaseFCurve {
   // Appends all keys (left values are effective left values); returns the count.
   virtual unsigned int GetKeys(ZvDoubleArray& parameters, ZvDoubleArray& leftValues,
                                ZvDoubleArray& rightValues, int clamped) const = 0;
-  // The last argument has no effect.
+  // The last argument has no effect. A resampling of more than 2^20 samples (1048576) is
+  // refused with 0 before any key is made.
   virtual unsigned int ResampleSequence(double start, double end, double step, int keepExistingKeys,
                                         int ignoredFlag) = 0;
+  // The caller's duty: `kernel` holds at least `kernelSize` doubles.
   virtual unsigned int SmoothSequence(double start, double end, const double* kernel,
                                       unsigned int kernelSize) = 0;
   virtual unsigned int MirrorValues() = 0;
+  // Refused with 0 when mirrored keys would round onto each other or overflow.
   virtual unsigned int MirrorParameters() = 0;
   virtual unsigned int ScaleAndOffsetParameters(double start, double end, double pivot,
                                                 double scale, double offset, int moveHead,

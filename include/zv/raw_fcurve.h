@@ -40,9 +40,10 @@ class ZV_API ZvRawFCurve : public ZvBaseFCurve {
  public:
   // A curve without keys.
   explicit ZvRawFCurve(double valueWhenNoKeys = 0.0);
-  // One key.
+  // One key; none when the parameter or the value is not finite.
   ZvRawFCurve(double parameter, double value);
-  // Two keys; in either order, and one key when the parameters are the same.
+  // Two keys; in either order, and one key when the parameters are the same. None when any
+  // argument is not finite.
   ZvRawFCurve(double parameter0, double value0, double parameter1, double value1);
   // A polyline through the points (ascending parameters): a key where a point leaves the line
   // of the current piece by more than `tolerance`. Points out of order or not finite give a

@@ -24,7 +24,8 @@
 // and return 1. Flatten covers the keys; FlattenFromTo covers the parameters that a box in
 // transformed space shows, with extrapolation, clipped to the box. EvalSequence samples that
 // polyline at regular steps and replaces the contents of its arrays. Under the cycle methods a
-// box showing more than a million periods is refused with 0.
+// box showing more than a million periods is refused with 0, and so are the other drawings
+// and samplings too large to hold (see ZvBaseFCurve).
 //
 // Persistence. The block (version 264) holds the curve-wide values, 60 bytes a key, the flags,
 // extrapolation, read-only flag, the keys' extra bytes, the user data block, the tangent
@@ -57,7 +58,7 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
 
   // A curve without keys.
   explicit ZvStdFCurve(double valueWhenNoKeys = 0.0, FSKind firstSegmentKind = CubicSegment);
-  // One key with its handles on the key.
+  // One key with its handles on the key; none when a parameter or value is not finite.
   ZvStdFCurve(double parameter, double leftValue, double rightValue, FSKind firstSegmentKind,
               FSKind segmentKind);
   // One cubic segment through four control points; the handles are repaired into a function
@@ -65,7 +66,8 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   ZvStdFCurve(const ZvPoint2<double>& p0, const ZvPoint2<double>& p1, const ZvPoint2<double>& p2,
               const ZvPoint2<double>& p3);
   // One straight cubic segment from (startParameter, startValue) to (endParameter, endValue),
-  // handles at the thirds of the chord. The start must lie left of the end.
+  // handles at the thirds of the chord. The start must lie left of the end, and every point
+  // be finite (the chord too); otherwise the curve stays without keys.
   ZvStdFCurve(double startParameter, double startValue, double endParameter, double endValue);
   // A curve through points in ascending parameter order. DPCatmullRom: cubic segments through
   // every point, each tangent along the chord of the neighbours. DPCubicC2: the natural cubic

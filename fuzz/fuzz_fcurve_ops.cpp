@@ -1,0 +1,241 @@
+// Random sequences of public calls on function curves of every kind, with extreme arguments
+// (the largest doubles, infinities, NaN, denormals, values a hair off a key, reversed
+// intervals). After every call the keys must still be finite and strictly increasing; hangs and
+// runaway memory are caught by running with -timeout=1 -rss_limit_mb=512.
+//
+// Input: one byte picks the curve kind, then each step is one byte for the call and as many
+// more as its arguments take.
+#include <zv/quat_fcurve.h>
+#include <zv/raw_fcurve.h>
+#include <zv/std_fcurve.h>
+#include <zv/step_fcurve.h>
+#include <zv/transfo4.h>
+
+#include <cfloat>
+#include <cmath>
+#include <cstddef>
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+#include <limits>
+#include <memory>
+
+namespace {
+
+const double kExtremes[] = {0.0,
+                            -0.0,
+                            1.0,
+                            -1.0,
+                            0.5,
+                            2.0,
+                            10.0,
+                            15.0,
+                            1e-13,
+                            1e-300,
+                            5e-324,
+                            1e6,
+                            4.29e9,
+                            1e17,
+                            1e18,
+                            1e300,
+                            1e308,
+                            DBL_MAX,
+                            -DBL_MAX,
+                            -1e300,
+                            std::numeric_limits<double>::infinity(),
+                            -std::numeric_limits<double>::infinity(),
+                            std::numeric_limits<double>::quiet_NaN(),
+                            14.999999999999998,
+                            0.99999999999999989,
+                            1.0000000000000002,
+                            -62.5,
+                            1e-7,
+                            1e-15};
+constexpr unsigned int kNumExtremes = sizeof(kExtremes) / sizeof(kExtremes[0]);
+
+class Script {
+ public:
+  Script(const std::uint8_t* data, std::size_t size) : p_(data), end_(data + size) {}
+  bool More() const { return p_ < end_; }
+  unsigned int Byte() { return p_ < end_ ? *p_++ : 0; }
+  // Mostly small numbers, so that keys meet; often an extreme; sometimes any double at all.
+  double Number() {
+    const unsigned int b = Byte();
+    if (b < 96) return (static_cast<int>(Byte()) - 128) * 0.25;
+    if (b < 224) return kExtremes[Byte() % kNumExtremes];
+    std::uint64_t bits = 0;
+    for (int i = 0; i < 8; ++i)
+      bits = bits << 8 | Byte();
+    double d;
+    std::memcpy(&d, &bits, sizeof d);
+    return d;
+  }
+
+ private:
+  const std::uint8_t* p_;
+  const std::uint8_t* end_;
+};
+
+std::unique_ptr<ZvBaseFCurve> NewCurve(unsigned int kind) {
+  switch (kind % 5) {
+    case 0:
+      return std::unique_ptr<ZvBaseFCurve>(new ZvStdFCurve());
+    case 1:
+      return std::unique_ptr<ZvBaseFCurve>(new ZvRawFCurve());
+    case 2:
+      return std::unique_ptr<ZvBaseFCurve>(new ZvIntegerFCurve());
+    case 3:
+      return std::unique_ptr<ZvBaseFCurve>(new ZvBooleanFCurve());
+    default:
+      return std::unique_ptr<ZvBaseFCurve>(new ZvQuatFCurve(0));
+  }
+}
+
+void CheckKeys(const ZvBaseFCurve& c) {
+  ZvDoubleArray p;
+  c.GetAllKeyParameters(p);
+  if (p.size != c.GetNumKeys()) std::abort();
+  for (unsigned int i = 0; i < p.size; ++i) {
+    if (!std::isfinite(p[i])) std::abort();
+    if (i > 0 && !(p[i] > p[i - 1])) std::abort();
+  }
+}
+
+void Step(ZvBaseFCurve& c, Script& s) {
+  const unsigned int op = s.Byte() % 26;
+  const double a = s.Number(), b = s.Number(), d = s.Number();
+  const int f0 = s.Byte() & 1, f1 = s.Byte() & 1;
+  switch (op) {
+    case 0:
+    case 1:  // most often, so that curves get keys
+      c.CreateKey(a, b);
+      break;
+    case 2:
+      c.MergeAndCreateKey(a, b, d, s.Number(), f0, f1, s.Byte() & 1);
+      break;
+    case 3:
+      c.CreateNonModifyingKey(a, f0);
+      break;
+    case 4:
+      c.MergeAndCreateNonModifyingKey(a, b, d, f0, f1, s.Byte() & 1, s.Byte() & 1);
+      break;
+    case 5:
+      c.RemoveKey(a, b);
+      break;
+    case 6:
+      c.RemoveKeys(a, b, f0, f1);
+      break;
+    case 7:
+      c.SetKeyValue(a, f0 ? ZvBaseFCurve::LeftSide : ZvBaseFCurve::RightSide, b, d);
+      break;
+    case 8: {
+      std::unique_ptr<ZvBaseFCurve> out(c.Clone());
+      if (out) {
+        c.Cut(a, b, *out);
+        CheckKeys(*out);
+      }
+      break;
+    }
+    case 9:
+      f0 ? c.RemoveTail(a) : c.RemoveHead(a);
+      break;
+    case 10: {
+      std::unique_ptr<ZvBaseFCurve> other(c.Clone());
+      if (other) f0 ? c.Append(*other) : c.Paste(*other, a, b);
+      break;
+    }
+    case 11:
+      c.ShiftParameters(a);
+      break;
+    case 12:
+      c.ScaleParameterAxis(a);
+      break;
+    case 13:
+      f0 ? c.ShiftValues(a) : c.MirrorValues();
+      break;
+    case 14:
+      c.ReduceNumKeys(a, b, d);
+      break;
+    case 15: {
+      ZvDoubleArray params, values;
+      c.EvalSequence(a, b, d, s.Number(), params, values, f0);
+      break;
+    }
+    case 16: {
+      ZvExtent2<double> box;
+      box.AddPoint(ZvPoint2<double>{a, b});
+      box.AddPoint(ZvPoint2<double>{d, s.Number()});
+      ZvTransfo4 t;
+      if (f0) t.Scale(s.Number(), s.Number(), 1.0);
+      ZvPoint2dArray points;
+      ZvPointTagArray tags;
+      ZvBoolArray extrapolated;
+      c.FlattenFromTo(box, t, s.Number(), points, tags, extrapolated, f1);
+      ZvPoint2dArray all;
+      ZvPointTagArray allTags;
+      c.Flatten(t, s.Number(), all, allTags, f1);
+      break;
+    }
+    case 17:
+      c.ResampleSequence(a, b, d, f0, 0);
+      break;
+    case 18: {
+      const double kernel[5] = {a, b, d, 0.25, 0.5};
+      c.SmoothSequence(s.Number(), s.Number(), kernel, 1 + s.Byte() % 5);
+      break;
+    }
+    case 19:
+      c.MirrorParameters();
+      break;
+    case 20:
+      c.ScaleAndOffsetParameters(a, b, d, s.Number(), s.Number(), f0, f1,
+                                 ZvBaseFCurve::BottomHandle);
+      break;
+    case 21:
+      c.SetExtrapolationMethod(static_cast<ZvBaseFCurve::ExtrapolationMethod>(1 + s.Byte() % 4));
+      break;
+    case 22: {
+      double p = a;
+      c.SetConstraint(p, static_cast<ZvBaseFCurve::KeyConstraint>(1u << (s.Byte() % 6)), f0, b);
+      break;
+    }
+    case 23: {
+      std::unique_ptr<ZvBaseFCurve> snap(
+          c.SnapShot(a, b, static_cast<ZvBaseFCurve::ExtrapolationMethod>(1 + s.Byte() % 4)));
+      if (snap) CheckKeys(*snap);
+      break;
+    }
+    case 24: {
+      // Queries: none may answer a key at a NaN, none may hang.
+      unsigned int index;
+      double p = a, v;
+      c.GetKeyIndex(a, index);
+      c.GetNearestKeyParameter(a, p);
+      c.GetNextKeyParameter(a, p, f0);
+      c.GetPrevKeyParameter(a, p, f1);
+      c.GetNearestKeyParameterInCenteredInterval(p, b);
+      c.GetKeyValue(a, ZvBaseFCurve::RightSide, v, b);
+      c.Eval(a, f0);
+      c.GetValueUpperBound(f0);
+      c.GetValueLowerBound(f1);
+      if (std::isnan(a) && c.IsKeyParameter(a, b)) std::abort();
+      break;
+    }
+    default:
+      c.SetClampingValues(a, b);
+      break;
+  }
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  if (size == 0) return 0;
+  Script script(data + 1, size - 1);
+  std::unique_ptr<ZvBaseFCurve> curve = NewCurve(data[0]);
+  for (int steps = 0; script.More() && steps < 24; ++steps) {
+    Step(*curve, script);
+    CheckKeys(*curve);
+  }
+  return 0;
+}

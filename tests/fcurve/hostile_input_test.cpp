@@ -1,0 +1,222 @@
+// Curves under extreme arguments: an operation that cannot keep the keys strictly increasing
+// and finite refuses and leaves the curve as it was, and nothing runs or allocates without
+// bound.
+#include <zv/quat_fcurve.h>
+#include <zv/raw_fcurve.h>
+#include <zv/std_fcurve.h>
+#include <zv/step_fcurve.h>
+#include <zv/transfo4.h>
+
+#include <gtest/gtest.h>
+
+#include <cfloat>
+#include <cmath>
+#include <limits>
+#include <memory>
+#include <vector>
+
+namespace {
+
+const double kNaN = std::numeric_limits<double>::quiet_NaN();
+const double kInf = std::numeric_limits<double>::infinity();
+
+std::vector<double> KeysOf(const ZvBaseFCurve& c) {
+  ZvDoubleArray p;
+  c.GetAllKeyParameters(p);
+  return std::vector<double>(p.data, p.data + p.size);
+}
+
+// Fresh curves of every kind with keys at the given parameters.
+// The rotation view is left out where its own rules differ: it merges into an empty interval
+// by setting a key, and draws and samples without repeating periods.
+std::vector<std::unique_ptr<ZvBaseFCurve>> AllKinds(const std::vector<double>& at,
+                                                    bool withRotation = true) {
+  std::vector<std::unique_ptr<ZvBaseFCurve>> curves;
+  curves.emplace_back(new ZvStdFCurve());
+  curves.emplace_back(new ZvRawFCurve());
+  curves.emplace_back(new ZvIntegerFCurve());
+  curves.emplace_back(new ZvBooleanFCurve());
+  if (withRotation) curves.emplace_back(new ZvQuatFCurve(0));
+  for (auto& c : curves) {
+    for (size_t i = 0; i < at.size(); ++i)
+      EXPECT_EQ(c->CreateKey(at[i], static_cast<double>(i % 2)), 1u);
+  }
+  return curves;
+}
+
+// Runs `op` on every kind and expects it to be refused with the keys untouched.
+template <class Op>
+void ExpectRefusedUnchanged(const std::vector<double>& at, Op op, bool withRotation = true) {
+  for (auto& c : AllKinds(at, withRotation)) {
+    SCOPED_TRACE(c->GetKind());
+    EXPECT_EQ(op(*c), 0u);
+    EXPECT_EQ(KeysOf(*c), at);
+  }
+}
+
+TEST(HostileCurveInput, MergeNeverBreaksKeyOrder) {
+  ExpectRefusedUnchanged(
+      {0, 10}, [](ZvBaseFCurve& c) { return c.MergeAndCreateKey(10, 15, 10, 1, 1, 0, 0); }, false);
+  ExpectRefusedUnchanged(
+      {0, 10}, [](ZvBaseFCurve& c) { return c.MergeAndCreateKey(12, 20, 5, 1, 0, 0, 0); }, false);
+  ZvQuatFCurve rotation(0);
+  rotation.CreateKey(0, 0);
+  rotation.CreateKey(10, 1);
+  rotation.MergeAndCreateKey(12, 20, 5, 1, 0, 0, 0);
+  EXPECT_EQ(KeysOf(rotation), (std::vector<double>{0, 5, 10}));
+  ExpectRefusedUnchanged(
+      {0, 10}, [](ZvBaseFCurve& c) { return c.MergeAndCreateKey(2, 8, kNaN, 1, 0, 0, 0); });
+  // A merge that keeps the order still works on every kind.
+  for (auto& c : AllKinds({0, 10, 20})) {
+    EXPECT_EQ(c->MergeAndCreateKey(5, 25, 15, 1, 0, 0, 0), 1u);
+    EXPECT_EQ(KeysOf(*c), (std::vector<double>{0, 15}));
+  }
+}
+
+TEST(HostileCurveInput, CutNeverLeavesEqualKeys) {
+  {
+    ZvStdFCurve c(-30, -40, 15, 32), out;
+    const std::vector<double> before = KeysOf(c);
+    c.Cut(-30, 14.999999999999998, out);
+    const std::vector<double> k = KeysOf(c);
+    for (size_t i = 1; i < k.size(); ++i)
+      EXPECT_LT(k[i - 1], k[i]);
+    EXPECT_EQ(c.IsValid(), 1u);
+  }
+  for (auto& c : AllKinds({1, 2})) {
+    std::unique_ptr<ZvBaseFCurve> out(c->Clone());
+    c->Cut(-62.5, 0.99999999999999989, *out);
+    const std::vector<double> k = KeysOf(*c);
+    for (size_t i = 1; i < k.size(); ++i)
+      EXPECT_LT(k[i - 1], k[i]) << c->GetKind();
+  }
+}
+
+TEST(HostileCurveInput, WholeCurveMovesRefuseToMergeOrOverflowKeys) {
+  ExpectRefusedUnchanged({0, 1}, [](ZvBaseFCurve& c) { return c.ShiftParameters(1e300); });
+  ExpectRefusedUnchanged({1, 2}, [](ZvBaseFCurve& c) { return c.ScaleParameterAxis(1e308); });
+  ExpectRefusedUnchanged({1, 1.1}, [](ZvBaseFCurve& c) { return c.ScaleParameterAxis(5e-324); });
+  ExpectRefusedUnchanged({0, 1, 1e17}, [](ZvBaseFCurve& c) { return c.MirrorParameters(); });
+  ExpectRefusedUnchanged({DBL_MAX / 2, DBL_MAX},
+                         [](ZvBaseFCurve& c) { return c.MirrorParameters(); });
+}
+
+TEST(HostileCurveInput, KeyReductionReturnsNearTheLargestDouble) {
+  // Cubic runs are refitted; with parameters and values near the largest double the fit
+  // overflows, and the reduction must still move on and keep the order.
+  const double at[] = {DBL_MAX / 8, DBL_MAX / 4, DBL_MAX / 2, DBL_MAX * 0.75, DBL_MAX};
+  for (int variant = 0; variant < 4; ++variant) {
+    ZvStdFCurve c;
+    for (int i = 0; i < 5; ++i) {
+      c.CreateKey(variant & 1 ? at[i] : -at[4 - i],
+                  variant & 2 ? (i % 2 ? DBL_MAX : -DBL_MAX) : i * 1.0);
+    }
+    c.ReduceNumKeys(-DBL_MAX, DBL_MAX, 0.5);
+    c.ReduceNumKeys(-DBL_MAX, DBL_MAX, 1e308);
+    const std::vector<double> k = KeysOf(c);
+    for (size_t i = 1; i < k.size(); ++i)
+      EXPECT_LT(k[i - 1], k[i]);
+  }
+  for (auto& c : AllKinds({DBL_MAX / 4, DBL_MAX / 2, DBL_MAX * 0.75, DBL_MAX})) {
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    c->ReduceNumKeys(-DBL_MAX, DBL_MAX, 0.5);
+    c->ReduceNumKeys(DBL_MAX / 3, DBL_MAX, 1e300);
+    const std::vector<double> k = KeysOf(*c);
+    for (size_t i = 1; i < k.size(); ++i)
+      EXPECT_LT(k[i - 1], k[i]);
+  }
+}
+
+TEST(HostileCurveInput, CycleSamplingOverTooManyPeriodsIsRefused) {
+  for (auto& c : AllKinds({2, 4, 15}, false)) {
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    ZvExtent2<double> box;
+    box.AddPoint(ZvPoint2<double>{0, -10});
+    box.AddPoint(ZvPoint2<double>{1e18, 10});
+    ZvTransfo4 id;
+    ZvPoint2dArray points;
+    ZvPointTagArray tags;
+    ZvBoolArray extrapolated;
+    EXPECT_EQ(c->FlattenFromTo(box, id, 0.01, points, tags, extrapolated, 0), 0u);
+    EXPECT_EQ(points.size, 0u);
+    ZvDoubleArray params, values;
+    EXPECT_EQ(c->EvalSequence(0, 1e18, 1e12, 0.01, params, values, 0), 0u);
+    EXPECT_EQ(c->EvalSequence(0, 100, 1e-12, 0.01, params, values, 0), 0u);
+  }
+}
+
+TEST(HostileCurveInput, ResamplingIsBoundedByTheKeyCap) {
+  for (auto& c : AllKinds({0, 1e6})) {
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    EXPECT_EQ(c->ResampleSequence(0, 1e6, 1e-13, 0, 0), 0u);
+    EXPECT_EQ(c->ResampleSequence(0, 4.29e9, 1e-3, 0, 0), 0u);
+    EXPECT_EQ(KeysOf(*c), (std::vector<double>{0, 1e6}));
+    EXPECT_EQ(c->ResampleSequence(0, 1e6, 1e5, 0, 0), 1u);
+    EXPECT_EQ(c->GetNumKeys(), 11u);
+  }
+  // A downward step makes the same keys as an upward one (they are placed in ascending order).
+  for (auto& c : AllKinds({0, 10}, false)) {
+    EXPECT_EQ(c->ResampleSequence(10, 0, -1, 0, 0), 1u);
+    std::vector<double> expected;
+    for (int i = 0; i <= 10; ++i)
+      expected.push_back(i);
+    EXPECT_EQ(KeysOf(*c), expected) << c->GetKind();
+  }
+  // Samples in front of many keys would each move all of them: refused.
+  ZvRawFCurve many;
+  ASSERT_EQ(many.ResampleSequence(0, 1e6, 1, 0, 0), 1u);
+  EXPECT_EQ(many.ResampleSequence(-1, 0, 1e-6, 1, 0), 0u);
+  EXPECT_EQ(many.GetNumKeys(), 1000001u);
+}
+
+TEST(HostileCurveInput, NonFiniteParametersAreNeverStored) {
+  ZvStdFCurve a(kNaN, 1, 2, 3);
+  EXPECT_EQ(a.GetNumKeys(), 0u);
+  ZvStdFCurve b(0, 1, kInf, 3);
+  EXPECT_EQ(b.GetNumKeys(), 0u);
+  ZvStdFCurve d(kNaN, 1.0, 1.0, ZvBaseFCurve::CubicSegment);
+  EXPECT_EQ(d.GetNumKeys(), 0u);
+  ZvRawFCurve r(kInf, 1.0);
+  EXPECT_EQ(r.GetNumKeys(), 0u);
+  ZvRawFCurve r2(0, 1, kNaN, 2);
+  EXPECT_EQ(r2.GetNumKeys(), 0u);
+  for (auto& c : AllKinds({0, 1})) {
+    EXPECT_EQ(c->CreateKey(kNaN, 0), 0u);
+    EXPECT_EQ(c->CreateKey(-kInf, 0), 0u);
+    EXPECT_EQ(c->CreateNonModifyingKey(kInf, 1), 0u);
+    EXPECT_EQ(c->ShiftParameters(kInf), 0u);
+    EXPECT_EQ(c->RemoveHead(kNaN), 0u);
+    EXPECT_EQ(c->RemoveTail(kInf), 0u);
+    std::unique_ptr<ZvBaseFCurve> snap(c->SnapShot(kNaN, 5, ZvBaseFCurve::ConstantExtrapolation));
+    if (snap) {
+      for (double p : KeysOf(*snap))
+        EXPECT_TRUE(std::isfinite(p)) << c->GetKind();
+    }
+    EXPECT_EQ(KeysOf(*c), (std::vector<double>{0, 1}));
+  }
+}
+
+TEST(HostileCurveInput, KeyQueriesAtNaNFindNoKey) {
+  // One key is the case where a NaN used to reach the bisection and read past the keys.
+  for (auto& c : AllKinds({3})) {
+    unsigned int index;
+    EXPECT_EQ(c->GetKeyIndex(kNaN, index), 0u);
+    c->Eval(kNaN, 0);
+  }
+  for (auto& c : AllKinds({0, 1, 2})) {
+    SCOPED_TRACE(c->GetKind());
+    unsigned int index = 7;
+    EXPECT_EQ(c->GetKeyIndex(kNaN, index), 0u);
+    double p = kNaN, v;
+    EXPECT_EQ(c->IsKeyParameter(kNaN, 1.0), 0u);
+    EXPECT_EQ(c->GetNearestKeyParameter(kNaN, p), 0u);
+    EXPECT_EQ(c->GetNextKeyParameter(kNaN, p, 1), 0u);
+    EXPECT_EQ(c->GetPrevKeyParameter(kNaN, p, 1), 0u);
+    EXPECT_EQ(c->GetKeyValue(kNaN, ZvBaseFCurve::RightSide, v, 1.0), 0u);
+    EXPECT_EQ(c->SetKeyValue(kNaN, ZvBaseFCurve::RightSide, 1, 1.0), 0u);
+    EXPECT_EQ(c->RemoveKey(kNaN, 1.0), 0u);
+    EXPECT_EQ(c->GetNumKeys(), 3u);
+  }
+}
+
+}  // namespace
