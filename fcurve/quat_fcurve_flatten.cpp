@@ -111,6 +111,8 @@ void ZvQuatCurveFlatten(const ZvQuatCurve& curve, double start, double end,
     at.push_back(end);
     keyed.push_back(false);
   }
+  // A reversed or NaN range reaches no key and no end: nothing to sample.
+  if (at.empty()) return;
   const unsigned int from = times.size;
   ZvPoint3<double> v0 = curve.Eval(at[0]);
   for (size_t i = 0; i + 1 < at.size(); ++i) {

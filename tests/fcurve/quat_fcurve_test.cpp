@@ -47,6 +47,20 @@ TEST_F(QuatViews, KeysMadeOnOneViewAreSeenByAll) {
   EXPECT_NEAR(z.Eval(5.0, 0), -45.0, 1e-9);
 }
 
+TEST_F(QuatViews, SnapshotsOfRangesThatReachNoKeyAreSafe) {
+  ASSERT_EQ(x.CreateKey(1.0, 10.0), 1u);
+  ASSERT_EQ(x.CreateKey(2.0, 20.0), 1u);
+  ASSERT_EQ(x.CreateKey(3.0, 30.0), 1u);
+  // Reversed and NaN ranges sample nothing rather than read an anchor that is not there.
+  for (const double end : {1.5, std::nan("")}) {
+    ZvBaseFCurve* shot = x.SnapShot(2.5, end, ZvBaseFCurve::ConstantExtrapolation);
+    if (shot) {
+      EXPECT_LE(shot->GetNumKeys(), 2u);
+    }
+    delete shot;
+  }
+}
+
 TEST_F(QuatViews, ReadOnlyAndLocksRefuseChanges) {
   x.CreateKey(0.0, 10.0);
   x.CreateKey(2.0, 20.0);
