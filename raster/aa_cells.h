@@ -14,6 +14,10 @@
 
 #include <cstdint>
 
+#if defined(__SSE2__)
+#include <emmintrin.h>
+#endif
+
 struct ZvCells4x4 {
   using Word = std::uint32_t;
   static constexpr int N = 4;
@@ -103,6 +107,26 @@ inline void ZvMarkCells(typename C::Word* cells, typename C::Word* runs, int row
   const Word whole = C::RowBits << (row * C::N);
   runs[a + 1] ^= whole;  // b = a + 1 flips twice: no inner cell
   runs[b] ^= whole;
+}
+
+// The first cell at or after `x` where `cells` or `runs` is non-zero, given that there is one.
+// Inside and outside a large shape most cells are blank, so the scan goes a vector of cells at
+// a time where the machine has one (reading up to 16 bytes past the found cell: the rows are
+// padded for it), and finishes cell by cell.
+template <class Word>
+inline int ZvNextMarkedCell(const Word* cells, const Word* runs, int x) {
+#if defined(__SSE2__)
+  constexpr int perVector = 16 / sizeof(Word);
+  const __m128i zero = _mm_setzero_si128();
+  for (;; x += perVector) {
+    const __m128i v = _mm_or_si128(_mm_loadu_si128(reinterpret_cast<const __m128i*>(cells + x)),
+                                   _mm_loadu_si128(reinterpret_cast<const __m128i*>(runs + x)));
+    if (_mm_movemask_epi8(_mm_cmpeq_epi8(v, zero)) != 0xFFFF) break;
+  }
+#endif
+  while (!(cells[x] | runs[x]))
+    ++x;
+  return x;
 }
 
 // The masks of the nine cells around a pixel whose counts make its feathered value: the square

@@ -97,20 +97,18 @@ class AASweep {
   }
 
   // Writes the values of the touched cells and clears them and the runs for the next row.
-  // Inside a shape the cells covered whole in every sub-sample row come as one stretch up to the
-  // next flip of the runs; nothing was set in them, and their value is written as a block.
+  // A cell that no span ends in is known by the runs alone, and so is every cell after it up to
+  // the next flip or end: inside a shape, outside it and along its horizontal edges such a
+  // stretch takes one value and is written as a block. The last touched cell holds an end, so
+  // the stretch stops there at the latest.
   void OutputOwnCells(Word* cells, Word* runs, int lo, int hi, T* out) const {
-    const T full = Pixel::Value(N * N, weight);
     Word whole = 0;
     for (int x = lo; x <= hi;) {
       whole ^= runs[x];
       runs[x] = 0;
-      if (whole == C::AllBits) {
-        // Every run open here closes by the last touched cell, so a flip lies ahead.
-        int stop = x + 1;
-        while (!runs[stop])
-          ++stop;
-        std::fill(out + x, out + stop, full);
+      if (!cells[x]) {
+        const int stop = ZvNextMarkedCell(cells, runs, x + 1);
+        std::fill(out + x, out + stop, CellValue(whole));
         x = stop;
         continue;
       }

@@ -26,14 +26,19 @@ void FreeRows(Word* (&rows)[3], Word*& runs, std::int32_t first) {
 // Rows are indexed by cell. A block that starts at cell min(first, 0) keeps row pointers inside
 // their blocks (a pointer before a block's start is undefined); the cells left of a box that
 // begins right of 0 are never touched, so only first..end-1 are cleared.
+//
+// Each row has 16 zero bytes past cell end - 1: the scan for the next marked cell reads a whole
+// vector at a time, and the last one may reach past the last cell.
 template <class Word>
 Word* AllocateRow(ZvScratchSlot slot, int first, int end) {
   const int origin = first < 0 ? first : 0;
-  Word* row = static_cast<Word*>(ZvScratchTake(
-                  slot, ZvScratchBytes(static_cast<std::size_t>(end - origin), sizeof(Word)))) -
-              origin;
+  const std::size_t pad = 16 / sizeof(Word);
+  Word* row =
+      static_cast<Word*>(ZvScratchTake(
+          slot, ZvScratchBytes(static_cast<std::size_t>(end - origin) + pad, sizeof(Word)))) -
+      origin;
   std::memset(static_cast<void*>(row + first), 0,
-              sizeof(Word) * static_cast<std::size_t>(end - first));
+              sizeof(Word) * (static_cast<std::size_t>(end - first) + pad));
   return row;
 }
 
