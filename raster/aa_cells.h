@@ -14,6 +14,10 @@
 
 #include <cstdint>
 
+#if defined(__SSE2__)
+#include <emmintrin.h>
+#endif
+
 struct ZvCells4x4 {
   using Word = std::uint32_t;
   static constexpr int N = 4;
@@ -21,6 +25,7 @@ struct ZvCells4x4 {
   static constexpr Word RowBits = 0xF;
   static constexpr Word AllBits = 0xFFFF;
   static Word* (&Rows(CFillContext& ctx))[3] { return ctx.abuffer; }
+  static Word* Runs(CFillContext& ctx) { return ctx.aruns; }
   static void Allocate(CFillContext& ctx, int first, int end, bool three) {
     ctx.AllocateCoverageRows4x4(first, end, three);
   }
@@ -34,6 +39,7 @@ struct ZvCells8x8 {
   static constexpr Word RowBits = 0xFF;
   static constexpr Word AllBits = ~Word(0);
   static Word* (&Rows(CFillContext& ctx))[3] { return ctx.abuffer8; }
+  static Word* Runs(CFillContext& ctx) { return ctx.aruns8; }
   static void Allocate(CFillContext& ctx, int first, int end, bool three) {
     ctx.AllocateCoverageRows8x8(first, end, three);
   }
@@ -76,6 +82,51 @@ inline void ZvSetCells(typename C::Word* cells, int row, int x0, int x1, int& mi
   for (int c = a + 1; c < b; ++c)
     cells[c] |= whole;
   cells[b] |= right;
+}
+
+// The sweep's form of ZvSetCells: the end cells of the span are set, and its inner cells become
+// a run of `runs` (see CFillContext::aruns), two flips whatever the span's length. Inner cells of
+// one sub-sample row never hold an end of another span of that row (the row's spans are
+// disjoint), so a cell covered whole by runs in every sub-sample row has no bit set in `cells`.
+template <class C>
+inline void ZvMarkCells(typename C::Word* cells, typename C::Word* runs, int row, int x0, int x1,
+                        int& minCell, int& maxCell) {
+  using Word = typename C::Word;
+  const int a = x0 >> C::Shift;
+  const int b = x1 >> C::Shift;
+  if (a < minCell) minCell = a;
+  if (b > maxCell) maxCell = b;
+  const Word left = ZvCellLeftMask<C>(row, x0 & (C::N - 1));
+  const Word right = ZvCellRightMask<C>(row, x1 & (C::N - 1));
+  if (a == b) {
+    cells[a] |= left & right;
+    return;
+  }
+  cells[a] |= left;
+  cells[b] |= right;
+  const Word whole = C::RowBits << (row * C::N);
+  runs[a + 1] ^= whole;  // b = a + 1 flips twice: no inner cell
+  runs[b] ^= whole;
+}
+
+// The first cell at or after `x` where `cells` or `runs` is non-zero, given that there is one.
+// Inside and outside a large shape most cells are blank, so the scan goes a vector of cells at
+// a time where the machine has one (reading up to 16 bytes past the found cell: the rows are
+// padded for it), and finishes cell by cell.
+template <class Word>
+inline int ZvNextMarkedCell(const Word* cells, const Word* runs, int x) {
+#if defined(__SSE2__)
+  constexpr int perVector = 16 / sizeof(Word);
+  const __m128i zero = _mm_setzero_si128();
+  for (;; x += perVector) {
+    const __m128i v = _mm_or_si128(_mm_loadu_si128(reinterpret_cast<const __m128i*>(cells + x)),
+                                   _mm_loadu_si128(reinterpret_cast<const __m128i*>(runs + x)));
+    if (_mm_movemask_epi8(_mm_cmpeq_epi8(v, zero)) != 0xFFFF) break;
+  }
+#endif
+  while (!(cells[x] | runs[x]))
+    ++x;
+  return x;
 }
 
 // The masks of the nine cells around a pixel whose counts make its feathered value: the square

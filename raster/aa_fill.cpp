@@ -45,18 +45,20 @@ class AASweep {
     for (int py = yLo - e; py < yHi + e; ++py) {
       if (!perSubRow && callback && callback()) return 0;
       Word* cells = rows[radius > 0 ? 2 : 0];
+      Word* runs = C::Runs(ctx);
       int minCell = end, maxCell = -1;
       for (int r = 0; r < N; ++r) {
         if (perSubRow && callback && callback()) return 0;
         sweep.Advance(py * N + r);
         sweep.template Spans<NonZero>(first * N, end * N, [&](int x0, int x1) {
-          ZvSetCells<C>(cells, r, x0, x1, minCell, maxCell);
+          ZvMarkCells<C>(cells, runs, r, x0, x1, minCell, maxCell);
         });
       }
       if (radius == 0) {
-        OutputOwnCells(cells, minCell, maxCell, Row(py));
+        OutputOwnCells(cells, runs, minCell, maxCell, Row(py));
         continue;
       }
+      ResolveRuns(cells, runs, minCell, maxCell);
       rowMin[2] = minCell;
       rowMax[2] = maxCell;
       if (py >= yLo + 1) {
@@ -88,19 +90,41 @@ class AASweep {
       cells[x] = 0;
   }
 
-  // Writes the values of the touched cells and clears them for the next row. Inside a shape
-  // whole cells come in runs, and their value is known without counting.
-  void OutputOwnCells(Word* cells, int lo, int hi, T* out) const {
-    const T full = Pixel::Value(N * N, weight);
-    for (int x = lo; x <= hi; ++x) {
-      const Word w = cells[x];
+  T CellValue(Word w) const {
+    if (Unity && N == 4 && std::is_same<T, unsigned char>::value)
+      return static_cast<T>(gc_oABTable[w & 0xFFFFu]);  // the table holds the value
+    return Pixel::Value(C::Count(w), weight);
+  }
+
+  // Writes the values of the touched cells and clears them and the runs for the next row.
+  // A cell that no span ends in is known by the runs alone, and so is every cell after it up to
+  // the next flip or end: inside a shape, outside it and along its horizontal edges such a
+  // stretch takes one value and is written as a block. The last touched cell holds an end, so
+  // the stretch stops there at the latest.
+  void OutputOwnCells(Word* cells, Word* runs, int lo, int hi, T* out) const {
+    Word whole = 0;
+    for (int x = lo; x <= hi;) {
+      whole ^= runs[x];
+      runs[x] = 0;
+      if (!cells[x]) {
+        const int stop = ZvNextMarkedCell(cells, runs, x + 1);
+        std::fill(out + x, out + stop, CellValue(whole));
+        x = stop;
+        continue;
+      }
+      out[x] = CellValue(cells[x] | whole);
       cells[x] = 0;
-      if (Unity && N == 4 && std::is_same<T, unsigned char>::value)
-        out[x] = static_cast<T>(gc_oABTable[w & 0xFFFFu]);  // the table holds the value
-      else if (w == C::AllBits)
-        out[x] = full;
-      else
-        out[x] = Pixel::Value(C::Count(w), weight);
+      ++x;
+    }
+  }
+
+  // The runs into the cells, for the feathered output that reads three rows of cells.
+  static void ResolveRuns(Word* cells, Word* runs, int lo, int hi) {
+    Word whole = 0;
+    for (int x = lo; x <= hi; ++x) {
+      whole ^= runs[x];
+      runs[x] = 0;
+      cells[x] |= whole;
     }
   }
 

@@ -13,27 +13,40 @@ namespace {
 const ZvScratchSlot kCellSlots[3] = {ZvScratch_Cells0, ZvScratch_Cells1, ZvScratch_Cells2};
 
 template <class Word>
-void FreeRows(Word* (&rows)[3], std::int32_t first) {
+void FreeRows(Word* (&rows)[3], Word*& runs, std::int32_t first) {
   const std::int32_t origin = first < 0 ? first : 0;
   for (int i = 0; i < 3; ++i) {
     if (rows[i]) ZvScratchGive(kCellSlots[i], rows[i] + origin);
     rows[i] = nullptr;
   }
+  if (runs) ZvScratchGive(ZvScratch_CellRuns, runs + origin);
+  runs = nullptr;
 }
 
 // Rows are indexed by cell. A block that starts at cell min(first, 0) keeps row pointers inside
 // their blocks (a pointer before a block's start is undefined); the cells left of a box that
 // begins right of 0 are never touched, so only first..end-1 are cleared.
+//
+// Each row has 16 zero bytes past cell end - 1: the scan for the next marked cell reads a whole
+// vector at a time, and the last one may reach past the last cell.
 template <class Word>
-void AllocateRows(Word* (&rows)[3], int first, int end, bool three) {
+Word* AllocateRow(ZvScratchSlot slot, int first, int end) {
   const int origin = first < 0 ? first : 0;
-  for (int i = 0; i < (three ? 3 : 1); ++i) {
-    Word* block = static_cast<Word*>(ZvScratchTake(
-        kCellSlots[i], ZvScratchBytes(static_cast<std::size_t>(end - origin), sizeof(Word))));
-    rows[i] = block - origin;
-    std::memset(static_cast<void*>(rows[i] + first), 0,
-                sizeof(Word) * static_cast<std::size_t>(end - first));
-  }
+  const std::size_t pad = 16 / sizeof(Word);
+  Word* row =
+      static_cast<Word*>(ZvScratchTake(
+          slot, ZvScratchBytes(static_cast<std::size_t>(end - origin) + pad, sizeof(Word)))) -
+      origin;
+  std::memset(static_cast<void*>(row + first), 0,
+              sizeof(Word) * (static_cast<std::size_t>(end - first) + pad));
+  return row;
+}
+
+template <class Word>
+void AllocateRows(Word* (&rows)[3], Word*& runs, int first, int end, bool three) {
+  for (int i = 0; i < (three ? 3 : 1); ++i)
+    rows[i] = AllocateRow<Word>(kCellSlots[i], first, end);
+  runs = AllocateRow<Word>(ZvScratch_CellRuns, first, end);
 }
 
 template <class T>
@@ -49,8 +62,8 @@ CFillContext::~CFillContext() {
   vertices = nullptr;
   sortedVertices = nullptr;
   activeEdges = nullptr;
-  FreeRows(abuffer, firstCell);
-  FreeRows(abuffer8, firstCell);
+  FreeRows(abuffer, aruns, firstCell);
+  FreeRows(abuffer8, aruns8, firstCell);
   delete[] featherFilter;
   delete[] cumulativeFeatherFilter;
   delete[] static_cast<unsigned char*>(rowBuffer0);
@@ -101,11 +114,11 @@ int CFillContext::BuildTables(const ZvPoint2dArray& points, const ZvPointTagArra
 void CFillContext::AllocateCoverageRows4x4(int first, int end, bool three) {
   firstCell = first;
   endCell = end;
-  AllocateRows(abuffer, first, end, three);
+  AllocateRows(abuffer, aruns, first, end, three);
 }
 
 void CFillContext::AllocateCoverageRows8x8(int first, int end, bool three) {
   firstCell = first;
   endCell = end;
-  AllocateRows(abuffer8, first, end, three);
+  AllocateRows(abuffer8, aruns8, first, end, three);
 }

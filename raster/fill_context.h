@@ -61,7 +61,7 @@ class CFillContext {
   int BuildTables(const ZvPoint2dArray& points, const ZvPointTagArray& tags, double scale);
 
   // Zeroed coverage rows of cells indexed first..end-1 (row pointers pre-offset by `first`): one
-  // row, or three when `three`.
+  // row, or three when `three`, and the row of runs.
   void AllocateCoverageRows4x4(int first, int end, bool three);
   void AllocateCoverageRows8x8(int first, int end, bool three);
 
@@ -79,6 +79,11 @@ class CFillContext {
   CFillActiveEdge* activeEdges = nullptr;
   std::uint32_t* abuffer[3] = {nullptr, nullptr, nullptr};   // 4x4 cells, low 16 bits
   std::uint64_t* abuffer8[3] = {nullptr, nullptr, nullptr};  // 8x8 cells
+  // Whole-cell runs of the newest coverage row, in the cells' layout: a run of sub-sample row r
+  // flips row r's bits at its first cell and one past its last, so a running exclusive or over
+  // the row gives each cell the sub-sample rows that cover it whole.
+  std::uint32_t* aruns = nullptr;
+  std::uint64_t* aruns8 = nullptr;
   std::int32_t firstCell = 0;
   std::int32_t endCell = 0;
   double* featherFilter = nullptr;            // soft fill

@@ -33,6 +33,7 @@ enum ZvScratchSlot {
   ZvScratch_Cells0,
   ZvScratch_Cells1,
   ZvScratch_Cells2,
+  ZvScratch_CellRuns,
   ZvScratch_SlotCount
 };
 

@@ -35,7 +35,7 @@ class CFillSweep {
     const double yc = y + 0.5;
     if (cursor < numVertices && ctx.vertices[ctx.sortedVertices[cursor].index].y <= yc)
       TakeVertices(y);
-    else
+    else if (crossed)
       OrderEdges();
   }
 
@@ -45,29 +45,30 @@ class CFillSweep {
   template <bool NonZero, class Span>
   void Spans(int leftLimit, int rightExclusive, Span&& span) {
     CFillActiveEdge* e = edges;
+    crossed = false;
     if (!NonZero) {
       for (int i = 0; i + 1 < numActive; i += 2) {
         const double xl = e[i].x;
         const double xr = e[i + 1].x;
         if (xr > xl) Emit(xl, xr, leftLimit, rightExclusive, span);
-        e[i].x += e[i].dxdy;
-        e[i + 1].x += e[i + 1].dxdy;
+        Step(e, i);
+        Step(e, i + 1);
       }
-      if (numActive & 1) e[numActive - 1].x += e[numActive - 1].dxdy;
+      if (numActive & 1) Step(e, numActive - 1);
       return;
     }
     int i = 0;
     while (i < numActive) {
       const double xl = e[i].x;
       int winding = e[i].direction;
-      e[i].x += e[i].dxdy;
+      Step(e, i);
       ++i;
       double xr = xl;
       double end = HUGE_VAL;  // edges run out: the span reaches the right limit
       while (i < numActive) {
         xr = e[i].x;
         winding += e[i].direction;
-        e[i].x += e[i].dxdy;
+        Step(e, i);
         ++i;
         if (winding == 0) {
           end = xr;
@@ -79,6 +80,13 @@ class CFillSweep {
   }
 
  private:
+  // Advances edge i by one row and notes whether it went past the edge before it (advanced
+  // already): the next row's ordering pass is skipped when no edge did, which is the usual case.
+  void Step(CFillActiveEdge* e, int i) {
+    e[i].x += e[i].dxdy;
+    crossed |= i > 0 && After(e[i - 1], e[i]);
+  }
+
   static std::size_t Count(int n) { return n > 0 ? static_cast<std::size_t>(n) : 0; }
 
   // The rows that reach vertices, out of line: in most shapes most rows take none.
@@ -150,6 +158,7 @@ class CFillSweep {
   CFillActiveEdge* other;
   int cursor = 0;
   int numActive = 0;
+  bool crossed = true;  // the table may be out of order: edges moved since it was last ordered
 };
 
 #endif
