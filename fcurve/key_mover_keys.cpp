@@ -308,7 +308,8 @@ std::unique_ptr<CFCMoverKeys> Keys(Impl& store) {
 template <class Curve, class Impl>
 std::unique_ptr<CFCMoverKeys> SingleValueKeys(ZvBaseFCurve& curve) {
   Curve* c = dynamic_cast<Curve*>(&curve);
-  return c ? Keys(CFCSingleValueCurve<Curve, Impl>::Of(*c)) : nullptr;
+  if (!c) return nullptr;
+  return Keys(CFCSingleValueCurve<Curve, Impl>::Of(*c));
 }
 
 }  // namespace
@@ -323,7 +324,8 @@ std::unique_ptr<CFCMoverKeys> CFCMakeMoverKeys(ZvBaseFCurve& curve) {
       return SingleValueKeys<ZvRawFCurve, ZvRawFCurveImpl>(curve);
     case ZvBaseFCurve::StdKind: {
       ZvStdFCurve* c = dynamic_cast<ZvStdFCurve*>(&curve);
-      return c ? Keys(CFCCurveStore::Of(*c)) : nullptr;
+      if (!c) return nullptr;
+      return Keys(CFCCurveStore::Of(*c));
     }
     case ZvBaseFCurve::QuatKind: {
       ZvQuatFCurve* c = dynamic_cast<ZvQuatFCurve*>(&curve);

@@ -17,6 +17,7 @@ ZvQuatFCurve::ZvQuatFCurve(ZvQuatCurve* curve, unsigned int component)
 }
 
 // The base part is built fresh: a copy of a view starts without user data.
+// NOLINTNEXTLINE(bugprone-copy-constructor-init): the user data stay with the original view.
 ZvQuatFCurve::ZvQuatFCurve(const ZvQuatFCurve& other) : ZvBaseFCurve(), m_curve(nullptr) {
   ZvFCurveLockGuard hold(other);
   m_curve = new ZvQuatCurve(*other.m_curve);

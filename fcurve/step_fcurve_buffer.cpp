@@ -85,7 +85,7 @@ bool Read(ZvByteReader& in, ZvStepFCurveImpl& s) {
   const std::uint32_t stamp = in.U32();
   if (stamp < kByteFlagsStamp || stamp == 0xFFFFFFFFu) return false;
   if (in.U32() != Layout::kKind || in.U32() != Layout::kIdentifier ||
-      std::memcmp(in.Bytes(sizeof kIdentifierTail), kIdentifierTail, sizeof kIdentifierTail)) {
+      std::memcmp(in.Bytes(sizeof kIdentifierTail), kIdentifierTail, sizeof kIdentifierTail) != 0) {
     return false;
   }
   s.valueWhenNoKeys = Layout::HeaderValue(in);

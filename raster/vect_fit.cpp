@@ -11,6 +11,7 @@
 
 void ComputeTgtVector(const ZvPoint2fArray& samples, unsigned int index,
                       ZvPoint2<double>& tangent) {
+  if (samples.size < 2) return;
   const unsigned int n = samples.size - 1;  // the loop without its repeated end
   const unsigned int i = index;
   auto at = [&samples](unsigned int k) { return ZvPoint2<double>{samples[k].x, samples[k].y}; };

@@ -109,7 +109,7 @@ int ZvPath2f::ReplaceSubpathSection(unsigned int start, unsigned int end, const 
   ZvShapeLock guard(*this);
   if (&source == this) {
     // The stretch would move under the splice: take it from a copy.
-    const ZvPath2f copy(source);
+    const ZvPath2f copy(source);  // NOLINT(performance-unnecessary-copy-initialization)
     return ZvPath2f::ReplaceSubpathSection(start, end, copy, first, last);
   }
   ZvShapeLock guardSource(source);
