@@ -2,8 +2,9 @@
 # Builds and runs every ```cpp block of the README against an installed libzv, exactly as
 # printed. Usage: readme_programs.sh README.md PREFIX WORKDIR
 set -euo pipefail
-readme=$1 prefix=$2 work=$3
-mkdir -p "$work"
+readme=$1 prefix=$2
+mkdir -p "$3"
+work=$(cd "$3" && pwd)
 awk -v dir="$work" '
   /^```cpp$/ { n++; file = sprintf("%s/readme_%d.cpp", dir, n); inside = 1; next }
   /^```$/    { inside = 0; next }
