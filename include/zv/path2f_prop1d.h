@@ -192,6 +192,10 @@ class ZV_API ZvPath2fProp1d : public ZvPath2f {
   // The reader behind ReadFromBufferBody and ReadFromBuffer; `bounded` adds the checks an
   // untrusted block needs.
   unsigned int ReadBody(const unsigned char* body, std::size_t size, bool bounded);
+  // Sample with values; `keepChoppedValue` keeps the value of a closing sample that the even
+  // sampling chopped.
+  unsigned int SampleWithValues(const ZvGC& gc, ZvPoint2fArray& points, ZvPointTagArray& tags,
+                                ZvDoubleArray& values, bool keepChoppedValue) const;
   // Exchanges points, codes and open flag with `other`; allocates nothing.
   void SwapGeometry(ZvPath2fProp1d& other);
   // Runs a path edit of the subpath holding `index` and moves the records of the subpaths behind
