@@ -89,6 +89,13 @@ class ZV_API ZvPath2fProp1d : public ZvPath2f {
   // they were: the second half does not restart at 0).
   int RemoveSubpathSection(unsigned int start, unsigned int end) override;
 
+  // The path's non-virtual edits that change point counts, redone here so that the records
+  // follow; called through a ZvPath2f reference they would leave the records behind.
+  // Empties the path and drops every curve; never throws.
+  void Clear();
+  // Closes the subpath holding `index` as the path's CloseSubpath does (a line may be added).
+  int CloseSubpath(unsigned int index);
+
   // ---- Property curves ----------------------------------------------------------------------
   // 1 if the subpath holding `index` has a curve, else 0 (also for an index outside the path).
   int HasPropCurve(unsigned int index) const;

@@ -5,6 +5,7 @@
 #include <zv/path2f_prop1d.h>
 
 #include <random>
+#include <vector>
 
 // An open line 0..1 and an open polyline 2..4.
 inline ZvPath2fProp1d TwoLines() {
@@ -57,6 +58,25 @@ inline ZvPath2fProp1d RandomPropPath(std::mt19937& rng) {
     }
   }
   return path;
+}
+
+// Every record names a subpath start: as many curves are found at the starts as are held.
+inline bool PropRecordsHold(const ZvPath2fProp1d& path) {
+  ZvPath2fIter it(path);
+  unsigned int first = 0, last = 0, found = 0;
+  while (it.GetNextSubPathIndices(first, last))
+    found += path.GetPropCurveInsideCriticalSection(first) ? 1 : 0;
+  return found == path.GetNumPropCurves();
+}
+
+// The value each subpath's curve has at 0, subpath by subpath; -1 for none.
+inline std::vector<double> StartValues(const ZvPath2fProp1d& path) {
+  std::vector<double> out;
+  ZvPath2fIter it(path);
+  unsigned int first = 0, last = 0;
+  while (it.GetNextSubPathIndices(first, last))
+    out.push_back(path.HasPropCurve(first) ? path.EvalPropCurve(first, 0.0) : -1.0);
+  return out;
 }
 
 #endif

@@ -222,4 +222,54 @@ TEST(PathPropEdit, SectionReplacementsMoveTheRecordsBehind) {
   EXPECT_TRUE(PathInvariantHolds(path));
   EXPECT_EQ(0, path.ReplaceSubpathSection(2, 1));
   EXPECT_NE(nullptr, path.GetPropCurveInsideCriticalSection(6));
+  // Closing the first subpath adds its closing line in front of the second.
+  ASSERT_EQ(1, path.CloseSubpath(0));
+  EXPECT_NE(nullptr, path.GetPropCurveInsideCriticalSection(7));
+  EXPECT_TRUE(PathInvariantHolds(path));
+  path.Clear();
+  EXPECT_EQ(0u, path.GetNumPropCurves());
+}
+
+TEST(PathPropEdit, RandomEditsKeepEachCurveOnItsSubpath) {
+  // Each subpath's curve is told apart by its value; edits inside one subpath must leave the
+  // sequence of values as it was, and removing a subpath must drop exactly its value.
+  std::mt19937 rng(11);
+  for (int round = 0; round < 300; ++round) {
+    ZvPath2fProp1d path = RandomPropPath(rng);
+    ZvPath2fIter it(path);
+    unsigned int first = 0, last = 0;
+    double tag = 1.0;
+    while (it.GetNextSubPathIndices(first, last))
+      if (rng() % 3) path.SetPropCurve(first, ZvRawFCurve(0.0, tag++));
+    std::vector<double> before = StartValues(path);
+    const unsigned int n = path.NumPoints();
+    const unsigned int index = static_cast<unsigned int>(rng() % n);
+    unsigned int ordinal = 0;
+    for (ZvPath2fIter walk(path); walk.GetNextSubPathIndices(first, last) && last < index;)
+      ++ordinal;
+    path.GetSubpathIndices(index, first, last);
+    switch (rng() % 4) {
+      case 0:
+        ASSERT_EQ(1, path.RemoveSubpath(index));
+        before.erase(before.begin() + ordinal);
+        break;
+      case 1:
+        path.CloseSubpath(index);
+        break;
+      case 2:
+        path.ReplaceSubpathSection(first, last);
+        break;
+      default: {
+        const unsigned int a = first + static_cast<unsigned int>(rng() % (last - first + 1));
+        const unsigned int b = a + static_cast<unsigned int>(rng() % (last - a + 1));
+        // A cut that keeps points on both sides splits the subpath: both halves keep its curve.
+        if (path.RemoveSubpathSection(a, b) && first < a && b < last)
+          before.insert(before.begin() + ordinal, before[ordinal]);
+        break;
+      }
+    }
+    ASSERT_TRUE(PropRecordsHold(path)) << round;
+    ASSERT_TRUE(PathInvariantHolds(path)) << round;
+    EXPECT_EQ(before, StartValues(path)) << round;
+  }
 }
