@@ -34,6 +34,7 @@
 #include <cstddef>
 
 class ZvPath2fProp1dImpl;
+class ZvShapeLock;
 
 class ZV_API ZvPath2fProp1d : public ZvPath2f {
  public:
@@ -196,6 +197,7 @@ class ZV_API ZvPath2fProp1d : public ZvPath2f {
   unsigned int GetNumPropCurves() const;
 
  private:
+  ZvPath2fProp1d(const ZvPath2fProp1d& other, const ZvShapeLock& held);
   // The reader behind ReadFromBufferBody and ReadFromBuffer; `bounded` adds the checks an
   // untrusted block needs.
   unsigned int ReadBody(const unsigned char* body, std::size_t size, bool bounded);
