@@ -30,14 +30,17 @@ ZvPath2fProp1d& ZvPath2fProp1d::operator=(const ZvPath2fProp1d& other) {
   if (this == &other) return *this;
   ZvShapeLock guard(*this);
   ZvShapeLock guardOther(other);
-  ZvPath2f::operator=(other);
   m_impl->Clear();
+  ZvPath2fProp1dImpl copy;
   try {
-    ZvPath2fProp1dImpl copy(*other.m_impl);
-    m_impl->Swap(copy);
+    ZvPath2fProp1dImpl(*other.m_impl).Swap(copy);
   } catch (const std::bad_alloc&) {
-    // The geometry is whole; a subpath without a curve is still a valid property path.
+    // The geometry alone is still a valid property path: its subpaths have no curves.
   }
+  ZvPath2f::operator=(other);
+  // The path's assignment leaves it empty when its copy fails; records would then name no
+  // subpath.
+  if (points.size == other.points.size) m_impl->Swap(copy);
   return *this;
 }
 

@@ -45,8 +45,9 @@ class ZV_API ZvPath2fProp1d : public ZvPath2f {
   ZvPath2fProp1d(const ZvPath2fProp1d& other);
   // The geometry of `path`, with no curves.
   explicit ZvPath2fProp1d(const ZvPath2f& path);
-  // Frees this path's curves and deep-copies the source's. If a copy cannot be allocated this
-  // path keeps the source's geometry and no curves; nothing throws. On itself a no-op.
+  // Frees this path's curves and deep-copies the source's. If the curves cannot be allocated
+  // this path takes the source's geometry without curves; if the geometry cannot, it ends up
+  // empty, as a path's assignment does. Nothing throws. On itself a no-op.
   ZvPath2fProp1d& operator=(const ZvPath2fProp1d& other);
   ~ZvPath2fProp1d() override;
 
