@@ -2,7 +2,7 @@
 // object as it was; an accepted one must describe a path whose codes parse and whose records
 // name subpath starts, must read the same through the shape factory and the trusted body
 // reader, and must write back to a block that reads back to the same bytes. The property
-// queries then walk every subpath.
+// queries then walk every subpath, and the polylines with values pair points and values.
 #include <zv/gc.h>
 #include <zv/path2f_prop1d.h>
 
@@ -42,6 +42,35 @@ void Walk(const ZvPath2fProp1d& path) {
   if (curves != path.GetNumPropCurves()) std::abort();
 }
 
+// The polylines with values, on paths small enough that their point counts stay modest (an
+// unclipped flatten costs the size over the tolerance). Points and values must pair up.
+void Sample(const ZvPath2fProp1d& path) {
+  ZvExtent2<double> box;
+  path.GetTightExtent(box);
+  if (box.kind != ZvExtent2<double>::Regular ||
+      !(box.xmin > -1e3 && box.ymin > -1e3 && box.xmax < 1e3 && box.ymax < 1e3))
+    return;
+  ZvGC gc;
+  ZvPoint2fArray points;
+  ZvPointTagArray tags;
+  ZvDoubleArray values;
+  path.Flatten(gc, points, tags, values);
+  if (values.size != points.size || tags.size != points.size) std::abort();
+  points.Chop(0);
+  tags.Chop(0);
+  values.Chop(0);
+  path.PropertySample(gc, points, tags, values);
+  if (values.size != points.size || tags.size != points.size) std::abort();
+  path.Sample(gc, points, tags, values);
+  const ZvExtent2<float> window(0, 0, 16, 16);
+  ZvDoubleArray kept;
+  points.Chop(0);
+  tags.Chop(0);
+  path.IntersectSamplePointsExtent(gc, window, points, tags, kept, 1);
+  path.IntersectPropertySamplePointsExtent(gc, window, points, tags, kept, 1);
+  if (kept.size != points.size) std::abort();
+}
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
@@ -67,5 +96,6 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   if (again.ReadFromBuffer(block.data(), block.size()) != block.size() || Block(again) != block)
     std::abort();
   Walk(path);
+  Sample(path);
   return 0;
 }
