@@ -89,6 +89,13 @@ class ZV_API ZvPath2fProp1d : public ZvPath2f {
   // they were: the second half does not restart at 0).
   int RemoveSubpathSection(unsigned int start, unsigned int end) override;
 
+  // The path's non-virtual edits that change point counts, redone here so that the records
+  // follow; called through a ZvPath2f reference they would leave the records behind.
+  // Empties the path and drops every curve; never throws.
+  void Clear();
+  // Closes the subpath holding `index` as the path's CloseSubpath does (a line may be added).
+  int CloseSubpath(unsigned int index);
+
   // ---- Property curves ----------------------------------------------------------------------
   // 1 if the subpath holding `index` has a curve, else 0 (also for an index outside the path).
   int HasPropCurve(unsigned int index) const;
@@ -192,6 +199,10 @@ class ZV_API ZvPath2fProp1d : public ZvPath2f {
   // The reader behind ReadFromBufferBody and ReadFromBuffer; `bounded` adds the checks an
   // untrusted block needs.
   unsigned int ReadBody(const unsigned char* body, std::size_t size, bool bounded);
+  // Sample with values; `keepChoppedValue` keeps the value of a closing sample that the even
+  // sampling chopped.
+  unsigned int SampleWithValues(const ZvGC& gc, ZvPoint2fArray& points, ZvPointTagArray& tags,
+                                ZvDoubleArray& values, bool keepChoppedValue) const;
   // Exchanges points, codes and open flag with `other`; allocates nothing.
   void SwapGeometry(ZvPath2fProp1d& other);
   // Runs a path edit of the subpath holding `index` and moves the records of the subpaths behind
