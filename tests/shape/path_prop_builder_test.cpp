@@ -123,6 +123,31 @@ TEST(PathPropBuilder, ValuesFollowThePressure) {
   }
 }
 
+TEST(PathPropBuilder, FittedStrokesReadTheCurveWhereTheSamplesAre) {
+  // A pen shaking across a straight line: the input zigzags, much longer than the fitted path,
+  // while the pressure rises with x. Read at the input's own arc lengths, the values would run
+  // ahead of the samples.
+  ZvPoint2fArray stroke;
+  std::vector<double> pressure;
+  for (int k = 0; k <= 50; ++k) {
+    stroke.Add(4.0f * k, k % 2 ? 2.0f : -2.0f);
+    pressure.push_back(1.0 + k / 50.0);
+  }
+  ZvGC gc;
+  gc.propertyTolerance = 0.001;
+  for (int live = 0; live < 2; ++live) {
+    SCOPED_TRACE(::testing::Message() << "live " << live);
+    ZvPath2fProp1d path(0);
+    ZvBezierFitPathPropBuilder builder(gc, &path, 32.0, 2.0, 3.0, 3);
+    const std::vector<Sample> samples = Feed(builder, stroke, pressure, live != 0);
+    ASSERT_GT(samples.size(), 150u);
+    double worst = 0.0;
+    for (const Sample& s : samples)
+      worst = std::max(worst, std::fabs(s.value - (1.0 + s.point.x / 200.0)));
+    EXPECT_LT(worst, 0.05);
+  }
+}
+
 TEST(PathPropBuilder, ClosedSubpathsCarryThePropertyBackToTheStart) {
   // Five sixths of a circle, pressure rising from 1 to 2, closed by the chord back (48 px).
   ZvPoint2fArray stroke;
