@@ -23,20 +23,9 @@
 #include <memory>
 #include <vector>
 
+#include "fuzz/pen_stream.h"
+
 namespace {
-float Coordinate(const uint8_t* p) {
-  return static_cast<float>(static_cast<int16_t>(p[0] | (p[1] << 8))) / 8.0f;
-}
-
-bool SamePrefix(const ZvPath2f& path, const ZvPath2f& before) {
-  if (path.NumPoints() < before.NumPoints()) return false;
-  for (unsigned int i = 0; i < before.NumPoints(); ++i) {
-    const ZvPoint2<float> a = path.GetPoint(i), b = before.GetPoint(i);
-    if (a.x != b.x || a.y != b.y) return false;
-  }
-  return true;
-}
-
 struct Range {
   double low = HUGE_VAL, high = -HUGE_VAL;
   void Take(double v) {
@@ -73,7 +62,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   bool pendingEnd = false;
   std::vector<unsigned int> finished;  // a point of every subpath the builder finished
   for (size_t at = 4; at + 6 <= size; at += 6) {
-    const ZvPoint2<float> p{Coordinate(data + at), Coordinate(data + at + 2)};
+    const ZvPoint2<float> p{PenCoordinate(data + at), PenCoordinate(data + at + 2)};
     const double pressure = data[at + 4] / 64.0;
     const uint8_t action = data[at + 5];
     const ZvPath2f before(path);
@@ -111,7 +100,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
           range = Range();
         }
     }
-    if (!SamePrefix(path, before)) std::abort();
+    if (!KeepsPrefix(path, before)) std::abort();
   }
   // The structure reads back: every index lies in a subpath and a segment.
   for (unsigned int i = 0; i < path.NumPoints(); ++i) {

@@ -17,6 +17,7 @@
 #include <string>
 #include <vector>
 
+#include "path_builder_feed.h"
 #include "path_fixtures.h"
 #include "tests/curvemath/bezier_fit_strokes.h"
 
@@ -35,23 +36,31 @@ void Take(const ZvPoint2fArray& batch, const ZvDoubleArray& values, std::vector<
 
 // Feeds a stroke with its pressures as a live pen would: the trailing samples after every
 // point with `live`, and the end in one call or, with `twoStep`, as EndSubpath and then
-// GetTrailingSamples. Returns every sample of the subpath with its value.
+// GetTrailingSamples, checking that every commit keeps what the path held. Returns every
+// sample of the subpath with its value.
 std::vector<Sample> Feed(ZvBasePathPropBuilder& builder, const ZvPoint2fArray& stroke,
                          const std::vector<double>& pressure, bool live, int close = 0,
                          bool twoStep = false) {
   std::vector<Sample> out;
   ZvDoubleArray values;
+  const auto commit = [&](const char* when) {
+    const std::vector<ZvPoint2<float>> before = PointsOf(*builder.GetPath());
+    Take(builder.GetTrailingSamples(values), values, out);
+    EXPECT_TRUE(PathKeepsPrefix(*builder.GetPath(), before)) << when;
+  };
   for (unsigned int i = 0; i + 1 < stroke.size; ++i) {
     builder.AddInputPoint(stroke[i], pressure[i], 0);
-    if (live) Take(builder.GetTrailingSamples(values), values, out);
+    if (live) commit("live");
   }
   const unsigned int last = stroke.size - 1;
   if (twoStep) {
     builder.EndSubpath(stroke[last], pressure[last], close);
-    Take(builder.GetTrailingSamples(values), values, out);
+    commit("at the end");
   } else {
+    const std::vector<ZvPoint2<float>> before = PointsOf(*builder.GetPath());
     Take(builder.EndSubpathAndGetTrailingSamples(stroke[last], pressure[last], values, close),
          values, out);
+    EXPECT_TRUE(PathKeepsPrefix(*builder.GetPath(), before)) << "at the end";
   }
   return out;
 }
@@ -63,24 +72,25 @@ std::unique_ptr<ZvBasePathPropBuilder> MakeBuilder(int kind, const ZvGC& gc, ZvP
       new ZvBezierFitPathPropBuilder(gc, path, 32.0, 2.0, 0.5, 3));
 }
 
+// The arc length the curve of a path of one subpath covers, checked against the path's own
+// length (to 1%, the fit's curves measured finely flattened).
+double CurveSpanningThePath(const ZvPath2fProp1d& path) {
+  double end = 0.0;
+  EXPECT_TRUE(path.HasPropCurve(0));
+  EXPECT_TRUE(path.GetPropCurve(0).GetLargestKeyParameter(end));
+  ZvPoint2fArray flat;
+  ZvPointTagArray tags;
+  path.AltFlatten(0.01, flat, tags);
+  EXPECT_NEAR(end, ZvPoint2fArraySingleComponent_ComputeLength(flat), 0.01 * end);
+  return end;
+}
+
 // The pressure the pen had at the stroke's point nearest to q, searched a few edges on from
 // `edge` (the samples come in order along the stroke), interpolated along that edge.
 double PressureNear(const ZvPoint2<float>& q, const ZvPoint2fArray& stroke,
                     const std::vector<double>& pressure, unsigned int& edge) {
-  double best = HUGE_VAL, value = 0.0;
-  const unsigned int from = edge;
-  for (unsigned int k = from; k + 1 < stroke.size && k < from + 12; ++k) {
-    const double ax = stroke[k].x, ay = stroke[k].y;
-    const double bx = stroke[k + 1].x, by = stroke[k + 1].y;
-    const double l2 = (bx - ax) * (bx - ax) + (by - ay) * (by - ay);
-    double t = l2 > 0 ? ((q.x - ax) * (bx - ax) + (q.y - ay) * (by - ay)) / l2 : 0.0;
-    t = t < 0 ? 0 : (t > 1 ? 1 : t);
-    const double d = std::hypot(ax + t * (bx - ax) - q.x, ay + t * (by - ay) - q.y);
-    if (d >= best) continue;
-    best = d;
-    edge = k;
-    value = pressure[k] + t * (pressure[k + 1] - pressure[k]);
-  }
+  double value = 0.0;
+  Nearest(q, stroke, edge, edge + 12, &pressure, &value, &edge);
   return value;
 }
 }  // namespace
@@ -111,13 +121,7 @@ TEST(PathPropBuilder, ValuesFollowThePressure) {
       EXPECT_LT(worst, gc.propertyTolerance + 0.03);
       EXPECT_GT(edge, stroke.size - 4) << "the samples reach the end of the stroke";
       // The finished curve spans the subpath's length and ends on the last pressure.
-      ASSERT_TRUE(path.HasPropCurve(0));
-      double end = 0.0;
-      ASSERT_TRUE(path.GetPropCurve(0).GetLargestKeyParameter(end));
-      ZvPoint2fArray flat;
-      ZvPointTagArray tags;
-      path.AltFlatten(0.01, flat, tags);
-      EXPECT_NEAR(end, ZvPoint2fArraySingleComponent_ComputeLength(flat), 0.01 * end);
+      const double end = CurveSpanningThePath(path);
       EXPECT_NEAR(path.EvalPropCurve(0, end), pressure.back(), gc.propertyTolerance);
     }
   }
@@ -166,12 +170,7 @@ TEST(PathPropBuilder, ClosedSubpathsCarryThePropertyBackToTheStart) {
       const std::vector<Sample> samples = Feed(*builder, stroke, pressure, true, 1, twoStep != 0);
       EXPECT_TRUE(path.IsSubpathClosed(0));
       // The curve runs over the closing part too, back to the first value.
-      double end = 0.0;
-      ASSERT_TRUE(path.GetPropCurve(0).GetLargestKeyParameter(end));
-      ZvPoint2fArray flat;
-      ZvPointTagArray tags;
-      path.AltFlatten(0.01, flat, tags);
-      EXPECT_NEAR(end, ZvPoint2fArraySingleComponent_ComputeLength(flat), 0.01 * end);
+      const double end = CurveSpanningThePath(path);
       EXPECT_NEAR(path.EvalPropCurve(0, end), 1.0, 1e-9);
       // The closing part is sampled: from the sample nearest the last pen point on, the values
       // fall from (about) the last pressure to the first one, the samples reaching the start.
@@ -192,7 +191,7 @@ TEST(PathPropBuilder, ClosedSubpathsCarryThePropertyBackToTheStart) {
   }
 }
 
-TEST(PathPropBuilder, SubpathsEndInTwoStepsAndStartAfresh) {
+TEST(PathPropBuilder, SubpathsEndInTwoStepsOrAreResetAndStartAfresh) {
   ZvGC gc;
   for (int kind = 0; kind < 2; ++kind) {
     SCOPED_TRACE(::testing::Message() << "builder " << kind);
@@ -202,7 +201,7 @@ TEST(PathPropBuilder, SubpathsEndInTwoStepsAndStartAfresh) {
     for (int k = 0; k < 10; ++k)
       builder->AddInputPoint(P(5.0f * k, 0), 2.0, 0);
     builder->GetTrailingSamples(values);
-    const unsigned int committed = path.NumPoints();
+    unsigned int committed = path.NumPoints();
     // EndSubpath only takes the point: the path waits for the next GetTrailingSamples.
     builder->EndSubpath(P(50, 10), 4.0, 0);
     EXPECT_EQ(path.NumPoints(), committed);
@@ -215,51 +214,33 @@ TEST(PathPropBuilder, SubpathsEndInTwoStepsAndStartAfresh) {
     EXPECT_EQ(values.size, 0u);
     const double firstEnd = path.EvalPropCurve(0, 1e9);
 
-    // The next point starts a subpath of its own, with its own curve; the first one stays.
-    std::vector<Sample> second;
+    // The next point starts a subpath of its own. Reset drops what it did not commit; the path
+    // keeps the rest.
+    for (int k = 0; k < 6; ++k)
+      builder->AddInputPoint(P(5.0f * k, 30), 9.0, 0);
+    builder->GetTrailingSamples(values);
+    committed = path.NumPoints();
+    const ZvPoint2<float> end = path.GetCurrentPoint();
+    for (int k = 6; k < 12; ++k)
+      builder->AddInputPoint(P(5.0f * k, 33), 9.0, 0);
+    builder->Reset();
+    EXPECT_EQ(path.NumPoints(), committed);
+    EXPECT_EQ(path.GetCurrentPoint().x, end.x);
+
+    // A third stroke has nothing of the dropped input, and a curve of its own.
+    std::vector<Sample> third;
     for (int k = 0; k < 5; ++k)
-      builder->AddInputPoint(P(0, 20.0f + 5.0f * k), 7.0, 0);
-    Take(builder->EndSubpathAndGetTrailingSamples(P(0, 45), 7.0, values, 0), values, second);
-    EXPECT_EQ(path.NumSubpaths(), 2u);
-    ASSERT_GT(second.size(), 20u);
-    EXPECT_EQ(second[0].point.y, 20.0f);
-    for (const Sample& s : second)
+      builder->AddInputPoint(P(100, 20.0f + 5.0f * k), 7.0, 0);
+    Take(builder->EndSubpathAndGetTrailingSamples(P(100, 45), 7.0, values, 0), values, third);
+    EXPECT_EQ(path.NumSubpaths(), 3u);
+    EXPECT_EQ(path.GetPoint(committed).x, 100.0f);
+    EXPECT_EQ(path.GetPoint(committed).y, 20.0f);
+    ASSERT_GT(third.size(), 20u);
+    EXPECT_EQ(third[0].point.y, 20.0f);
+    for (const Sample& s : third)
       EXPECT_DOUBLE_EQ(s.value, 7.0);
     EXPECT_EQ(path.EvalPropCurve(0, 1e9), firstEnd);
     EXPECT_DOUBLE_EQ(path.EvalPropCurve(path.NumPoints() - 1, 0.0), 7.0);
-  }
-}
-
-TEST(PathPropBuilder, ResetDropsTheUncommittedInput) {
-  ZvGC gc;
-  for (int kind = 0; kind < 2; ++kind) {
-    SCOPED_TRACE(::testing::Message() << "builder " << kind);
-    ZvPath2fProp1d path(0);
-    const std::unique_ptr<ZvBasePathPropBuilder> builder = MakeBuilder(kind, gc, &path);
-    ZvDoubleArray values;
-    for (int k = 0; k < 6; ++k)
-      builder->AddInputPoint(P(5.0f * k, 0), 1.0, 0);
-    builder->GetTrailingSamples(values);
-    const unsigned int committed = path.NumPoints();
-    const ZvPoint2<float> end = path.GetCurrentPoint();
-    for (int k = 6; k < 12; ++k)
-      builder->AddInputPoint(P(5.0f * k, 3), 9.0, 0);
-    builder->Reset();
-    EXPECT_EQ(path.NumPoints(), committed);
-    // The path keeps what was committed; the next stroke starts a new subpath with nothing
-    // of the dropped input.
-    for (int k = 0; k < 4; ++k)
-      builder->AddInputPoint(P(100, 5.0f * k), 3.0, 0);
-    const ZvPoint2fArray& samples =
-        builder->EndSubpathAndGetTrailingSamples(P(100, 20), 3.0, values, 0);
-    EXPECT_EQ(path.GetPoint(committed - 1).x, end.x);
-    EXPECT_EQ(path.NumSubpaths(), 2u);
-    EXPECT_EQ(path.GetPoint(committed).x, 100.0f);
-    EXPECT_EQ(path.GetPoint(committed).y, 0.0f);
-    ASSERT_GT(samples.size, 0u);
-    EXPECT_EQ(samples[0].x, 100.0f);
-    for (unsigned int k = 0; k < values.size; ++k)
-      EXPECT_DOUBLE_EQ(values[k], 3.0);
   }
 }
 
