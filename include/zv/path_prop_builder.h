@@ -23,7 +23,7 @@
 // that the subpath ends (closed or not), and the next GetTrailingSamples commits and finishes
 // it. Once finished, the builder starts a new subpath on the same path at the next
 // AddInputPoint; Reset drops the input of an unfinished subpath (what it committed stays in the
-// path). A subpath of a lone point gets a Moveto and a one-key curve.
+// path). A subpath of a lone point gets a Moveto and a constant curve.
 //
 // The target path is not owned; it and the ZvGC must outlive the builder. The builder writes
 // only at the end of the path: the points it appended before, and the curves of other subpaths,

@@ -152,6 +152,26 @@ TEST(PathPropBuilder, FittedStrokesReadTheCurveWhereTheSamplesAre) {
   }
 }
 
+TEST(PathPropBuilder, DensifiedPointsTakeThePressureBetweenPenEvents) {
+  // Pen events 20 px apart, densified to 2 px for the fit: the pressure ramps between them
+  // (1 up to 3 and down again), blunted only at the peak by the smoothing.
+  ZvPoint2fArray stroke;
+  stroke.Add(P(0, 0));
+  stroke.Add(P(20, 0));
+  stroke.Add(P(40, 0));
+  const std::vector<double> pressure = {1.0, 3.0, 1.0};
+  ZvGC gc;
+  gc.propertyTolerance = 0.001;
+  ZvPath2fProp1d path(0);
+  ZvBezierFitPathPropBuilder builder(gc, &path, 32.0, 2.0, 0.5, 3);
+  const std::vector<Sample> samples = Feed(builder, stroke, pressure, true);
+  ASSERT_GE(samples.size(), 40u);
+  for (const Sample& s : samples) {
+    const double x = s.point.x, expected = x <= 20 ? 1.0 + x / 10.0 : 3.0 - (x - 20.0) / 10.0;
+    EXPECT_NEAR(s.value, expected, std::fabs(x - 20.0) < 2.5 ? 0.15 : 0.01) << "at x " << x;
+  }
+}
+
 TEST(PathPropBuilder, ClosedSubpathsCarryThePropertyBackToTheStart) {
   // Five sixths of a circle, pressure rising from 1 to 2, closed by the chord back (48 px).
   ZvPoint2fArray stroke;
