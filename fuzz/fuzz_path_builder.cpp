@@ -16,20 +16,7 @@
 #include <cstdlib>
 #include <memory>
 
-namespace {
-float Coordinate(const uint8_t* p) {
-  return static_cast<float>(static_cast<int16_t>(p[0] | (p[1] << 8))) / 8.0f;
-}
-
-bool SamePrefix(const ZvPath2f& path, const ZvPath2f& before) {
-  if (path.NumPoints() < before.NumPoints()) return false;
-  for (unsigned int i = 0; i < before.NumPoints(); ++i) {
-    const ZvPoint2<float> a = path.GetPoint(i), b = before.GetPoint(i);
-    if (a.x != b.x || a.y != b.y) return false;
-  }
-  return true;
-}
-}  // namespace
+#include "fuzz/pen_stream.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   if (size < 4) return 0;
@@ -51,7 +38,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   }
   bool started = false;
   for (size_t at = 4; at + 5 <= size; at += 5) {
-    const ZvPoint2<float> p{Coordinate(data + at), Coordinate(data + at + 2)};
+    const ZvPoint2<float> p{PenCoordinate(data + at), PenCoordinate(data + at + 2)};
     const uint8_t action = data[at + 4];
     if (!started) {
       builder->StartSubpath(p);
@@ -74,7 +61,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
         builder->EndSubpath(p, (action >> 2) & 1);
         started = false;
     }
-    if (!SamePrefix(path, before)) std::abort();
+    if (!KeepsPrefix(path, before)) std::abort();
   }
   if (started) builder->EndSubpath(builder->GetPath()->GetCurrentPoint(), 0);
   // The structure reads back: every index lies in a subpath and a segment.

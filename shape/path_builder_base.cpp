@@ -53,9 +53,7 @@ ZvPoint2<float> ZvBasePathBuilder::MapInput(const ZvPoint2<float>& p) const {
 }
 
 void ZvBasePathBuilder::AddEndPoint(const ZvPoint2<float>& p) {
-  const ZvPoint2<float> q = MapInput(p);
-  if (inputPoints.size == 0 || !zvBuilderCoincide(q, inputPoints[inputPoints.size - 1]))
-    inputPoints.Add(q);
+  zvAddUnlessCoincident(inputPoints, MapInput(p));
 }
 
 void ZvBasePathBuilder::ComputeTrailingSamplePoints(unsigned int firstNewIndex, int final,
@@ -63,19 +61,7 @@ void ZvBasePathBuilder::ComputeTrailingSamplePoints(unsigned int firstNewIndex, 
   samples.Chop(0);
   const unsigned int n = inputPoints.size;
   if (lastProcessedIndex >= n) return;
-  const unsigned int m = path->NumPoints();
-  work.Chop(0);
-  // New segments start on the node before them, unless the subpath itself is new.
-  const unsigned int start = firstNewIndex == firstPathIndex ? firstNewIndex : firstNewIndex - 1;
-  work.Add(path->GetPoint(start));
-  ZvPoint2<float> control[9];
-  for (unsigned int i = start + 1; i < m;) {
-    unsigned int a, b;
-    if (!path->GetSegmentIndices(i, a, b)) break;
-    path->GetPoints(a, b, control);
-    tool.Flatten(control, 0, b - a, gc.flattenTolerance, &work, 1);
-    i = b + 1;
-  }
+  zvFlattenNewSegments(gc, *path, firstNewIndex, firstPathIndex, tool, work);
   if (firstSamplePending) {
     samples.Add(work[0]);
     firstSamplePending = 0;
@@ -83,6 +69,34 @@ void ZvBasePathBuilder::ComputeTrailingSamplePoints(unsigned int firstNewIndex, 
   double length;
   SampleSubpath(work, 0, work.size - 1, gc.sampleSpacing, length, sampleResidual, samples, final);
   lastProcessedIndex = n - 1;
+}
+
+void zvFlattenNewSegments(const ZvGC& gc, const ZvPath2f& path, unsigned int firstNewIndex,
+                          unsigned int firstPathIndex, ZvBezierTool& tool, ZvPoint2fArray& work) {
+  const unsigned int m = path.NumPoints();
+  work.Chop(0);
+  // New segments start on the node before them, unless the subpath itself is new.
+  const unsigned int start = firstNewIndex == firstPathIndex ? firstNewIndex : firstNewIndex - 1;
+  work.Add(path.GetPoint(start));
+  ZvPoint2<float> control[9];
+  for (unsigned int i = start + 1; i < m;) {
+    unsigned int a, b;
+    if (!path.GetSegmentIndices(i, a, b)) break;
+    path.GetPoints(a, b, control);
+    tool.Flatten(control, 0, b - a, gc.flattenTolerance, &work, 1);
+    i = b + 1;
+  }
+}
+
+void zvLinetoTrailingInputPoints(ZvPath2f* path, const ZvPoint2fArray& input, unsigned int from,
+                                 int close) {
+  const unsigned int n = input.size;
+  if (n == 0) return;
+  for (unsigned int k = from + 1; k < n; ++k)
+    path->Lineto(input[k]);
+  if (!close) return;
+  if (!zvBuilderCoincide(input[n - 1], input[0])) path->Lineto(input[0]);
+  path->Closeto();
 }
 
 unsigned int SampleSubpath(const ZvPoint2fArray& points, unsigned int first, unsigned int last,
@@ -127,13 +141,8 @@ unsigned int SampleSubpath(const ZvPoint2fArray& points, unsigned int first, uns
 
 void SmoothTrailingInputPoints(const ZvGC& gc, unsigned int first, unsigned int last,
                                ZvPoint2fArray& points) {
-  if (last < first + 2) return;
-  ZvPoint2<float> previous = points[first];  // unsmoothed
-  for (unsigned int j = first + 1; j < last; ++j) {
-    const ZvPoint2<float> original = points[j];
-    const ZvPoint2<float> s = (previous + points[j + 1]) * 0.25f + original * 0.5f;
-    // In a dense run smoothing would only pile points onto each other: leave it alone.
-    if (!zvBuilderNear(gc, s, points[j - 1])) points[j] = s;
-    previous = original;
-  }
+  // In a dense run smoothing would only pile points onto each other: leave it alone.
+  zvSmoothRun<float>(points, first, last, [&](const ZvPoint2<float>& s, unsigned int j) {
+    return !zvBuilderNear(gc, s, points[j - 1]);
+  });
 }

@@ -29,12 +29,7 @@ void ZvCubicPathBuilder::AddInputPoint(const ZvPoint2<float>& input, int force) 
 }
 
 void ZvCubicPathBuilder::AddTrailingInputPoints(int close, int final) {
-  if (inputPoints.size == 0) return;
-  if (firstPointPending) {
-    path->Moveto(inputPoints[0]);
-    firstPathIndex = path->NumPoints() - 1;
-    firstPointPending = 0;
-  }
+  zvMovetoOnce(path, inputPoints, firstPointPending, firstPathIndex);
   if (inputPoints.size < 2) return;
   if (close && final && !zvBuilderCoincide(inputPoints[inputPoints.size - 1], inputPoints[0]))
     inputPoints.Add(inputPoints[0]);

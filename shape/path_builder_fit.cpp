@@ -5,21 +5,36 @@
 #include <zv/path_builder.h>
 #include <zv/polyline.h>
 
+#include <cmath>
+
+#include "shape/path_builder_fit_steps.h"
 #include "shape/path_builder_steps.h"
 
 unsigned int cAddPts = 0;
 unsigned int cFitPts = 0;
 
 namespace {
-// Degree 1 could never fit under a fixed direction and would split forever; the path holds at
-// most degree 8.
-unsigned int ClampDegree(unsigned int d) {
-  return d < 2 ? 2 : (d > 8 ? 8 : d);
-}
-
 // The turn test takes every turn of more than 90 degrees as a corner: the squared cosine it
 // must exceed is 0 whatever the chord lengths.
 constexpr double kCornerCos2 = 0.0;
+
+// Is input point i, between two neighbours, a corner?
+int IsCorner(const ZvPoint2fArray& p, unsigned int i, double e) {
+  const ZvPoint2<float>&q = p[i - 1], &r = p[i], &s = p[i + 1];
+  // Edges within the fit tolerance carry no reliable direction.
+  if (std::fabs(double(q.x) - r.x) <= e && std::fabs(double(q.y) - r.y) <= e) return 0;
+  if (std::fabs(double(s.x) - r.x) <= e && std::fabs(double(s.y) - r.y) <= e) return 0;
+  const double ux = double(r.x) - q.x, uy = double(r.y) - q.y;
+  const double vx = double(s.x) - r.x, vy = double(s.y) - r.y;
+  const double dot = uy * vy + ux * vx;
+  if (dot >= 0.0) return 0;
+  return dot * dot > (ux * ux + uy * uy) * kCornerCos2 * (vx * vx + vy * vy);
+}
+
+// Octagonal length of input edge i.
+double EdgeOctagonal(const ZvPoint2fArray& p, unsigned int i) {
+  return zvOctagonalDistance(p[i], p[i + 1]);
+}
 }  // namespace
 
 ZvBezierFitPathBuilder::ZvBezierFitPathBuilder(const ZvGC& gc, ZvPath2f* path,
@@ -28,7 +43,7 @@ ZvBezierFitPathBuilder::ZvBezierFitPathBuilder(const ZvGC& gc, ZvPath2f* path,
     : ZvBasePathBuilder(gc, path),
       longChordDistance(longChordDistance),
       densifySpacing(densifySpacing),
-      fitDegree(ClampDegree(fitDegree)),
+      fitDegree(zvClampFitDegree(fitDegree)),
       fitError(fitError),
       chordLengths(128),
       cornerFlags(128),
@@ -48,64 +63,29 @@ void ZvBezierFitPathBuilder::ReserveInput(unsigned int count) {
 }
 
 void ZvBezierFitPathBuilder::AddInputPoint(const ZvPoint2<float>& input, int force) {
-  const ZvPoint2<float> p = MapInput(input);
-  if (!force && inputPoints.size) {
-    const ZvPoint2<float> last = inputPoints[inputPoints.size - 1];
-    if (zvBuilderNear(gc, p, last)) return;
-    // Dense input lets the fits see the shape of the stroke between sparse pen events; long
-    // edges are left alone and drawn as single cubics.
-    const double d = zvOctagonalDistance(last, p);
-    if (densifySpacing > 0.0 && densifySpacing < d && d <= longChordDistance) {
-      const double step = densifySpacing / d;
-      for (double t = step; t < 1.0; t += step) {
-        inputPoints.Add(last.x + (double(p.x) - last.x) * t, last.y + (double(p.y) - last.y) * t);
-        ++cAddPts;
-      }
-      if (zvBuilderNear(gc, p, inputPoints[inputPoints.size - 1])) {
-        inputPoints[inputPoints.size - 1] = p;
-        --cAddPts;
-        return;
-      }
-    }
-  }
-  inputPoints.Add(p);
-}
-
-int ZvBezierFitPathBuilder::IsCorner(unsigned int i) const {
-  const ZvPoint2<float>&q = inputPoints[i - 1], &r = inputPoints[i], &s = inputPoints[i + 1];
-  const double e = fitError;
-  // Edges within the fit tolerance carry no reliable direction.
-  if (std::fabs(double(q.x) - r.x) <= e && std::fabs(double(q.y) - r.y) <= e) return 0;
-  if (std::fabs(double(s.x) - r.x) <= e && std::fabs(double(s.y) - r.y) <= e) return 0;
-  const double ux = double(r.x) - q.x, uy = double(r.y) - q.y;
-  const double vx = double(s.x) - r.x, vy = double(s.y) - r.y;
-  const double dot = uy * vy + ux * vx;
-  if (dot >= 0.0) return 0;
-  return dot * dot > (ux * ux + uy * uy) * kCornerCos2 * (vx * vx + vy * vy);
-}
-
-double ZvBezierFitPathBuilder::EdgeOctagonal(unsigned int i) const {
-  return zvOctagonalDistance(inputPoints[i], inputPoints[i + 1]);
+  zvAddDensifiedInputPoint(gc, inputPoints, MapInput(input), force, densifySpacing,
+                           longChordDistance, [](unsigned int, double) {});
 }
 
 void ZvBezierFitPathBuilder::AddTrailingInputPoints(int close) {
-  if (inputPoints.size == 0) return;
-  if (firstPointPending) {
-    path->Moveto(inputPoints[0]);
-    firstPathIndex = path->NumPoints() - 1;
-    firstPointPending = 0;
-  }
-  if (inputPoints.size < 2) return;
-  if (close && !zvBuilderCoincide(inputPoints[inputPoints.size - 1], inputPoints[0]))
-    inputPoints.Add(inputPoints[0]);
-  ZvPoint2fArray& p = inputPoints;
-  const unsigned int n = p.size, i = lastProcessedIndex;
-  int startCorner = i != 0 && i < n - 1 ? IsCorner(i) : 0;
+  zvMovetoOnce(path, inputPoints, firstPointPending, firstPathIndex);
+  zvFitTrailingInputPoints(gc, longChordDistance, fitError, fitDegree, lastProcessedIndex, close,
+                           inputPoints, chordLengths, cornerFlags, bezierTool, path);
+}
+
+void zvFitTrailingInputPoints(const ZvGC& gc, double longChordDistance, double fitError,
+                              unsigned int fitDegree, unsigned int lastProcessed, int close,
+                              ZvPoint2fArray& p, ZvDoubleArray& chordLengths,
+                              ZvBoolArray& cornerFlags, ZvBezierTool& tool, ZvPath2f* path) {
+  if (p.size < 2) return;
+  if (close && !zvBuilderCoincide(p[p.size - 1], p[0])) p.Add(p[0]);
+  const unsigned int n = p.size, i = lastProcessed;
+  int startCorner = i != 0 && i < n - 1 ? IsCorner(p, i, fitError) : 0;
   if (i < n - 1 && i == cornerFlags.size) cornerFlags.Add(startCorner);
   // Smoothing stops at corners, so that they stay sharp.
   unsigned int s = i;
   for (unsigned int j = i; j + 1 < n - 1; ++j) {
-    const int corner = IsCorner(j + 1);
+    const int corner = IsCorner(p, j + 1, fitError);
     cornerFlags.Add(corner);
     if (corner) {
       SmoothTrailingInputPoints(gc, s, j + 1, p);
@@ -121,10 +101,10 @@ void ZvBezierFitPathBuilder::AddTrailingInputPoints(int close) {
   for (unsigned int a = i; a < n - 1;) {
     unsigned int b;
     int endCorner = 0;
-    if (EdgeOctagonal(a) < longChordDistance) {
+    if (EdgeOctagonal(p, a) < longChordDistance) {
       // A run of short edges up to a corner, a long edge or the end.
       unsigned int m = 0;
-      while (a + m + 1 < n - 1 && EdgeOctagonal(a + m + 1) < longChordDistance) {
+      while (a + m + 1 < n - 1 && EdgeOctagonal(p, a + m + 1) < longChordDistance) {
         endCorner = cornerFlags[a + m + 1];
         if (endCorner) break;
         ++m;
@@ -135,7 +115,7 @@ void ZvBezierFitPathBuilder::AddTrailingInputPoints(int close) {
       if (count >= fitDegree) {
         cFitPts += m + 2;
         FitBezierCurve(p, chordLengths, fitError, fitDegree, a, startCorner, b, endCorner,
-                       closeHere, bezierTool, path);
+                       closeHere, tool, path);
       } else if (count < 2) {
         CubicInterpolation(p, chordLengths, fitError, a, startCorner, b, endCorner, closeHere,
                            path);

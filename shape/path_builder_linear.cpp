@@ -54,19 +54,8 @@ void ZvLinearPathBuilder::FlushPendingPoint() {
 }
 
 void ZvLinearPathBuilder::AddTrailingInputPoints(int close) {
-  const unsigned int n = inputPoints.size;
-  if (n == 0) return;
-  if (firstPointPending) {
-    path->Moveto(inputPoints[0]);
-    firstPathIndex = path->NumPoints() - 1;
-    firstPointPending = 0;
-  }
-  if (n >= 2 && n - lastProcessedIndex >= 2)
-    for (unsigned int k = lastProcessedIndex + 1; k < n; ++k)
-      path->Lineto(inputPoints[k]);
-  if (!close) return;
-  if (!zvBuilderCoincide(inputPoints[n - 1], inputPoints[0])) path->Lineto(inputPoints[0]);
-  path->Closeto();
+  zvMovetoOnce(path, inputPoints, firstPointPending, firstPathIndex);
+  zvLinetoTrailingInputPoints(path, inputPoints, lastProcessedIndex, close);
 }
 
 void ZvLinearPathBuilder::ComputeTrailingSamplePoints(int final) {

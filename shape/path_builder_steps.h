@@ -88,6 +88,52 @@ unsigned int SampleSubpath(const ZvPoint2fArray& points, unsigned int first, uns
 void SmoothTrailingInputPoints(const ZvGC& gc, unsigned int first, unsigned int last,
                                ZvPoint2fArray& points);
 
+// The 1/4, 1/2, 1/4 filter over v[first+1..last-1], in place, each value mixed from its
+// neighbours as they were before the pass; the ends never move. `accept(s, j)` decides whether
+// the smoothed s replaces v[j] (v[j - 1] already holds its own result). Nothing for fewer than
+// three values. Scalar is the arithmetic of the values (float for points, double for
+// properties).
+template <class Scalar, class Array, class Accept>
+void zvSmoothRun(Array& v, unsigned int first, unsigned int last, Accept accept) {
+  if (last < first + 2) return;
+  auto previous = v[first];  // unsmoothed
+  for (unsigned int j = first + 1; j < last; ++j) {
+    const auto original = v[j];
+    const auto s = (previous + v[j + 1]) * Scalar(0.25) + original * Scalar(0.5);
+    if (accept(s, j)) v[j] = s;
+    previous = original;
+  }
+}
+
+// Appends q to the input unless the input already ends on it (within 1e-7 per axis): answers
+// whether it did.
+inline bool zvAddUnlessCoincident(ZvPoint2fArray& input, const ZvPoint2<float>& q) {
+  if (input.size && zvBuilderCoincide(q, input[input.size - 1])) return false;
+  input.Add(q);
+  return true;
+}
+
+// The subpath's Moveto, at the first commit that has an input point: the path index of the
+// start goes to firstPathIndex and firstPointPending is cleared.
+inline void zvMovetoOnce(ZvPath2f* path, const ZvPoint2fArray& input, int& firstPointPending,
+                         unsigned int& firstPathIndex) {
+  if (!firstPointPending || input.size == 0) return;
+  path->Moveto(input[0]);
+  firstPathIndex = path->NumPoints() - 1;
+  firstPointPending = 0;
+}
+
+// Lines to input points from+1..n-1; with `close`, a line back to the first point when the
+// ends are apart and the subpath's closing.
+void zvLinetoTrailingInputPoints(ZvPath2f* path, const ZvPoint2fArray& input, unsigned int from,
+                                 int close);
+
+// Flattens the path's segments from firstNewIndex on into `work` (emptied first), starting at
+// the node before them, or at firstNewIndex itself when that is the subpath's start: what the
+// last commit drew, as one polyline for sampling.
+void zvFlattenNewSegments(const ZvGC& gc, const ZvPath2f& path, unsigned int firstNewIndex,
+                          unsigned int firstPathIndex, ZvBezierTool& tool, ZvPoint2fArray& work);
+
 // One curve of `degree` fitted over points[first..last] within e, continuing the path's
 // direction unless a corner or the subpath's start says otherwise, or, when it does not fit,
 // the two halves recursively.

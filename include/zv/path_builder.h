@@ -148,10 +148,6 @@ class ZV_API ZvBezierFitPathBuilder : public ZvBasePathBuilder {
 
  protected:
   void AddTrailingInputPoints(int close);
-  // Is input point i, between two neighbours, a corner?
-  int IsCorner(unsigned int i) const;
-  // Octagonal length of input edge i.
-  double EdgeOctagonal(unsigned int i) const;
 
   double longChordDistance;
   double densifySpacing;

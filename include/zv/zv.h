@@ -19,6 +19,7 @@
 #include <zv/path2f.h>
 #include <zv/path2f_prop1d.h>
 #include <zv/path_builder.h>
+#include <zv/path_prop_builder.h>
 #include <zv/point.h>
 #include <zv/polyline.h>
 #include <zv/quat.h>

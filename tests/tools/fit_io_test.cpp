@@ -7,29 +7,38 @@
 #include "tools/zv/svg_path.h"
 
 namespace {
-std::vector<ZvPoint2<float>> Read(const std::string& text) {
+std::vector<ZvPoint2<float>> Read(const std::string& text,
+                                  std::vector<double>* pressuresOut = nullptr) {
   std::vector<ZvPoint2<float>> points;
+  std::vector<double> pressures;
   std::string error;
-  EXPECT_TRUE(ZvReadPenPoints(text, points, error)) << error;
+  EXPECT_TRUE(ZvReadPenPoints(text, points, pressures, error)) << error;
+  if (pressuresOut) *pressuresOut = pressures;
   return points;
 }
 
 std::string Error(const std::string& text) {
   std::vector<ZvPoint2<float>> points;
+  std::vector<double> pressures;
   std::string error;
-  EXPECT_FALSE(ZvReadPenPoints(text, points, error)) << text;
+  EXPECT_FALSE(ZvReadPenPoints(text, points, pressures, error)) << text;
   return error;
 }
 }  // namespace
 
 TEST(FitPoints, PairsWithOrWithoutPressure) {
+  std::vector<double> pressures{9.0};
   const std::vector<ZvPoint2<float>> p =
-      Read("# pen\n1 2\n\n  3.5\t-4 0.7\r\n5,6\n7, 8, 1\n1e1 2E-1");
-  ASSERT_EQ(p.size(), 5u);
+      Read("# pen\n1 2\n\n  3.5\t-4\r\n5,6\n1e1 2E-1", &pressures);
+  ASSERT_EQ(p.size(), 4u);
   EXPECT_EQ(p[1].x, 3.5f);
   EXPECT_EQ(p[1].y, -4.0f);
-  EXPECT_EQ(p[3].x, 7.0f);
-  EXPECT_EQ(p[4].y, 0.2f);
+  EXPECT_EQ(p[3].y, 0.2f);
+  EXPECT_TRUE(pressures.empty());
+  const std::vector<ZvPoint2<float>> q = Read("1 2 0.7\n# c\n7, 8, 0\n", &pressures);
+  ASSERT_EQ(q.size(), 2u);
+  EXPECT_EQ(q[1].x, 7.0f);
+  EXPECT_EQ(pressures, (std::vector<double>{0.7, 0.0}));
   EXPECT_TRUE(Read("").empty());
 }
 
@@ -39,6 +48,10 @@ TEST(FitPoints, BadLinesAreNamedByNumber) {
   // A word, a glued suffix, a trailing comma, no number, no float.
   for (const char* bad : {"x 1", "1 2x", "1 2,", "1 nan", "1 1e39", "1e999 0"})
     EXPECT_EQ(Error(bad).substr(0, 7), "line 1:") << bad;
+  // Pressure on every point or on none, and never below 0.
+  EXPECT_EQ(Error("1 2\n3 4 1\n"), "line 2: a pressure, but the lines before have none");
+  EXPECT_EQ(Error("1 2 1\n3 4\n"), "line 2: no pressure, but the lines before have one");
+  EXPECT_EQ(Error("1 2 -0.5").substr(0, 7), "line 1:");
 }
 
 TEST(FitPoints, PathDataReadsBackExactly) {

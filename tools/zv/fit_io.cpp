@@ -7,7 +7,7 @@
 #include <cstdlib>
 
 bool ZvReadPenPoints(const std::string& text, std::vector<ZvPoint2<float>>& points,
-                     std::string& error) {
+                     std::vector<double>& pressures, std::string& error) {
   std::size_t begin = 0;
   for (unsigned int line = 1; begin < text.size(); ++line) {
     std::size_t end = text.find('\n', begin);
@@ -50,7 +50,20 @@ bool ZvReadPenPoints(const std::string& text, std::vector<ZvPoint2<float>>& poin
               row.substr(lead) + "'";
       return false;
     }
+    // A stroke with pressure on some points only has no width at the others.
+    if (!points.empty() && (count == 3) != !pressures.empty()) {
+      error = "line " + std::to_string(line) +
+              (count == 3 ? ": a pressure, but the lines before have none"
+                          : ": no pressure, but the lines before have one");
+      return false;
+    }
+    if (count == 3 && v[2] < 0.0) {
+      error = "line " + std::to_string(line) + ": the pressure must not be negative, not '" +
+              row.substr(lead) + "'";
+      return false;
+    }
     points.push_back(ZvPoint2<float>{static_cast<float>(v[0]), static_cast<float>(v[1])});
+    if (count == 3) pressures.push_back(v[2]);
   }
   return true;
 }
