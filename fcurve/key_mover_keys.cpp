@@ -243,10 +243,11 @@ class MoverKeys final : public CFCMoverKeys {
   double StartLeftValue(unsigned int i) const override { return LeftValueOf(m_store, m_moved[i]); }
   unsigned short StartFlags(unsigned int i) const override { return m_movedFlags[i]; }
 
+  // Lookups come in the order of a walk over the selection, so each starts where the last ended.
   bool UnmovedKeyNear(double t, double tolerance) const override {
-    const auto it =
-        std::lower_bound(m_restParameters.begin(), m_restParameters.end(), t - tolerance);
-    return it != m_restParameters.end() && *it <= t + tolerance;
+    m_hint = Gallop(m_hint, t - tolerance);
+    const std::size_t at = m_hint;
+    return at < m_restParameters.size() && m_restParameters[at] <= t + tolerance;
   }
 
   void UnmovedAround(double t, double& below, double& above) const override {
@@ -269,11 +270,11 @@ class MoverKeys final : public CFCMoverKeys {
     // it. The unmoved keys below are counted by a search that starts where the previous one
     // ended, so the selection is walked once whatever the curve's size.
     m_newAt.resize(count);
-    auto from = m_restParameters.cbegin();
+    std::size_t from = 0;
     for (unsigned int j = 0; j < count; ++j) {
       const unsigned int i = ascending[j];
       from = Gallop(from, ParameterOf(m_now[i]));
-      m_newAt[i] = static_cast<unsigned int>(from - m_restParameters.cbegin()) + j;
+      m_newAt[i] = static_cast<unsigned int>(from) + j;
     }
     Rewrite(ascending);
     m_at.swap(m_newAt);
@@ -287,18 +288,29 @@ class MoverKeys final : public CFCMoverKeys {
   }
 
  private:
-  // The first unmoved parameter at or above t, searched from `from` on by doubling steps.
-  std::vector<double>::const_iterator Gallop(std::vector<double>::const_iterator from,
-                                             double t) const {
-    const auto end = m_restParameters.cend();
-    std::size_t step = 1;
-    auto hi = from;
-    while (hi != end && *hi < t) {
-      from = hi + 1;
-      hi = static_cast<std::size_t>(end - from) > step ? from + step : end;
-      step *= 2;
+  // The index of the first unmoved parameter at or above t, searched from `from` by steps that
+  // double, in whichever direction t lies: the cost grows with the distance from `from`, not with
+  // the number of keys.
+  std::size_t Gallop(std::size_t from, double t) const {
+    const std::vector<double>& p = m_restParameters;
+    const std::size_t n = p.size();
+    from = std::min(from, n);
+    std::size_t lo = from, hi = from, step = 1;
+    if (from < n && p[from] < t) {
+      while (hi < n && p[hi] < t) {  // p[lo] < t
+        lo = hi;
+        hi = n - hi > step ? hi + step : n;
+        step *= 2;
+      }
+    } else {
+      while (lo > 0 && p[lo - 1] >= t) {  // p[hi] >= t, or hi == n
+        hi = lo - 1;
+        lo = hi > step ? hi - step : 0;
+        step *= 2;
+      }
     }
-    return std::lower_bound(from, hi, t);
+    return static_cast<std::size_t>(std::lower_bound(p.begin() + lo, p.begin() + hi, t) -
+                                    p.begin());
   }
 
   // Writes the store where the layout changes: from each moved key's old index to its new one,
@@ -363,6 +375,7 @@ class MoverKeys final : public CFCMoverKeys {
   std::vector<unsigned short> m_movedFlags, m_restFlags;
   std::vector<double> m_restParameters;
   std::vector<unsigned int> m_at, m_newAt;  // store index of each moved key, now and next
+  mutable std::size_t m_hint = 0;           // where the last lookup of an unmoved key ended
   std::vector<std::pair<unsigned int, unsigned int>> m_spans;
 };
 
