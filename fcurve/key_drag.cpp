@@ -1,5 +1,7 @@
 #include "fcurve/key_drag.h"
 
+#include <algorithm>
+
 bool CFCKeyDrag::CaptureKeys(const ZvDoubleArray& parameters) {
   m_keys = CFCMakeMoverKeys(m_curve);
   if (!m_keys || parameters.size == 0 || !m_keys->Capture(parameters)) {
@@ -41,4 +43,16 @@ void CFCKeyDrag::Relayout(const CFCKeyPlace* places, const unsigned int* ascendi
 void CFCKeyDrag::DropUserData() {
   m_userData.clear();
   m_userDataOwned.clear();
+}
+
+CFCKeyDrag::CurveEnds::CurveEnds(const ZvBaseFCurve& curve) {
+  curve.GetSmallestKeyParameter(first);
+  curve.GetLargestKeyParameter(last);
+}
+
+void CFCKeyDrag::CurveEnds::Widen(ZvExtent2<double>& modified, double viewStart,
+                                  double viewEnd) const {
+  if (modified.kind != ZvExtent2<double>::Regular) return;
+  if (touchesFirst) modified.xmin = std::min(modified.xmin, viewStart);
+  if (touchesLast) modified.xmax = std::max(modified.xmax, viewEnd);
 }

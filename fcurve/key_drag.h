@@ -29,6 +29,23 @@ class CFCKeyDrag {
                 ZvExtent2<double>& modified);
   void DropUserData();
 
+  // Whether a layout moves the curve's first or last key, which changes what is extrapolated:
+  // then the whole view beyond it is to be redrawn.
+  class CurveEnds {
+   public:
+    explicit CurveEnds(const ZvBaseFCurve& curve);
+    // A key moving from `was` to `now`.
+    void Note(double was, double now) {
+      touchesFirst |= was <= first || now <= first;
+      touchesLast |= was >= last || now >= last;
+    }
+    void Widen(ZvExtent2<double>& modified, double viewStart, double viewEnd) const;
+
+   private:
+    double first = 0, last = 0;
+    bool touchesFirst = false, touchesLast = false;
+  };
+
   ZvBaseFCurve& m_curve;
   std::unique_ptr<CFCMoverKeys> m_keys;
   std::vector<double> m_currentParameters;

@@ -181,15 +181,12 @@ int ZvFCurveKeyMoverImpl::Update(ZvPoint2<double>& translation, ZvDoubleArray& n
   DecideStates(translation, parameters.data(), values.data());
   SeparateSelectedKeys(parameters.data());
 
-  double first = 0, last = 0;
-  m_curve.GetSmallestKeyParameter(first);
-  m_curve.GetLargestKeyParameter(last);
-  bool changed = false, touchesFirst = false, touchesLast = false;
+  CurveEnds ends(m_curve);
+  bool changed = false;
   for (unsigned int k = 0; k < m_numKeys; ++k) {
     if (parameters[k] == m_currentParameters[k] && values[k] == m_currentValues[k]) continue;
     changed = true;
-    touchesFirst |= m_currentParameters[k] <= first || parameters[k] <= first;
-    touchesLast |= m_currentParameters[k] >= last || parameters[k] >= last;
+    ends.Note(m_currentParameters[k], parameters[k]);
   }
   if (changed) {
     std::vector<CFCKeyPlace> places(m_numKeys);
@@ -200,11 +197,7 @@ int ZvFCurveKeyMoverImpl::Update(ZvPoint2<double>& translation, ZvDoubleArray& n
     }
     Relayout(places.data(), m_ascending.data(), modifiedExtent);
     m_currentValues = values;
-    // The curve's ends change what is extrapolated, over the whole view.
-    if (modifiedExtent.kind == ZvExtent2<double>::Regular) {
-      if (touchesFirst) modifiedExtent.xmin = std::min(modifiedExtent.xmin, viewStart);
-      if (touchesLast) modifiedExtent.xmax = std::max(modifiedExtent.xmax, viewEnd);
-    }
+    ends.Widen(modifiedExtent, viewStart, viewEnd);
   }
   for (double t : m_currentParameters)
     newParameters.Add(t);

@@ -284,21 +284,16 @@ int ZvFCurveStretcherImpl::Update(ZvPoint2<double>& translation, double viewStar
 
   const std::size_t count = m_moved.size();
   std::vector<CFCKeyPlace> places(count);
-  bool touchesFirst = false, touchesLast = false;
-  double first = 0, last = 0;
-  m_curve.GetSmallestKeyParameter(first);
-  m_curve.GetLargestKeyParameter(last);
+  CurveEnds ends(m_curve);
   for (std::size_t i = 0; i < count; ++i) {
     const Moved& m = m_moved[i];
     const double sx = m.scaled ? s : 1.0;
     double left = m.left.At(s), right = m.right.At(s);
     // A key turned round by a mirror in parameter meets its segments from the other side.
     if (sx < 0) std::swap(left, right);
-    places[i] = CFCKeyPlace{m.parameter.At(s),      right, left, sx, m.leftScaled ? s : 1.0,
-                            m.rightScaled ? s : 1.0};
-    const double was = m_currentParameters[i], now = places[i].parameter;
-    touchesFirst |= was <= first || now <= first;
-    touchesLast |= was >= last || now >= last;
+    const double leftScale = m.leftScaled ? s : 1.0, rightScale = m.rightScaled ? s : 1.0;
+    places[i] = CFCKeyPlace{m.parameter.At(s), right, left, sx, leftScale, rightScale};
+    ends.Note(m_currentParameters[i], places[i].parameter);
   }
   m_ascending.resize(count);
   for (unsigned int i = 0; i < count; ++i)
@@ -307,11 +302,7 @@ int ZvFCurveStretcherImpl::Update(ZvPoint2<double>& translation, double viewStar
     return places[a].parameter < places[b].parameter;
   });
   Relayout(places.data(), m_ascending.data(), modifiedExtent);
-  // The curve's ends change what is extrapolated, over the whole view.
-  if (modifiedExtent.kind == ZvExtent2<double>::Regular) {
-    if (touchesFirst) modifiedExtent.xmin = std::min(modifiedExtent.xmin, viewStart);
-    if (touchesLast) modifiedExtent.xmax = std::max(modifiedExtent.xmax, viewEnd);
-  }
+  ends.Widen(modifiedExtent, viewStart, viewEnd);
   for (double t : m_currentParameters)
     newParameters.Add(t);
   ZvExtent2<double> box = m_box;
