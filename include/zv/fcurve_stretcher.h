@@ -6,19 +6,20 @@
 // from. Units are the curve's: x is the parameter (usually time), y the value (degrees for a
 // rotation component).
 //
-// The keys in the box scale about the pivot: left and right handles scale parameters, top and
-// bottom handles scale values. The scale is the dragged side's new distance from the pivot over
-// its old one; a drag past the pivot gives a negative scale, which mirrors the keys through it.
-// With ripple on, keys beyond the box on the dragged side shift with that side (and, when the
-// pivot is not on the opposite side, keys beyond that side shift with it).
+// The selected keys in the box (parameter and one of their values inside it) scale about the
+// pivot: left and right handles scale parameters, top and bottom handles scale values. The
+// scale is the dragged side's new distance from the pivot over its old one; a drag past the pivot
+// gives a negative scale, which mirrors the keys through it. With ripple on, keys beyond the box on
+// the dragged side shift with that side (and, when the pivot is not on the opposite side, keys
+// beyond that side shift with it).
 //
 // Rules of a stretch; a drag that breaks one is cut back, handed back changed, and flagged:
 // - no key moved in parameter passes a key that does not move, nor comes nearer to it than
 //   0.001 (or than it started); keys that do not move include the locked ones, so a box is never
 //   shrunk past a locked key;
 // - moved keys stay inside `bounds` (when it is Regular), by 0.001 in parameter, 1e-6 in value;
-// - the scale never comes within 0.001 / (box width or height) of zero, nor below
-//   `minimumScale` in size;
+// - the stretched box stays larger than 0.001 in parameter (1e-6 in value): the scale's size
+//   stays above 0.001 / width (1e-6 / height), and at or above `minimumScale`;
 // - a mirror in parameter is allowed only when the moved keys are exactly those scaled in the box
 //   and nothing lies between them: otherwise the scale stops at its smallest positive value.
 // A key whose parameter is locked keeps it, a key whose value is locked keeps that. Tangent
