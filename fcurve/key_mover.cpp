@@ -24,7 +24,7 @@ ZvFCurveKeyMoverImpl::ZvFCurveKeyMoverImpl(ZvBaseFCurve& curve,
                                            const ZvDoubleArray& selectedParameters,
                                            const ZvExtent2<double>& bounds,
                                            const ZvExtent2<double>& selectionExtent)
-    : m_curve(curve),
+    : CFCKeyDrag(curve),
       m_minX(bounds.xmin),
       m_maxX(bounds.xmax),
       m_minY(bounds.ymin),
@@ -36,16 +36,11 @@ ZvFCurveKeyMoverImpl::ZvFCurveKeyMoverImpl(ZvBaseFCurve& curve,
     m_selectionExtentGiven = true;
   }
   ZvFCurveLockGuard guard(m_curve);
-  m_keys = CFCMakeMoverKeys(curve);
   // A parameter that names no key makes the whole drag inert rather than a drag of part of
   // what the user picked.
-  if (!m_keys || selectedParameters.size == 0 || !m_keys->Capture(selectedParameters)) {
-    m_keys.reset();
-    return;
-  }
+  if (!CaptureKeys(selectedParameters)) return;
   m_numKeys = selectedParameters.size;
   m_allKeysSelected = m_numKeys == m_keys->NumKeys();
-  m_currentParameters.resize(m_numKeys);
   m_currentValues.resize(m_numKeys);
   m_state.assign(m_numKeys, Initial);
   m_ascending.resize(m_numKeys);
@@ -60,7 +55,6 @@ ZvFCurveKeyMoverImpl::ZvFCurveKeyMoverImpl(ZvBaseFCurve& curve,
     if (parameterLocked || valueLocked) m_someLocked = true;
     const double t = m_keys->StartParameter(k), v = m_keys->StartValue(k),
                  left = m_keys->StartLeftValue(k);
-    m_currentParameters[k] = t;
     m_currentValues[k] = v;
     m_ascending[k] = k;
     const auto start = [&](unsigned int at) { return m_keys->StartParameter(at); };
@@ -77,17 +71,7 @@ ZvFCurveKeyMoverImpl::ZvFCurveKeyMoverImpl(ZvBaseFCurve& curve,
     return m_currentParameters[a] < m_currentParameters[b];
   });
   m_byStart = m_ascending;
-  // The records are laid out anew at each Update; the user data live beside the curve, keyed by
-  // parameter, and are carried along by hand.
-  if (m_canMove && m_curve.HasUserData()) {
-    m_userData.assign(m_numKeys, nullptr);
-    for (unsigned int k = 0; k < m_numKeys; ++k) {
-      const CFCUserDataSet* set = m_curve.GetUserDataSet(m_currentParameters[k]);
-      if (set == nullptr) continue;
-      m_userDataOwned.push_back(std::make_unique<CFCUserDataSet>(*set));
-      m_userData[k] = m_userDataOwned.back().get();
-    }
-  }
+  if (m_canMove) SaveUserData();
 }
 
 void ZvFCurveKeyMoverImpl::ClampTranslationVector(ZvPoint2<double>& translation) const {
@@ -197,33 +181,23 @@ int ZvFCurveKeyMoverImpl::Update(ZvPoint2<double>& translation, ZvDoubleArray& n
   DecideStates(translation, parameters.data(), values.data());
   SeparateSelectedKeys(parameters.data());
 
-  double first = 0, last = 0;
-  m_curve.GetSmallestKeyParameter(first);
-  m_curve.GetLargestKeyParameter(last);
-  bool changed = false, touchesFirst = false, touchesLast = false;
+  CurveEnds ends(m_curve);
+  bool changed = false;
   for (unsigned int k = 0; k < m_numKeys; ++k) {
     if (parameters[k] == m_currentParameters[k] && values[k] == m_currentValues[k]) continue;
     changed = true;
-    touchesFirst |= m_currentParameters[k] <= first || parameters[k] <= first;
-    touchesLast |= m_currentParameters[k] >= last || parameters[k] >= last;
+    ends.Note(m_currentParameters[k], parameters[k]);
   }
   if (changed) {
-    // Sets of moving keys leave their old places before any arrives, as a key may arrive where
-    // another selected key was.
-    for (unsigned int k = 0; k < m_userData.size(); ++k)
-      if (m_userData[k] && parameters[k] != m_currentParameters[k])
-        m_curve.RemoveKeyUserData(m_currentParameters[k]);
-    m_keys->Layout(parameters.data(), values.data(), m_ascending.data(), modifiedExtent);
-    for (unsigned int k = 0; k < m_userData.size(); ++k)
-      if (m_userData[k] && parameters[k] != m_currentParameters[k])
-        m_curve.SetUserDataSet(*m_userData[k], parameters[k]);
-    m_currentParameters = parameters;
-    m_currentValues = values;
-    // The curve's ends change what is extrapolated, over the whole view.
-    if (modifiedExtent.kind == ZvExtent2<double>::Regular) {
-      if (touchesFirst) modifiedExtent.xmin = std::min(modifiedExtent.xmin, viewStart);
-      if (touchesLast) modifiedExtent.xmax = std::max(modifiedExtent.xmax, viewEnd);
+    std::vector<CFCKeyPlace> places(m_numKeys);
+    for (unsigned int k = 0; k < m_numKeys; ++k) {
+      // A discontinuity keeps its step.
+      const double left = m_keys->StartLeftValue(k) + (values[k] - m_keys->StartValue(k));
+      places[k] = CFCKeyPlace{parameters[k], values[k], left, 1.0, 1.0, 1.0};
     }
+    Relayout(places.data(), m_ascending.data(), modifiedExtent);
+    m_currentValues = values;
+    ends.Widen(modifiedExtent, viewStart, viewEnd);
   }
   for (double t : m_currentParameters)
     newParameters.Add(t);
@@ -243,8 +217,7 @@ int ZvFCurveKeyMoverImpl::Update(ZvPoint2<double>& translation, ZvDoubleArray& n
 int ZvFCurveKeyMoverImpl::Finalize() {
   if (!m_canMove) return 0;
   ZvFCurveLockGuard guard(m_curve);
-  m_userData.clear();
-  m_userDataOwned.clear();
+  DropUserData();
   return 1;
 }
 

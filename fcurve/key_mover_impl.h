@@ -6,12 +6,12 @@
 #include <zv/fcurve.h>
 #include <zv/fcurve_userdata.h>
 
-#include "fcurve/key_mover_keys.h"
+#include "fcurve/key_drag.h"
 
 #include <memory>
 #include <vector>
 
-class ZvFCurveKeyMoverImpl {
+class ZvFCurveKeyMoverImpl : private CFCKeyDrag {
  public:
   // What a key does at one Update.
   enum KeyState : unsigned char {
@@ -37,10 +37,7 @@ class ZvFCurveKeyMoverImpl {
   double MovedValue(unsigned int k, double dy) const;
   void DecideStates(const ZvPoint2<double>& translation, double* parameters, double* values);
   void SeparateSelectedKeys(double* parameters);
-  void MoveUserData(const double* parameters);
 
-  ZvBaseFCurve& m_curve;
-  std::unique_ptr<CFCMoverKeys> m_keys;
   unsigned int m_numKeys = 0;
   ZvExtent2<double> m_selectionExtent;
   bool m_selectionExtentGiven = false;
@@ -51,12 +48,10 @@ class ZvFCurveKeyMoverImpl {
   // The same in left values, which differ from right values at a discontinuity.
   unsigned int m_highestLeft = kNoKey, m_lowestLeft = kNoKey;
   int m_kind;
-  std::vector<double> m_currentParameters, m_currentValues;
+  std::vector<double> m_currentValues;
   std::vector<unsigned char> m_state;
-  std::vector<unsigned int> m_byStart;            // selected keys in rising start parameter
-  std::vector<unsigned int> m_ascending;          // selected keys in rising current parameter
-  std::vector<const CFCUserDataSet*> m_userData;  // owned copies, null where a key had none
-  std::vector<std::unique_ptr<CFCUserDataSet>> m_userDataOwned;
+  std::vector<unsigned int> m_byStart;    // selected keys in rising start parameter
+  std::vector<unsigned int> m_ascending;  // selected keys in rising current parameter
   bool m_allKeysSelected = false;
   bool m_canMove = false;
   bool m_someLocked = false;

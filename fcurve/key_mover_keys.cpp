@@ -111,33 +111,48 @@ double LeftValueOf(const QuatStore& s, const ZvQuatKey& k) {
   return ValueOf(s, k);
 }
 
-void Place(CFCSingleValueKey<int>& k, double t, double v) {
-  k.parameter = t;
-  k.value = CFCWholeKeyValue(v);
+void Place(CFCSingleValueKey<int>& k, const CFCKeyPlace& at) {
+  k.parameter = at.parameter;
+  k.value = CFCWholeKeyValue(at.value);
 }
-void Place(CFCSingleValueKey<double>& k, double t, double v) {
-  k.parameter = t;
-  k.value = v;
+void Place(CFCSingleValueKey<double>& k, const CFCKeyPlace& at) {
+  k.parameter = at.parameter;
+  k.value = at.value;
 }
-// The handles are absolute positions: they travel with the key, and a discontinuity keeps its
-// step.
-void Place(CFCStdKey& k, double t, double v) {
-  const ZvPoint2<double> d{t - k.parameter, v - k.rightValue};
-  k.leftTangent = k.leftTangent + d;
-  k.rightTangent = k.rightTangent + d;
-  k.parameter = t;
-  k.leftValue += d.y;
-  k.rightValue = v;
+// The handles are absolute positions that keep their offsets from the key. They are moved by the
+// key's change and by the change of their offset, so that a key put back where it started, with
+// scales of 1, has its handles back bit for bit.
+void Place(CFCStdKey& k, const CFCKeyPlace& at) {
+  const ZvPoint2<double> left{k.parameter, k.leftValue}, right{k.parameter, k.rightValue};
+  const ZvPoint2<double> toLeft = k.leftTangent - left, toRight = k.rightTangent - right;
+  const ZvPoint2<double> newLeft{at.parameter, at.leftValue}, newRight{at.parameter, at.value};
+  if (at.handleScaleX >= 0) {
+    k.leftTangent =
+        k.leftTangent + (newLeft - left) +
+        ZvPoint2<double>{toLeft.x * (at.handleScaleX - 1), toLeft.y * (at.leftHandleScaleY - 1)};
+    k.rightTangent =
+        k.rightTangent + (newRight - right) +
+        ZvPoint2<double>{toRight.x * (at.handleScaleX - 1), toRight.y * (at.rightHandleScaleY - 1)};
+  } else {
+    // The key order turned round: what reached the previous key reaches the next one now.
+    k.leftTangent =
+        newLeft + ZvPoint2<double>{toRight.x * at.handleScaleX, toRight.y * at.rightHandleScaleY};
+    k.rightTangent =
+        newRight + ZvPoint2<double>{toLeft.x * at.handleScaleX, toLeft.y * at.leftHandleScaleY};
+  }
+  k.parameter = at.parameter;
+  k.leftValue = at.leftValue;
+  k.rightValue = at.value;
 }
 
 template <class Store, class Key>
-void PlaceKey(Store&, Key& k, double t, double v) {
-  Place(k, t, v);
+void PlaceKey(Store&, Key& k, const CFCKeyPlace& at) {
+  Place(k, at);
 }
 // The angle moves by the change in degrees, so that no move leaves it bit for bit unchanged.
-void PlaceKey(QuatStore& s, ZvQuatKey& k, double t, double v) {
-  const double dv = v - ValueOf(s, k);
-  k.time = t;
+void PlaceKey(QuatStore& s, ZvQuatKey& k, const CFCKeyPlace& at) {
+  const double dv = at.value - ValueOf(s, k);
+  k.time = at.parameter;
   if (dv != 0) Angle(k, s.component) += dv / kDegrees;
 }
 
@@ -203,6 +218,7 @@ class MoverKeys final : public CFCMoverKeys {
     }
     m_moved.clear();
     m_movedFlags.clear();
+    m_at = index;
     for (unsigned int at : index) {
       m_moved.push_back(m_store.keys[at]);
       m_movedFlags.push_back(m_store.GetKeyFlags(at));
@@ -227,48 +243,109 @@ class MoverKeys final : public CFCMoverKeys {
   double StartLeftValue(unsigned int i) const override { return LeftValueOf(m_store, m_moved[i]); }
   unsigned short StartFlags(unsigned int i) const override { return m_movedFlags[i]; }
 
+  // Lookups come in the order of a walk over the selection, so each starts where the last ended.
   bool UnmovedKeyNear(double t, double tolerance) const override {
-    const auto it =
-        std::lower_bound(m_restParameters.begin(), m_restParameters.end(), t - tolerance);
-    return it != m_restParameters.end() && *it <= t + tolerance;
+    m_hint = Gallop(m_hint, t - tolerance);
+    const std::size_t at = m_hint;
+    return at < m_restParameters.size() && m_restParameters[at] <= t + tolerance;
   }
 
-  void Layout(const double* parameters, const double* values, const unsigned int* ascending,
+  void UnmovedAround(double t, double& below, double& above) const override {
+    const auto it = std::lower_bound(m_restParameters.begin(), m_restParameters.end(), t);
+    below = it == m_restParameters.begin() ? -HUGE_VAL : *(it - 1);
+    const auto up = std::upper_bound(it, m_restParameters.end(), t);
+    above = up == m_restParameters.end() ? HUGE_VAL : *up;
+  }
+
+  void Layout(const CFCKeyPlace* places, const unsigned int* ascending,
               ZvExtent2<double>& modified) override {
     const unsigned int count = static_cast<unsigned int>(m_moved.size());
     for (unsigned int i = 0; i < count; ++i)
-      AddAround(ParameterOf(m_now[i]), modified);
+      AddAround(m_at[i], modified);
     for (unsigned int i = 0; i < count; ++i) {
       m_now[i] = m_moved[i];
-      PlaceKey(m_store, m_now[i], parameters[i], values[i]);
+      PlaceKey(m_store, m_now[i], places[i]);
     }
-    // One merge of the unmoved records, which never change during the drag, with the moved.
-    const unsigned int n = m_store.keys.size;
-    unsigned int r = 0, m = 0;
-    m_placed.clear();
-    for (unsigned int at = 0; at < n; ++at) {
-      const bool takeMoved = m < count && (r == m_rest.size() ||
-                                           ParameterOf(m_now[ascending[m]]) < m_restParameters[r]);
-      if (takeMoved) {
-        const unsigned int i = ascending[m++];
-        m_store.keys[at] = m_now[i];
-        m_store.SetKeyFlags(at, m_movedFlags[i]);
-        m_placed.push_back(at);
-      } else {
-        m_store.keys[at] = m_rest[r];
-        m_store.SetKeyFlags(at, m_restFlags[r++]);
-      }
+    // A moved key's new index is the number of unmoved keys below it plus the moved keys before
+    // it. The unmoved keys below are counted by a search that starts where the previous one
+    // ended, so the selection is walked once whatever the curve's size.
+    m_newAt.resize(count);
+    std::size_t from = 0;
+    for (unsigned int j = 0; j < count; ++j) {
+      const unsigned int i = ascending[j];
+      from = Gallop(from, ParameterOf(m_now[i]));
+      m_newAt[i] = static_cast<unsigned int>(from) + j;
     }
+    Rewrite(ascending);
+    m_at.swap(m_newAt);
     KeysChanged(m_store);
-    for (unsigned int at : m_placed) {
-      if (at > 0) FitSegment(m_store, at - 1);
-      FitSegment(m_store, at);
+    for (unsigned int i = 0; i < count; ++i) {
+      if (m_at[i] > 0) FitSegment(m_store, m_at[i] - 1);
+      FitSegment(m_store, m_at[i]);
     }
     for (unsigned int i = 0; i < count; ++i)
-      AddAround(ParameterOf(m_now[i]), modified);
+      AddAround(m_at[i], modified);
   }
 
  private:
+  // The index of the first unmoved parameter at or above t, searched from `from` by steps that
+  // double, in whichever direction t lies: the cost grows with the distance from `from`, not with
+  // the number of keys.
+  std::size_t Gallop(std::size_t from, double t) const {
+    const std::vector<double>& p = m_restParameters;
+    const std::size_t n = p.size();
+    from = std::min(from, n);
+    std::size_t lo = from, hi = from, step = 1;
+    if (from < n && p[from] < t) {
+      while (hi < n && p[hi] < t) {  // p[lo] < t
+        lo = hi;
+        hi = n - hi > step ? hi + step : n;
+        step *= 2;
+      }
+    } else {
+      while (lo > 0 && p[lo - 1] >= t) {  // p[hi] >= t, or hi == n
+        hi = lo - 1;
+        lo = hi > step ? hi - step : 0;
+        step *= 2;
+      }
+    }
+    return static_cast<std::size_t>(std::lower_bound(p.begin() + lo, p.begin() + hi, t) -
+                                    p.begin());
+  }
+
+  // Writes the store where the layout changes: from each moved key's old index to its new one,
+  // widened by one on each side for the neighbours whose handles FitSegment shortened last time.
+  // Elsewhere the same numbers of moved keys lie below and above, so the store holds the same
+  // record already.
+  void Rewrite(const unsigned int* ascending) {
+    const unsigned int count = static_cast<unsigned int>(m_moved.size()), n = m_store.keys.size;
+    m_spans.clear();
+    for (unsigned int i = 0; i < count; ++i) {
+      const unsigned int lo = std::min(m_at[i], m_newAt[i]), hi = std::max(m_at[i], m_newAt[i]);
+      m_spans.emplace_back(lo > 0 ? lo - 1 : 0, std::min(hi + 1, n - 1));
+    }
+    std::sort(m_spans.begin(), m_spans.end());
+    unsigned int m = 0, done = 0;  // moved keys placed, first index not yet written
+    for (const auto& span : m_spans) {
+      const unsigned int first = std::max(span.first, done);
+      if (first > span.second) continue;
+      while (m < count && m_newAt[ascending[m]] < first)
+        ++m;
+      unsigned int r = first - m;
+      for (unsigned int at = first; at <= span.second; ++at) {
+        if (m < count && m_newAt[ascending[m]] == at) {
+          const unsigned int i = ascending[m++];
+          m_store.keys[at] = m_now[i];
+          m_store.SetKeyFlags(at, m_movedFlags[i]);
+        } else {
+          m_store.keys[at] = m_rest[r];
+          m_store.SetKeyFlags(at, m_restFlags[r++]);
+        }
+      }
+      done = span.second + 1;
+    }
+  }
+
   // The index of the key at t within the identity tolerance, or the number of keys.
   unsigned int Find(double t) const {
     const unsigned int n = m_store.keys.size;
@@ -283,10 +360,10 @@ class MoverKeys final : public CFCMoverKeys {
     return lo < n && ParameterOf(m_store.keys[lo]) <= t + kKeyIdentity ? lo : n;
   }
 
-  // The key at t in the store as it stands, and its two neighbours, whose segments it shapes.
-  void AddAround(double t, ZvExtent2<double>& modified) const {
-    const unsigned int at = Find(t), n = m_store.keys.size;
-    if (at == n) return;
+  // The key at index `at` of the store as it stands, and its two neighbours, whose segments it
+  // shapes.
+  void AddAround(unsigned int at, ZvExtent2<double>& modified) const {
+    const unsigned int n = m_store.keys.size;
     AddKey(m_store, modified, m_store.keys[at]);
     if (at > 0) AddKey(m_store, modified, m_store.keys[at - 1]);
     if (at + 1 < n) AddKey(m_store, modified, m_store.keys[at + 1]);
@@ -297,7 +374,9 @@ class MoverKeys final : public CFCMoverKeys {
   std::vector<Key> m_moved, m_now, m_rest;
   std::vector<unsigned short> m_movedFlags, m_restFlags;
   std::vector<double> m_restParameters;
-  std::vector<unsigned int> m_placed;
+  std::vector<unsigned int> m_at, m_newAt;  // store index of each moved key, now and next
+  mutable std::size_t m_hint = 0;           // where the last lookup of an unmoved key ended
+  std::vector<std::pair<unsigned int, unsigned int>> m_spans;
 };
 
 template <class Impl>

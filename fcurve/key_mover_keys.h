@@ -4,8 +4,9 @@
 //
 // Records are copied whole (flags, handles, segment kind), so a key that is moved and moved
 // back is the same key bit for bit. The number of keys never changes during a drag, so a
-// layout writes the store's arrays in place: one merge of the unmoved records with the moved
-// ones, linear in the size of the curve and without allocation.
+// layout writes the store's arrays in place, and only where something changed: the stretches
+// between each moved key's last place and its new one, and their neighbours. A drag of a few
+// keys on a long curve costs what those keys cost, not what the curve does.
 #ifndef ZV_FCURVE_KEY_MOVER_KEYS_H
 #define ZV_FCURVE_KEY_MOVER_KEYS_H
 
@@ -28,6 +29,19 @@ inline int CFCWholeKeyValue(double v) {
   return static_cast<int>(v);
 }
 
+// Where one captured key goes. Values are in the curve's units (degrees for a rotation
+// component); kinds with one value per key take `value`. A Bezier key's handles keep their offset
+// from the key, scaled along the parameter by `handleScaleX` and in value by the scale of their own
+// side; a negative `handleScaleX` turns the key round, so its left handle becomes its right one.
+struct CFCKeyPlace {
+  double parameter;
+  double value;      // the right value
+  double leftValue;  // Bezier keys only
+  double handleScaleX;
+  double leftHandleScaleY;
+  double rightHandleScaleY;
+};
+
 class CFCMoverKeys {
  public:
   virtual ~CFCMoverKeys() = default;
@@ -44,10 +58,13 @@ class CFCMoverKeys {
   virtual unsigned short StartFlags(unsigned int i) const = 0;
   // Is an unmoved key within `tolerance` of t?
   virtual bool UnmovedKeyNear(double t, double tolerance) const = 0;
-  // Lays the keys out: selected key i at (parameters[i], values[i]), `ascending` the selected
-  // keys ordered by new parameter. The parameters must keep every key apart. `modified` is
-  // widened by the moved keys before and after, and by their neighbours on both occasions.
-  virtual void Layout(const double* parameters, const double* values, const unsigned int* ascending,
+  // The parameters of the nearest unmoved keys strictly below and above t; minus and plus
+  // infinity where there is none.
+  virtual void UnmovedAround(double t, double& below, double& above) const = 0;
+  // Lays the keys out: selected key i at places[i], `ascending` the selected keys ordered by new
+  // parameter. The parameters must keep every key apart. `modified` is widened by the moved keys
+  // before and after, and by their neighbours on both occasions.
+  virtual void Layout(const CFCKeyPlace* places, const unsigned int* ascending,
                       ZvExtent2<double>& modified) = 0;
 };
 

@@ -58,10 +58,10 @@ unsigned int ZvRawFCurve::MirrorValues() {
 
 unsigned int ZvRawFCurve::ScaleAndOffsetParameters(double start, double end, double pivot,
                                                    double scale, double offset, int moveHead,
-                                                   int moveTail, RegionHandle) {
+                                                   int moveTail, RegionHandle region) {
   ZvFCurveLockGuard guard(*this);
   return CFCScaleAndOffsetParameters(
-      *this, start, end, pivot, scale, offset, moveHead, moveTail,
+      *this, start, end, pivot, scale, offset, moveHead, moveTail, region,
       [](const ZvRawFCurve& work) { return work.m_impl->KeysAreOrdered(); });
 }
 

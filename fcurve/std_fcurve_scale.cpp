@@ -7,8 +7,9 @@
 
 unsigned int ZvStdFCurve::ScaleAndOffsetParameters(double start, double end, double pivot,
                                                    double scale, double offset, int moveHead,
-                                                   int moveTail, RegionHandle) {
+                                                   int moveTail, RegionHandle region) {
   ZvFCurveLockGuard guard(*this);
   return CFCScaleAndOffsetParameters(*this, start, end, pivot, scale, offset, moveHead, moveTail,
+                                     region,
                                      [](const ZvStdFCurve& work) { return work.IsValid() != 0; });
 }

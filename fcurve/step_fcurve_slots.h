@@ -201,10 +201,10 @@ inline bool zvIsStepConstraint(unsigned int code) {
   }                                                                                                \
   unsigned int Class::ScaleAndOffsetParameters(double start, double end, double pivot,             \
                                                double scale, double offset, int moveHead,          \
-                                               int moveTail, RegionHandle) {                       \
+                                               int moveTail, RegionHandle region) {                \
     ZvFCurveLockGuard guard(*this);                                                                \
     return CFCScaleAndOffsetParameters(*this, start, end, pivot, scale, offset, moveHead,          \
-                                       moveTail,                                                   \
+                                       moveTail, region,                                           \
                                        [](const Class& w) { return w.m_impl->KeysAreOrdered(); }); \
   }
 

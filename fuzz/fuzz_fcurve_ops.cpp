@@ -5,6 +5,7 @@
 //
 // Input: one byte picks the curve kind, then each step is one byte for the call and as many
 // more as its arguments take.
+#include <zv/fcurve_stretcher.h>
 #include <zv/quat_fcurve.h>
 #include <zv/raw_fcurve.h>
 #include <zv/std_fcurve.h>
@@ -102,7 +103,7 @@ void CheckKeys(const ZvBaseFCurve& c) {
 }
 
 void Step(ZvBaseFCurve& c, Script& s) {
-  const unsigned int op = s.Byte() % 26;
+  const unsigned int op = s.Byte() % 27;
   const double a = s.Number(), b = s.Number(), d = s.Number();
   const int f0 = s.Byte() & 1, f1 = s.Byte() & 1;
   switch (op) {
@@ -219,6 +220,24 @@ void Step(ZvBaseFCurve& c, Script& s) {
       c.GetValueUpperBound(f0);
       c.GetValueLowerBound(f1);
       if (std::isnan(a) && c.IsKeyParameter(a, b)) std::abort();
+      break;
+    }
+    case 26: {
+      // A stretch of the keys of [a, b] from a side picked by the script, dragged twice.
+      ZvDoubleArray keys;
+      c.GetKeyParameters(std::fmin(a, b), std::fmax(a, b), keys, 0, 0);
+      ZvExtent2<double> box(std::fmin(a, b), -1e6, std::fmax(a, b), 1e6), moved, changed;
+      const auto handle = static_cast<ZvBaseFCurve::RegionHandle>(1u << (s.Byte() % 4));
+      ZvFCurveStretcher stretch(c, box, keys, ZvExtent2<double>(-1e9, -1e9, 1e9, 1e9),
+                                ZvPoint2<double>{d, s.Number()}, handle, f0, 0.001 + f1);
+      for (int i = 0; i < 2; ++i) {
+        ZvPoint2<double> drag{s.Number(), s.Number()};
+        ZvDoubleArray before, after;
+        int clamped = 0;
+        stretch.Update(drag, -1e9, 1e9, before, after, changed, moved, clamped);
+        CheckKeys(c);
+      }
+      stretch.Finalize();
       break;
     }
     default:

@@ -9,6 +9,7 @@
 #include <zv/critical_section.h>
 #include <zv/fcurve.h>
 #include <zv/fcurve_key_mover.h>
+#include <zv/fcurve_stretcher.h>
 #include <zv/fcurve_userdata.h>
 #include <zv/fill.h>
 #include <zv/gc.h>

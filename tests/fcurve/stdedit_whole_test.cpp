@@ -203,14 +203,14 @@ TEST(StdEditWhole, ScaleAndOffsetOfAllKeys) {
   ASSERT_EQ(curve.ScaleAndOffsetParameters(-1.0, 20.0, 1.0, -1.0, 0.0, 0, 0, C::RightHandle), 1u);
   for (double t = 0.05; t < 9.5; t += 0.1)
     EXPECT_NEAR(curve.Eval(2.0 - t, 0), original.Eval(t, 0), 1e-9) << t;
-  // A scale of part of the keys needs the key stretcher, which is not there: refused, unchanged.
+  // Refusals and no-ops leave the curve as it was.
   curve = original;
   const std::string before = Dump(curve);
-  EXPECT_EQ(curve.ScaleAndOffsetParameters(2.0, 5.0, 2.0, 2.0, 0.0, 0, 0, C::RightHandle), 0u);
   EXPECT_EQ(curve.ScaleAndOffsetParameters(0.0, 9.5, 2.0, 0.0, 1.0, 1, 0, C::RightHandle), 0u);
   EXPECT_EQ(curve.ScaleAndOffsetParameters(2.0, 5.0, 2.0, 1.0, 0.0, 1, 0, C::RightHandle), 1u);
   SetFlag(curve, 3.0, C::ParameterLock, 1);
   EXPECT_EQ(curve.ScaleAndOffsetParameters(-1.0, 20.0, 1.0, 2.0, 0.0, 0, 0, C::RightHandle), 0u);
+  EXPECT_EQ(curve.ScaleAndOffsetParameters(2.0, 5.0, 2.0, 2.0, 0.0, 0, 0, C::RightHandle), 0u);
   SetFlag(curve, 3.0, C::ParameterLock, 0);
   EXPECT_EQ(Dump(curve), before);
 }
