@@ -94,7 +94,6 @@ TEST(MipPathBuffer, ExactBytes) {
           "   00000000");
   EXPECT_EQ(Block(TwoLines()), expected);
   EXPECT_EQ(Block(ZvMipPath2fProp1d()), Hex("08000000 00010000 00000000"));
-  EXPECT_EQ(ZvMipPath2fProp1d_GetBufferBodyLengthSize(), 4u);
 }
 
 TEST(MipPathBuffer, RandomSequencesRoundTripThroughBothReaders) {
@@ -145,11 +144,8 @@ TEST(MipPathBuffer, BadBlocksAreRefusedAndChangeNothing) {
     }
   }
   Bytes manyKeys = good;
-  manyKeys[8] = 0xff;
   manyKeys[11] = 0x7f;
   EXPECT_EQ(target.ReadFromBuffer(manyKeys.data(), manyKeys.size()), 0u);
-  EXPECT_EQ(target.ReadFromBuffer(nullptr, 100), 0u);
-  EXPECT_EQ(target.ReadFromBufferBody(nullptr), 0u);
   EXPECT_EQ(Block(target), before);
 
   // Keys out of order are refused from a foreign block, which the search could not walk.
@@ -164,17 +160,12 @@ TEST(MipPathBuffer, ParametersThatAreNotFiniteReadAsZero) {
   Bytes block = Block(ZvMipPath2fProp1d(Line(1, 2, 3, 4), 0.5));
   const double nan = std::numeric_limits<double>::quiet_NaN();
   std::memcpy(block.data() + 12, &nan, 8);
-  ZvMipPath2fProp1d trusted, bounded;
-  ASSERT_NE(trusted.ReadFromBufferBody(block.data() + 4), 0u);
-  ASSERT_NE(bounded.ReadFromBuffer(block.data(), block.size()), 0u);
-  EXPECT_EQ(KeyParameters(trusted), std::vector<double>{0.0});
-  EXPECT_EQ(KeyParameters(bounded), std::vector<double>{0.0});
+  ZvMipPath2fProp1d read;
+  ASSERT_NE(read.ReadFromBuffer(block.data(), block.size()), 0u);
+  EXPECT_EQ(KeyParameters(read), std::vector<double>{0.0});
   // And the writer never stores one.
-  ZvMipP2fP1dAgent(trusted).ShiftKeyParameters(INFINITY);
-  const Bytes written = Block(trusted);
-  double stored = 1.0;
-  std::memcpy(&stored, written.data() + 12, 8);
-  EXPECT_EQ(stored, 0.0);
+  ZvMipP2fP1dAgent(read).ShiftKeyParameters(INFINITY);
+  EXPECT_EQ(Block(read), Block(ZvMipPath2fProp1d(Line(1, 2, 3, 4), 0.0)));
 }
 
 TEST(MipPathBuffer, FuzzSeedsAreTheWrittenBlocks) {
