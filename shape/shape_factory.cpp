@@ -1,6 +1,7 @@
 // Shapes from persistent blocks: the trusted body readers and the bounded whole-block reader.
 #include <zv/oval2f.h>
 #include <zv/path2f.h>
+#include <zv/path2f_prop1d.h>
 #include <zv/rect2f.h>
 
 #include <new>
@@ -24,8 +25,7 @@ namespace {
 // The body of a rectangle or an oval: the kind word and three points.
 const unsigned int kFrameBodyLength = 28;
 
-// The empty object of a kind. Property paths join here with their class; until then their
-// blocks are refused like unknown kinds.
+// The empty object of a kind.
 ZvShape2f* NewShapeOfKind(ZvShape2f::Kind kind) {
   switch (kind) {
     case ZvShape2f::KindPath:
@@ -34,6 +34,8 @@ ZvShape2f* NewShapeOfKind(ZvShape2f::Kind kind) {
       return new ZvRect2f();
     case ZvShape2f::KindOval:
       return new ZvOval2f();
+    case ZvShape2f::KindPathProp:
+      return new ZvPath2fProp1d(1);
     default:
       return nullptr;
   }
@@ -85,6 +87,10 @@ ZvShape2f* ZvShape2f_CreateFromBuffer(const void* buffer, std::size_t size,
       if (read && (path->currentSubpathOpen > 1 ||
                    !zv_path::IsWellFormedBlock(path->codes.data, path->codes.size)))
         read = 0;
+    } else if (kind == ZvShape2f::KindPathProp) {
+      ZvPath2fProp1d* prop = new ZvPath2fProp1d(1);
+      shape = prop;
+      read = prop->ReadFromBuffer(buffer, prefix + length);
     } else if ((kind == ZvShape2f::KindRect || kind == ZvShape2f::KindOval) &&
                head.Has(kFrameBodyLength - 2)) {
       // Fixed size: once the body is known to hold it, the trusted reader is safe.

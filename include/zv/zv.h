@@ -17,6 +17,7 @@
 #include <zv/motion_path.h>
 #include <zv/oval2f.h>
 #include <zv/path2f.h>
+#include <zv/path2f_prop1d.h>
 #include <zv/path_builder.h>
 #include <zv/point.h>
 #include <zv/polyline.h>
