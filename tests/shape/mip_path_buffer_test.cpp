@@ -2,6 +2,7 @@
 // and the fuzzing seeds, which are the blocks written here.
 #include <zv/mip_path2f_prop1d.h>
 #include <zv/path2f_prop1d.h>
+#include <zv/raw_fcurve.h>
 
 #include <gtest/gtest.h>
 
@@ -54,7 +55,8 @@ ZvMipPath2fProp1d TwoLines() {
   return mip;
 }
 
-// Random keys: up to six, of random subpaths of lines and cubics, some closed.
+// Random keys: up to six, of random subpaths of lines and cubics, some closed, half of them
+// with a property curve.
 ZvMipPath2fProp1d RandomSequence(std::mt19937& rng) {
   std::uniform_real_distribution<float> coord(-100.0f, 100.0f);
   std::uniform_real_distribution<double> parameter(-10.0, 10.0);
@@ -65,6 +67,7 @@ ZvMipPath2fProp1d RandomSequence(std::mt19937& rng) {
   for (int k = 0; k < keys; ++k) {
     ZvPath2fProp1d path;
     for (int s = small(rng); s >= 0; --s) {
+      const unsigned int start = path.NumPoints();
       path.Moveto({coord(rng), coord(rng)});
       for (int i = small(rng); i >= 0; --i) {
         if (small(rng) == 0)
@@ -74,6 +77,7 @@ ZvMipPath2fProp1d RandomSequence(std::mt19937& rng) {
           path.Lineto({coord(rng), coord(rng)});
       }
       if (small(rng) == 0) path.CloseSubpath(path.NumPoints() - 1);
+      if (small(rng) < 2) path.SetPropCurve(start, ZvRawFCurve(0.0, coord(rng), 50.0, coord(rng)));
     }
     agent.CreateKey(parameter(rng), path);
   }
