@@ -10,8 +10,15 @@
 
 ZvMipPath2fProp1dImpl::ZvMipPath2fProp1dImpl(const ZvMipPath2fProp1dImpl& other)
     : keys(other.keys.capacity) {
-  for (unsigned int i = 0; i < other.keys.size; ++i)
-    AppendOwned(other.keys[i].parameter, new ZvPath2fProp1d(*other.keys[i].path));
+  try {
+    for (unsigned int i = 0; i < other.keys.size; ++i)
+      AppendOwned(other.keys[i].parameter, new ZvPath2fProp1d(*other.keys[i].path));
+  } catch (...) {
+    // No destructor runs for a constructor that throws: free the copies made so far here.
+    for (unsigned int i = 0; i < keys.size; ++i)
+      delete keys[i].path;
+    throw;
+  }
 }
 
 ZvMipPath2fProp1dImpl::~ZvMipPath2fProp1dImpl() {
@@ -120,9 +127,10 @@ void ZvMipPath2fProp1dImpl::RemoveKeys(unsigned int begin, unsigned int end) {
 
 void ZvMipPath2fProp1dImpl::AppendOwned(double parameter, ZvPath2fProp1d* path) {
   std::unique_ptr<ZvPath2fProp1d> owned(path);
-  MPKey key;
-  key.parameter = parameter;
-  keys.Add(key);
+  // Add would count the key before allocating for it; a failure would leave the count wrong.
+  MPKey* block = keys.SpliceBlock(keys.size + 1);
+  keys.Splice(keys.size, 0, 1, block);
+  keys[keys.size - 1].parameter = parameter;
   keys[keys.size - 1].path = owned.release();
 }
 
