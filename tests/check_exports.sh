@@ -8,7 +8,7 @@ names=$(nm -D --defined-only "$lib" | awk '$2 != "A" { $1 = ""; $2 = ""; sub(/^ 
         c++filt)
 [ -n "$names" ] || { echo "no exported symbols in $lib"; exit 1; }
 
-own='(Zv|CFC|Ob|_zv|gc_oABTable|AngleWithFirstAxis|ClipAndAddLineSegment|InvertParamCubic|BezierCubicRegularize|IntegrateBezierSegment|ComputePointWithSameRatio|ComputeMidPointNewPositions|ComputeNewPosition|Hermite|PreComputedHermite|ComputeP1ValidInterval|ComputeP2ValidInterval)'
+own='(Zv|SetToSimilarityXY|CFC|Ob|_zv|gc_oABTable|AngleWithFirstAxis|ClipAndAddLineSegment|InvertParamCubic|BezierCubicRegularize|IntegrateBezierSegment|ComputePointWithSameRatio|ComputeMidPointNewPositions|ComputeNewPosition|Hermite|PreComputedHermite|ComputeP1ValidInterval|ComputeP2ValidInterval)'
 stray=$(printf '%s\n' "$names" |
   sed -E 's/^(typeinfo name for|typeinfo for|vtable for|VTT for|construction vtable for|guard variable for|non-virtual thunk to|virtual thunk to) //' |
   grep -Ev "^([^(<]* )?$own" |
