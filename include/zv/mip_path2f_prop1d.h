@@ -71,8 +71,8 @@ class ZV_API ZvMipPath2fProp1d {
   int GetLargestKeyParameter(double& parameter) const;
 
   // The whole block's size and its writing; WriteToBuffer answers the bytes written, 0 for a
-  // null buffer. Hold no agent of this sequence busy on another thread between the two calls
-  // if the block must match the size asked.
+  // null buffer. Each call locks the sequence on its own: while agents on other threads may
+  // still edit, the size asked can be out of date by the time of the write.
   unsigned int GetBufferSize() const;
   unsigned int WriteToBuffer(void* buffer) const;
   // Reads a trusted body (the bytes behind the length field). Result: 8 + the sum over the keys
