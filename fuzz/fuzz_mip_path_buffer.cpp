@@ -25,9 +25,8 @@ void CheckOrder(const ZvMipPath2fProp1d& mip) {
     if (!(parameters[i] - parameters[i - 1] > 1e-15)) std::abort();
 }
 
-// Morphing costs grow with the ratio of a shape's size to the step, so the step follows the
-// size of the keys, as a host's would.
-double SpacingFor(ZvMipP2fP1dAgent& agent, const ZvDoubleArray& parameters) {
+// The largest width or height of a key; 0 when none has a finite one.
+double SizeOf(ZvMipP2fP1dAgent& agent, const ZvDoubleArray& parameters) {
   double size = 0.0;
   for (unsigned int i = 0; i < parameters.size; ++i) {
     ZvExtent2<double> extent;
@@ -35,14 +34,18 @@ double SpacingFor(ZvMipP2fP1dAgent& agent, const ZvDoubleArray& parameters) {
     if (extent.kind != ZvExtent2<double>::Regular) continue;
     size = std::fmax(size, std::fmax(extent.xmax - extent.xmin, extent.ymax - extent.ymin));
   }
-  return std::isfinite(size) && size > 0.0 ? size * 1e-2 : 1.0;
+  return std::isfinite(size) ? size : 0.0;
 }
 
 void Exercise(ZvMipPath2fProp1d& mip) {
   ZvDoubleArray parameters;
   mip.GetAllKeyParameters(parameters);
   ZvMipP2fP1dAgent agent(mip);
-  const double spacing = SpacingFor(agent, parameters);
+  // Morphing costs grow with the ratio of a shape's size to the step, so the step follows the
+  // size of the keys, as a host's would. The part copy evaluates its bounds at the default
+  // step of 0.5, so it is made of small keys only.
+  const double size = SizeOf(agent, parameters);
+  const double spacing = size > 0.0 ? size * 1e-2 : 1.0;
   const unsigned int n = parameters.size;
   // The morphs between the first few keys, and beyond both ends.
   for (unsigned int i = 0; i + 1 < n && i < 4; ++i)
@@ -51,8 +54,8 @@ void Exercise(ZvMipPath2fProp1d& mip) {
     agent.Eval(parameters[0] - 1.0, spacing, 0.1);
     agent.EvalInInterval(parameters[n - 1] + 1.0, parameters[0], parameters[n / 2], 0, 1, spacing,
                          0.1);
-    const ZvMipPath2fProp1d part(mip, parameters[0] + 0.25, parameters[n - 1] - 0.25);
-    CheckOrder(part);
+    if (size <= 1000.0)
+      CheckOrder(ZvMipPath2fProp1d(mip, parameters[0] + 0.25, parameters[n - 1] - 0.25));
     agent.CreateKeyFromEvaluation(parameters[n - 1] + 2.0);
     agent.MergeAndCreateKey(parameters[0], parameters[0], parameters[n / 2],
                             agent.Eval(parameters[0], spacing, 0.1), 1, 1);
