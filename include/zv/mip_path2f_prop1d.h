@@ -37,6 +37,7 @@
 #include <zv/api.h>
 #include <zv/arrays.h>
 #include <zv/critical_section.h>
+#include <zv/morpher.h>
 #include <zv/path2f_prop1d.h>
 
 #include <cstddef>
@@ -55,8 +56,9 @@ class ZV_API ZvMipPath2fProp1d {
   ZvMipPath2fProp1d(const ZvPath2fProp1d& path, double parameter);
   // The part of `source` from `from` to `to`, bounds included: copies of its keys there, and
   // where a bound lies strictly between two keys, a key at the bound holding the source's
-  // evaluation there (at the default context's pointMergeDistance and propertyTolerance). A
-  // bound beyond the source's first or last key adds nothing.
+  // evaluation there (at the default context's pointMergeDistance and propertyTolerance, so the
+  // cost of such a key grows with the size of the source's keys over 0.5). A bound beyond the
+  // source's first or last key adds nothing.
   ZvMipPath2fProp1d(const ZvMipPath2fProp1d& source, double from, double to);
   ~ZvMipPath2fProp1d();
   // Deep. Locks this sequence, then the source. If a copy cannot be allocated, this sequence is
@@ -105,7 +107,9 @@ class ZV_API ZvMipP2fP1dAgent {
   ~ZvMipP2fP1dAgent();
 
   // The sequence at t (see the top of this file for the morph); an empty path when there are no
-  // keys. `spacing` is in path units and must be positive; `tolerance` in property units.
+  // keys. `spacing` is in path units, `tolerance` in property units. Between keys the result is
+  // also empty when the morph refuses the spacing: not a positive finite number, or so small
+  // against the keys that resampling would take more than ZvMorpher::kMaxSteps steps.
   ZvPath2fProp1d& Eval(double t, double spacing, double tolerance);
   // As Eval, with only the keys in from..to visible; a key exactly on a bound is visible when
   // the bound's include flag is non-zero. A t outside the visible keys gives the nearer end's
