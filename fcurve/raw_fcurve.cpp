@@ -14,7 +14,12 @@ ZvRawFCurve::ZvRawFCurve(double valueWhenNoKeys) : m_impl(new ZvRawFCurveImpl(va
 
 // A key that is not finite is not stored: the curve then stays without keys.
 ZvRawFCurve::ZvRawFCurve(double parameter, double value) : m_impl(new ZvRawFCurveImpl(value)) {
-  if (std::isfinite(parameter) && std::isfinite(value)) m_impl->InsertKey(0, parameter, value);
+  try {
+    if (std::isfinite(parameter) && std::isfinite(value)) m_impl->InsertKey(0, parameter, value);
+  } catch (...) {
+    delete m_impl;  // no destructor runs for a constructor that throws
+    throw;
+  }
 }
 
 ZvRawFCurve::ZvRawFCurve(double parameter0, double value0, double parameter1, double value1)
@@ -23,15 +28,25 @@ ZvRawFCurve::ZvRawFCurve(double parameter0, double value0, double parameter1, do
       !std::isfinite(value1)) {
     return;
   }
-  m_impl->InsertKey(0, parameter0, value0);
-  if (zvIsSameParameter(parameter0, parameter1)) return;
-  m_impl->InsertKey(parameter1 > parameter0 ? 1 : 0, parameter1, value1);
+  try {
+    m_impl->InsertKey(0, parameter0, value0);
+    if (zvIsSameParameter(parameter0, parameter1)) return;
+    m_impl->InsertKey(parameter1 > parameter0 ? 1 : 0, parameter1, value1);
+  } catch (...) {
+    delete m_impl;
+    throw;
+  }
   m_impl->valueWhenNoKeys = m_impl->keys[0].value;
 }
 
 ZvRawFCurve::ZvRawFCurve(const ZvPoint2dArray& points, double tolerance)
     : m_impl(new ZvRawFCurveImpl(points.size ? points[0].y : 0.0)) {
-  m_impl->SetToApproxLinearFitC0(points, tolerance);
+  try {
+    m_impl->SetToApproxLinearFitC0(points, tolerance);
+  } catch (...) {
+    delete m_impl;
+    throw;
+  }
 }
 
 ZV_CFC_SINGLE_VALUE_SLOTS(ZvRawFCurve, ZvRawFCurveImpl)

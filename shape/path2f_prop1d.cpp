@@ -12,14 +12,12 @@
 ZvPath2fProp1d::ZvPath2fProp1d(unsigned int reserve)
     : ZvPath2f(reserve), m_impl(new ZvPath2fProp1dImpl) {}
 
-ZvPath2fProp1d::ZvPath2fProp1d(const ZvPath2fProp1d& other) : ZvPath2f(1), m_impl(nullptr) {
-  ZvShapeLock guard(other);
-  std::unique_ptr<ZvPath2fProp1dImpl> impl(new ZvPath2fProp1dImpl(*other.m_impl));
-  points = other.points;
-  codes = other.codes;
-  currentSubpathOpen = other.currentSubpathOpen;
-  m_impl = impl.release();
-}
+ZvPath2fProp1d::ZvPath2fProp1d(const ZvPath2fProp1d& other)
+    : ZvPath2fProp1d(other, ZvShapeLock(other)) {}
+
+// The source stays locked across both copies, so that its geometry and curves agree.
+ZvPath2fProp1d::ZvPath2fProp1d(const ZvPath2fProp1d& other, const ZvShapeLock& /*held*/)
+    : ZvPath2f(other), m_impl(new ZvPath2fProp1dImpl(*other.m_impl)) {}
 
 ZvPath2fProp1d::ZvPath2fProp1d(const ZvPath2f& path)
     : ZvPath2f(path), m_impl(new ZvPath2fProp1dImpl) {}
@@ -32,14 +30,17 @@ ZvPath2fProp1d& ZvPath2fProp1d::operator=(const ZvPath2fProp1d& other) {
   if (this == &other) return *this;
   ZvShapeLock guard(*this);
   ZvShapeLock guardOther(other);
-  ZvPath2f::operator=(other);
   m_impl->Clear();
+  ZvPath2fProp1dImpl copy;
   try {
-    ZvPath2fProp1dImpl copy(*other.m_impl);
-    m_impl->Swap(copy);
+    ZvPath2fProp1dImpl(*other.m_impl).Swap(copy);
   } catch (const std::bad_alloc&) {
-    // The geometry is whole; a subpath without a curve is still a valid property path.
+    // The geometry alone is still a valid property path: its subpaths have no curves.
   }
+  ZvPath2f::operator=(other);
+  // The path's assignment leaves it empty when its copy fails; records would then name no
+  // subpath.
+  if (points.size == other.points.size) m_impl->Swap(copy);
   return *this;
 }
 
@@ -52,7 +53,7 @@ ZvShape2f& ZvPath2fProp1d::operator=(const ZvShape2f& other) {
     m_impl->Clear();
     return *this;
   }
-  return ZvShape2f::operator=(other);
+  return ZvPath2f::operator=(other);
 }
 
 ZvShape2f* ZvPath2fProp1d::QueryShapeKind(Kind kind) const {

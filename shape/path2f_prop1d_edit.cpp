@@ -43,6 +43,16 @@ int ZvPath2fProp1d::ReplaceSubpathSection(unsigned int start, unsigned int end,
       start, [&] { return ZvPath2f::ReplaceSubpathSection(start, end, source, first, last); });
 }
 
+void ZvPath2fProp1d::Clear() {
+  ZvShapeLock guard(*this);
+  ZvPath2f::Clear();
+  m_impl->Clear();
+}
+
+int ZvPath2fProp1d::CloseSubpath(unsigned int index) {
+  return EditKeepingRecords(index, [&] { return ZvPath2f::CloseSubpath(index); });
+}
+
 int ZvPath2fProp1d::RemoveSubpath(unsigned int index) {
   ZvShapeLock guard(*this);
   unsigned int s = 0, e = 0;

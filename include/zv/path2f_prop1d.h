@@ -34,6 +34,7 @@
 #include <cstddef>
 
 class ZvPath2fProp1dImpl;
+class ZvShapeLock;
 
 class ZV_API ZvPath2fProp1d : public ZvPath2f {
  public:
@@ -44,8 +45,9 @@ class ZV_API ZvPath2fProp1d : public ZvPath2f {
   ZvPath2fProp1d(const ZvPath2fProp1d& other);
   // The geometry of `path`, with no curves.
   explicit ZvPath2fProp1d(const ZvPath2f& path);
-  // Frees this path's curves and deep-copies the source's. If a copy cannot be allocated this
-  // path keeps the source's geometry and no curves; nothing throws. On itself a no-op.
+  // Frees this path's curves and deep-copies the source's. If the curves cannot be allocated
+  // this path takes the source's geometry without curves; if the geometry cannot, it ends up
+  // empty, as a path's assignment does. Nothing throws. On itself a no-op.
   ZvPath2fProp1d& operator=(const ZvPath2fProp1d& other);
   ~ZvPath2fProp1d() override;
 
@@ -88,6 +90,13 @@ class ZV_API ZvPath2fProp1d : public ZvPath2f {
   // subpath in two, and both halves carry a copy of the curve it had (with its arc lengths as
   // they were: the second half does not restart at 0).
   int RemoveSubpathSection(unsigned int start, unsigned int end) override;
+
+  // The path's non-virtual edits that change point counts, redone here so that the records
+  // follow; called through a ZvPath2f reference they would leave the records behind.
+  // Empties the path and drops every curve; never throws.
+  void Clear();
+  // Closes the subpath holding `index` as the path's CloseSubpath does (a line may be added).
+  int CloseSubpath(unsigned int index);
 
   // ---- Property curves ----------------------------------------------------------------------
   // 1 if the subpath holding `index` has a curve, else 0 (also for an index outside the path).
@@ -189,9 +198,14 @@ class ZV_API ZvPath2fProp1d : public ZvPath2f {
   unsigned int GetNumPropCurves() const;
 
  private:
+  ZvPath2fProp1d(const ZvPath2fProp1d& other, const ZvShapeLock& held);
   // The reader behind ReadFromBufferBody and ReadFromBuffer; `bounded` adds the checks an
   // untrusted block needs.
   unsigned int ReadBody(const unsigned char* body, std::size_t size, bool bounded);
+  // Sample with values; `keepChoppedValue` keeps the value of a closing sample that the even
+  // sampling chopped.
+  unsigned int SampleWithValues(const ZvGC& gc, ZvPoint2fArray& points, ZvPointTagArray& tags,
+                                ZvDoubleArray& values, bool keepChoppedValue) const;
   // Exchanges points, codes and open flag with `other`; allocates nothing.
   void SwapGeometry(ZvPath2fProp1d& other);
   // Runs a path edit of the subpath holding `index` and moves the records of the subpaths behind

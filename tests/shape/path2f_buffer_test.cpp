@@ -123,7 +123,7 @@ TEST(Path2fBuffer, KindsAndRefusals) {
               kind >= 1 && kind <= 4 ? static_cast<ZvShape2f::Kind>(kind) : ZvShape2f::KindNone);
     EXPECT_EQ(keep.ReadFromBufferBody(body), 0u);
     consumed = 7;
-    // Property paths are not built here yet: refused like unknown kinds.
+    // Unknown kinds are refused, and a path body does not parse as a property path.
     EXPECT_EQ(ZvShape2f_CreateFromBufferBody(body, consumed), nullptr);
     EXPECT_EQ(consumed, 0u);
   }
