@@ -61,9 +61,9 @@ void ShareSteps(const std::vector<ZvMorphFlat>& flats, double sum, unsigned int 
       shortOnes -= k;
     } else {
       // Clamped as a double first: a vanishing remaining length must not overflow the cast.
-      const double share =
+      const double fair =
           (static_cast<double>(total - allocated - shortOnes) * flat.length) / (sum - lengthUsed);
-      k = static_cast<long long>(std::min(share, static_cast<double>(total)));
+      k = static_cast<long long>(std::min(fair, static_cast<double>(total)));
       k = std::min(std::max(k, 1LL), (total - allocated) - behind);
     }
     if (allocated + k > total || (i == u - 1 && allocated + k < total)) k = total - allocated;

@@ -11,16 +11,21 @@
 // corner threshold (a squared cosine) while s is its error bound; propertyTolerance bounds the
 // blended property curves.
 //
-// Output. Every morph appends to `output`: its subpaths and property curves are added behind
-// what it held, nothing is cleared, so a caller that wants only the morph passes an empty path.
-// Results are refitted cubics, except the sibling fast path of LinearMorph, which blends the
-// control points of two paths of the same topology and keeps their codes.
+// Output. A morph appends to `output`: its subpaths and property curves are added behind what
+// it held, nothing is cleared, so a caller that wants only the morph passes an empty path. The
+// one exception is the sibling fast path of LinearMorph, where `output` becomes the blend of A
+// and B and loses what it held. Results are refitted cubics, except on that fast path, which
+// blends the control points of two paths of the same topology and keeps their codes. Blended
+// property curves take the parameter scale of the longer of the two curves. A curve that only
+// one side has is carried over as it stands (on the sibling fast path, only A's); a subpath
+// where neither side has one gets none.
 //
 // Results: 1 on success. 0, with `output` untouched, when the context's pointMergeDistance is
-// not a positive finite number or the resampling would need more than kMaxSteps steps (a path
-// that is huge, or has non-finite coordinates, against the step). The ratio is not checked:
-// values outside 0..1 extrapolate. Allocation failures pass to the caller as std::bad_alloc, and
-// `output` may then hold part of the result.
+// not a positive finite number, when the resampling would need more than kMaxSteps steps (a
+// path that is huge, or has non-finite coordinates, against the step), or when TurtleMorph or
+// LinearMotionPathMorph finds nothing to walk on one side (an empty shape or section). The ratio
+// is not checked: values outside 0..1 extrapolate. Allocation failures pass to the caller as
+// std::bad_alloc, and `output` may then hold part of the result.
 #ifndef ZV_MORPHER_H
 #define ZV_MORPHER_H
 
