@@ -23,7 +23,7 @@ ZvMipPath2fProp1d Sequence(const Params& parameters) {
   return mip;
 }
 
-TEST(MipPathKeys, SearchIntervalsAndBodyReplacement) {
+TEST(MipPathKeys, SearchAndIntervals) {
   ZvMipPath2fProp1dImpl store;
   for (int p = 0; p <= 8; ++p)
     store.AppendOwned(p, new ZvPath2fProp1d(Bar(0.0f)));
@@ -45,20 +45,6 @@ TEST(MipPathKeys, SearchIntervalsAndBodyReplacement) {
   EXPECT_EQ(store.GetKeyIndicesInInterval(0.5, 2.0 + 1e-16, first, last), 1);
   EXPECT_EQ(first, 1u);
   EXPECT_EQ(last, 2u);
-
-  const ZvPath2fProp1d bar = Bar(50.0f);
-  MPKey key;
-  key.parameter = 4.5;
-  key.path = const_cast<ZvPath2fProp1d*>(&bar);
-  EXPECT_EQ(store.RemoveBodyAndCreateKeyBetweenExistingKeys(key, 0, 8), 1);
-  ASSERT_EQ(store.keys.size, 3u);
-  EXPECT_EQ(store.keys.capacity, 4u);  // 16 slots held 9 keys; 3 fill less than half of them
-  EXPECT_NE(store.keys[1].path, &bar);
-  EXPECT_EQ(store.keys[1].path->GetPoint(0).x, 50.0f);
-  key.parameter = -1.0;
-  store.RemoveBodyAndCreateKeyBetweenExistingKeys(key, ~0u, 1);  // at the front
-  EXPECT_EQ(store.keys[0].parameter, -1.0);
-  EXPECT_EQ(store.keys[1].parameter, 4.5);
 }
 
 TEST(MipPathAgent, CreatingKeysKeepsOrderReplacesOnAHitAndCopies) {
