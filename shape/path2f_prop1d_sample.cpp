@@ -33,12 +33,14 @@ struct FlatSubpath {
   ZvPoint2fArray points{64};
   ZvDoubleArray lengths{64};
 
+  // By the path's own flatteners, as the even sampling does, or by F.
+  template <class F = ZvFlattenInFloat>
   void Make(const ZvPath2f& path, unsigned int s, unsigned int e, const ZvGC& gc,
             ZvBezierTool& tool) {
     points.Chop(0);
     lengths.Chop(0);
-    if (ZvPath2fMeasure::FlattenSubpath<ZvFlattenInFloat>(path, s, e, &gc.transform,
-                                                          gc.flattenTolerance, points, tool) == 0)
+    if (ZvPath2fMeasure::FlattenSubpath<F>(path, s, e, &gc.transform, gc.flattenTolerance, points,
+                                           tool) == 0)
       points.Add(points[0]);
     ZvPoint2fArray_ComputeChordLength(points, 0, points.size - 1, lengths);
   }
@@ -81,8 +83,7 @@ unsigned int ZvPath2fProp1d::Flatten(const ZvGC& gc, ZvPoint2fArray& out, ZvPoin
   const unsigned int before = out.size;
   const ZvTransfo4 identity;
   ZvBezierTool tool;
-  ZvPoint2fArray flat(64);
-  ZvDoubleArray lengths(64);
+  FlatSubpath subpath;
   ZvPoint2dArray pairs(64);
   ZvPointTagArray pairTags(64);
   const double merge = gc.pointMergeDistance;
@@ -105,13 +106,10 @@ unsigned int ZvPath2fProp1d::Flatten(const ZvGC& gc, ZvPoint2fArray& out, ZvPoin
     pairTags.Chop(0);
     curve->Flatten(identity, gc.propertyTolerance, pairs, pairTags, 1);
     if (pairs.size == 0) pairs.Add(ZvPoint2<double>{0.0, curve->Eval(0.0, 1)});
-    flat.Chop(0);
-    lengths.Chop(0);
-    if (ZvPath2fMeasure::FlattenSubpath<ZvFlattenByTool>(*this, s, e, &gc.transform,
-                                                         gc.flattenTolerance, flat, tool) == 0)
-      flat.Add(flat[0]);
-    ZvPoint2fArray_ComputeChordLength(flat, 0, flat.size - 1, lengths);
-    const double length = lengths[lengths.size - 1];
+    subpath.Make<ZvFlattenByTool>(*this, s, e, gc, tool);
+    const ZvPoint2fArray& flat = subpath.points;
+    const ZvDoubleArray& lengths = subpath.lengths;
+    const double length = subpath.Length();
     const unsigned int start = out.size;
     out.Add(flat[0]);
     values.Add(pairs[0].y);

@@ -8,12 +8,14 @@
 //
 // The curves are held in records ordered by their subpath's start index (the index of its code 1
 // point); every index argument below may be any point of the subpath unless it says otherwise.
-// The edits that move points from one subpath to another (ReplaceSubpathSection with a source
-// path, RemoveSubpath, RemoveSubpathSection, ReplaceSegment and the other two
-// ReplaceSubpathSection forms) renumber the records, so that a curve stays with its subpath.
+// The edits that change point counts (ReplaceSubpathSection in its three forms, ReplaceSegment,
+// RemoveSubpath, RemoveSubpathSection, and the non-virtual CloseSubpath and Clear redone here)
+// renumber the records, so that a curve stays with its subpath.
 //
 // Everything else is the path's: the shape contract's Flatten, Sample, fills and strokes ignore
-// the property. QueryShapeKind answers only KindPathProp, never KindPath.
+// the property. Transforms move the points only: a curve keeps its arc lengths, and the
+// flattening with values stretches it onto the subpath's new length. QueryShapeKind answers only
+// KindPathProp, never KindPath.
 //
 // Locking. Public operations take the shape's lock; an operation on two shapes locks this first.
 // The ...InsideCriticalSection forms take no lock and want the subpath's start index itself.
