@@ -14,6 +14,7 @@
 #include <zv/fill.h>
 #include <zv/gc.h>
 #include <zv/matrix.h>
+#include <zv/mip_path2f_prop1d.h>
 #include <zv/morpher.h>
 #include <zv/motion_path.h>
 #include <zv/oval2f.h>
