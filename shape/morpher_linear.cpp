@@ -60,10 +60,11 @@ void ShareSteps(const std::vector<ZvMorphFlat>& flats, double sum, unsigned int 
       if (std::fabs(sum) <= 1e-9) k = std::max(1LL, total / u);
       shortOnes -= k;
     } else {
-      // Clamped as a double first: a vanishing remaining length must not overflow the cast.
+      // Clamped as a double first: a vanishing remaining length must not overflow the cast, and
+      // a share that is no number (rounding left no length: 0 / 0) counts as one step.
       const double fair =
           (static_cast<double>(total - allocated - shortOnes) * flat.length) / (sum - lengthUsed);
-      k = static_cast<long long>(std::min(fair, static_cast<double>(total)));
+      k = fair >= 1.0 ? static_cast<long long>(std::min(fair, static_cast<double>(total))) : 1;
       k = std::min(std::max(k, 1LL), (total - allocated) - behind);
     }
     if (allocated + k > total || (i == u - 1 && allocated + k < total)) k = total - allocated;
