@@ -17,6 +17,7 @@
 #include <vector>
 
 #include "tests/fcurve/uid.h"
+#include "tests/support/byte_blocks.h"
 
 using ByteVec = std::vector<unsigned char>;
 
@@ -25,20 +26,6 @@ inline ByteVec BlockOf(const ZvBaseFCurve& curve) {
   ByteVec block(curve.GetBufferSize(), 0xEE);
   EXPECT_EQ(curve.WriteToBuffer(block.data()), block.size());
   return block;
-}
-
-// "0a 1b ..." into bytes; spaces and line breaks are ignored.
-inline ByteVec Hex(const std::string& text) {
-  ByteVec out;
-  for (std::size_t i = 0; i < text.size();) {
-    if (text[i] == ' ' || text[i] == '\n') {
-      ++i;
-      continue;
-    }
-    out.push_back(static_cast<unsigned char>(std::stoi(text.substr(i, 2), nullptr, 16)));
-    i += 2;
-  }
-  return out;
 }
 
 // A block assembled field by field; Finish() puts the body length in front.
@@ -97,7 +84,7 @@ struct StdFields {
   unsigned int flags = 0x285;  // continuity, parameter lock, automatic, length continuity
   unsigned int extrapolation = 2;
   unsigned int readOnly = 7;  // any non-zero byte sets it
-  ByteVec userData = Hex("05 00 00 00 00 01 00 00 00");
+  ByteVec userData = HexBytes("05 00 00 00 00 01 00 00 00");
   unsigned int tangentConstraint = 1;
   unsigned int timeCurve = 0;
 };

@@ -10,6 +10,7 @@
 #include <memory>
 
 #include "tests/fcurve/curve_blocks.h"
+#include "tests/support/byte_blocks.h"
 
 TEST(FCurveFactory, KindsOfBodies) {
   const auto body = [](std::uint32_t stamp, std::uint32_t kind) {
@@ -96,21 +97,6 @@ TEST(FCurveFactory, EveryTruncatedBlockIsRefused) {
 
 TEST(FCurveFactory, FuzzSeedsAreTheWrittenBlocks) {
   // ZV_WRITE_FUZZ_SEEDS=1 rewrites the committed seeds; otherwise they must match the writers.
-  std::string dir = __FILE__;
-  for (int up = 0; up < 3; ++up)
-    dir = dir.substr(0, dir.find_last_of('/'));
-  dir += "/fuzz/corpus/fuzz_fcurve_buffer/";
-  const bool write = std::getenv("ZV_WRITE_FUZZ_SEEDS") != nullptr;
-  for (const auto& seed : SeedBlocks()) {
-    const std::string file = dir + seed.first;
-    if (write) {
-      std::ofstream(file, std::ios::binary)
-          .write(reinterpret_cast<const char*>(seed.second.data()),
-                 static_cast<std::streamsize>(seed.second.size()));
-    }
-    std::ifstream in(file, std::ios::binary);
-    ASSERT_TRUE(in.good()) << file;
-    const ByteVec stored((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
-    EXPECT_EQ(stored, seed.second) << file;
-  }
+  for (const auto& seed : SeedBlocks())
+    ExpectFuzzSeed("fuzz_fcurve_buffer", seed.first, seed.second);
 }

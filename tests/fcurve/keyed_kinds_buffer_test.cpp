@@ -44,35 +44,35 @@ TEST(KeyedKindsBuffer, FixedCurvesWriteTheseBytes) {
   double t = 2.5;
   integer.SetConstraint(t, ZvBaseFCurve::ValueLock, 1, 0.0);
   integer.SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
-  const ByteVec integerBlock =
-      Hex("4b 00 00 00  02 01 00 00  0f 00 00 00"
-          "61 14 f2 84 ca 97 d1 11 93 6a 00 a0 24 3e 35 f0"
-          // the first key set the value without keys and the value before the first key
-          "fe ff ff ff  fe ff ff ff  03 00  02 00 00 00"
-          "00 00 00 00 00 00 f0 3f  fe ff ff ff  00 00"
-          "00 00 00 00 00 00 04 40  07 00 00 00  02 00"
-          "05 00 00 00  00 01 00 00  00");
+  const ByteVec integerBlock = HexBytes(
+      "4b 00 00 00  02 01 00 00  0f 00 00 00"
+      "61 14 f2 84 ca 97 d1 11 93 6a 00 a0 24 3e 35 f0"
+      // the first key set the value without keys and the value before the first key
+      "fe ff ff ff  fe ff ff ff  03 00  02 00 00 00"
+      "00 00 00 00 00 00 f0 3f  fe ff ff ff  00 00"
+      "00 00 00 00 00 00 04 40  07 00 00 00  02 00"
+      "05 00 00 00  00 01 00 00  00");
   EXPECT_EQ(BlockOf(integer), integerBlock);
 
   ZvBooleanFCurve boolean(1.0);
   boolean.CreateKey(0.5, 1.0);
   t = 0.5;
   boolean.SetConstraint(t, ZvBaseFCurve::ParameterLock, 1, 0.0);
-  const ByteVec booleanBlock =
-      Hex("34 00 00 00  02 01 00 00  0a 00 00 00"
-          "62 14 f2 84 ca 97 d1 11 93 6a 00 a0 24 3e 35 f0"
-          "01 01 01 00  01 00 00 00"
-          "00 00 00 00 00 00 e0 3f  01  04 00"
-          "05 00 00 00  00 01 00 00  00");
+  const ByteVec booleanBlock = HexBytes(
+      "34 00 00 00  02 01 00 00  0a 00 00 00"
+      "62 14 f2 84 ca 97 d1 11 93 6a 00 a0 24 3e 35 f0"
+      "01 01 01 00  01 00 00 00"
+      "00 00 00 00 00 00 e0 3f  01  04 00"
+      "05 00 00 00  00 01 00 00  00");
   EXPECT_EQ(BlockOf(boolean), booleanBlock);
 
   const ZvRawFCurve raw(0.0, 1.0, 2.0, 3.0);
-  const ByteVec rawBlock =
-      Hex("5c 00 00 00  08 01 00 00  1e 00 00 00"
-          "00 00 00 00 00 00 f0 3f  ff ff ff ff ff ff ef ff  ff ff ff ff ff ff ef 7f"
-          "02 00 00 00  00 00 00 00 00 00 00 00  00 00 00 00 00 00 f0 3f"
-          "00 00 00 00 00 00 00 40  00 00 00 00 00 00 08 40"
-          "00 00 00 00  02 01 00 00  01 00  05 00 00 00  00 01 00 00  00  08 01 00 00  01");
+  const ByteVec rawBlock = HexBytes(
+      "5c 00 00 00  08 01 00 00  1e 00 00 00"
+      "00 00 00 00 00 00 f0 3f  ff ff ff ff ff ff ef ff  ff ff ff ff ff ff ef 7f"
+      "02 00 00 00  00 00 00 00 00 00 00 00  00 00 00 00 00 00 f0 3f"
+      "00 00 00 00 00 00 00 40  00 00 00 00 00 00 08 40"
+      "00 00 00 00  02 01 00 00  01 00  05 00 00 00  00 01 00 00  00  08 01 00 00  01");
   EXPECT_EQ(BlockOf(raw), rawBlock);
 
   // Each reads back to the same bytes, and the body reader takes the whole body.
@@ -133,7 +133,7 @@ TEST(KeyedKindsBuffer, RandomCurvesComeBackEqual) {
 
 namespace {
 
-const ByteVec kIdentifierTail = Hex("ca 97 d1 11 93 6a 00 a0 24 3e 35 f0");
+const ByteVec kIdentifierTail = HexBytes("ca 97 d1 11 93 6a 00 a0 24 3e 35 f0");
 
 // A boolean or integer body of `stamp`: header values, then keys of one-byte flags before 258.
 ByteVec StepBlock(unsigned int stamp, bool boolean, int noKeys, int before,

@@ -34,13 +34,13 @@ TEST(QuatCurveBuffer, AFixedViewWritesTheseBytes) {
   ZvQuatCurve& rotation = *view.GetQuatCurve();
   rotation.SetKey(ZvQuatKey(1.0, {0.5, -0.25, 2.0}, 0.5f, 0.0f, -1.0f, 3), 0.0);
   rotation.SetValueLock(0, 1);
-  const ByteVec block =
-      Hex("69 00 00 00  31 30 31 30  28 00 00 00  01 00 00 00  01 00 00 00"
-          // time, three angles, tension, continuity, bias, spins, value lock (2), zero
-          "00 00 00 00 00 00 f0 3f  00 00 00 00 00 00 e0 3f  00 00 00 00 00 00 d0 bf"
-          "00 00 00 00 00 00 00 40  00 00 00 3f  00 00 00 00  00 00 80 bf  03 00  02  00"
-          "00 00 00 00 00 00 00 00  00 00 00 00 00 00 00 00  00 00 00 00 00 00 00 00"
-          "00 00 00 00  01 00 00 00  05 00 00 00  00 01 00 00  00");
+  const ByteVec block = HexBytes(
+      "69 00 00 00  31 30 31 30  28 00 00 00  01 00 00 00  01 00 00 00"
+      // time, three angles, tension, continuity, bias, spins, value lock (2), zero
+      "00 00 00 00 00 00 f0 3f  00 00 00 00 00 00 e0 3f  00 00 00 00 00 00 d0 bf"
+      "00 00 00 00 00 00 00 40  00 00 00 3f  00 00 00 00  00 00 80 bf  03 00  02  00"
+      "00 00 00 00 00 00 00 00  00 00 00 00 00 00 00 00  00 00 00 00 00 00 00 00"
+      "00 00 00 00  01 00 00 00  05 00 00 00  00 01 00 00  00");
   EXPECT_EQ(BlockOf(view), block);
 
   // A read replaces the rotation that every view of it shows.

@@ -58,11 +58,11 @@ int Flag(const ZvStdFCurve& curve, unsigned int key, ZvBaseFCurve::KeyConstraint
 
 TEST(StdCurveBuffer, FixedCurvesWriteTheseBytes) {
   // No keys, no user data: 77 bytes, of which the reader takes 69 after the length field.
-  const ByteVec empty =
-      Hex("49 00 00 00  08 01 00 00  14 00 00 00  00 00 00 00 00 00 00 00"
-          "ff ff ff ff ff ff ef ff  ff ff ff ff ff ff ef 7f  03 00 00 00  00 00 00 00"
-          "01 01 00 00  03 01 00 00  01 00  05 00 00 00  00 01 00 00  00"
-          "06 01 00 00  00  08 01 00 00  01  00 00 00 00");
+  const ByteVec empty = HexBytes(
+      "49 00 00 00  08 01 00 00  14 00 00 00  00 00 00 00 00 00 00 00"
+      "ff ff ff ff ff ff ef ff  ff ff ff ff ff ff ef 7f  03 00 00 00  00 00 00 00"
+      "01 01 00 00  03 01 00 00  01 00  05 00 00 00  00 01 00 00  00"
+      "06 01 00 00  00  08 01 00 00  01  00 00 00 00");
   EXPECT_EQ(BlockOf(ZvStdFCurve()), empty);
   EXPECT_EQ(ZvStdFCurve().ReadFromBufferBody(empty.data() + 4), 69u);
 
@@ -75,20 +75,20 @@ TEST(StdCurveBuffer, FixedCurvesWriteTheseBytes) {
   curve.SetConstraint(t, ZvBaseFCurve::ParameterLock, 1, 0.0);
   _zvUID uid = {0x01020304, 0x0506, 0x0708, {9, 10, 11, 12, 13, 14, 15, 16}};
   curve.SetFCurveUserData(uid, Bytes("hi"), 2);
-  const ByteVec block =
-      Hex("ad 00 00 00  08 01 00 00  14 00 00 00"
-          "00 00 00 00 00 00 00 40  00 00 00 00 00 00 10 c0  00 00 00 00 00 00 20 40"
-          "01 00 00 00  01 00 00 00"
-          // the key: parameter, values, left handle, right handle, segment kind
-          "00 00 00 00 00 00 f0 3f  00 00 00 00 00 00 00 40  00 00 00 00 00 00 08 40"
-          "00 00 00 00 00 00 f0 3f  00 00 00 00 00 00 00 40"
-          "00 00 00 00 00 00 f0 3f  00 00 00 00 00 00 08 40  02 00 00 00"
-          "01 01 00 00  05 00  03 01 00 00  02 00  00 00"
-          // user data: one curve-level set of one item
-          "29 00 00 00  00 01 00 00  01 01"
-          "1e 00 00 00  00 01 00 00  01 00 00 00"
-          "04 03 02 01 06 05 08 07  09 0a 0b 0c 0d 0e 0f 10  02 00 00 00  68 69  00"
-          "06 01 00 00  00  08 01 00 00  01  00 00 00 00");
+  const ByteVec block = HexBytes(
+      "ad 00 00 00  08 01 00 00  14 00 00 00"
+      "00 00 00 00 00 00 00 40  00 00 00 00 00 00 10 c0  00 00 00 00 00 00 20 40"
+      "01 00 00 00  01 00 00 00"
+      // the key: parameter, values, left handle, right handle, segment kind
+      "00 00 00 00 00 00 f0 3f  00 00 00 00 00 00 00 40  00 00 00 00 00 00 08 40"
+      "00 00 00 00 00 00 f0 3f  00 00 00 00 00 00 00 40"
+      "00 00 00 00 00 00 f0 3f  00 00 00 00 00 00 08 40  02 00 00 00"
+      "01 01 00 00  05 00  03 01 00 00  02 00  00 00"
+      // user data: one curve-level set of one item
+      "29 00 00 00  00 01 00 00  01 01"
+      "1e 00 00 00  00 01 00 00  01 00 00 00"
+      "04 03 02 01 06 05 08 07  09 0a 0b 0c 0d 0e 0f 10  02 00 00 00  68 69  00"
+      "06 01 00 00  00  08 01 00 00  01  00 00 00 00");
   EXPECT_EQ(BlockOf(curve), block);
   const ZvStdFCurve back = Read(block, 4);
   EXPECT_EQ(BlockOf(back), block);
@@ -158,13 +158,13 @@ TEST(StdCurveBuffer, WritingDropsKeysOutOfOrderWithTheirUserData) {
       "1d 00 00 00 00 01 00 00 01 00 00 00 01 00 00 00 02 00 03 00"
       "04 05 06 07 08 09 0a 0b 01 00 00 00 ";
   // A set at 1 (a dropped key) and a set at 2 (a kept key and a dropped one).
-  f.userData =
-      Hex("00 00 00 00 00 01 00 00 01 00 01 02 00 00 00"
-          "00 00 00 00 00 00 f0 3f" +
-          item +
-          "61"
-          "00 00 00 00 00 00 00 40" +
-          item + "62");
+  f.userData = HexBytes(
+      "00 00 00 00 00 01 00 00 01 00 01 02 00 00 00"
+      "00 00 00 00 00 00 f0 3f" +
+      item +
+      "61"
+      "00 00 00 00 00 00 00 40" +
+      item + "62");
   f.userData[0] = static_cast<unsigned char>(f.userData.size() - 4);
   const ByteVec block = StdBlock(264, f);
   ZvStdFCurve curve = Read(block);

@@ -12,21 +12,9 @@
 #include <string>
 
 #include "motion_fixtures.h"
+#include "tests/support/byte_blocks.h"
 
 namespace {
-
-Bytes Hex(const char* text) {
-  Bytes out;
-  for (const char* p = text; *p;) {
-    if (*p == ' ') {
-      ++p;
-      continue;
-    }
-    out.push_back(static_cast<unsigned char>(std::stoi(std::string(p, 2), nullptr, 16)));
-    p += 2;
-  }
-  return out;
-}
 
 // One eased cubic whose last node carries a G1 lock.
 ZvMotionPath3d Small() {
@@ -45,15 +33,15 @@ std::unique_ptr<ZvMotionPath3d> Read(const Bytes& block, unsigned int& consumed)
 }  // namespace
 
 TEST(MotionBuffer, ExactBytes) {
-  EXPECT_EQ(Block(ZvMotionPath3d()), Hex("10000000 0301 000000000000 00000000 00000000"));
-  const Bytes small =
-      Hex("86000000 0301 000000000000 04000000"
-          " 000000000000F03F 0000000000000040 0000000000000000"
-          " 0000000000000040 0000000000000040 0000000000000000"
-          " 0000000000000840 0000000000000040 000000000000E03F"
-          " 0000000000001040 0000000000000040 000000000000F03F"
-          " 000000000000E03F 0000000000000040"
-          " 0304 0203 0002 00000000");
+  EXPECT_EQ(Block(ZvMotionPath3d()), HexBytes("10000000 0301 000000000000 00000000 00000000"));
+  const Bytes small = HexBytes(
+      "86000000 0301 000000000000 04000000"
+      " 000000000000F03F 0000000000000040 0000000000000000"
+      " 0000000000000040 0000000000000040 0000000000000000"
+      " 0000000000000840 0000000000000040 000000000000E03F"
+      " 0000000000001040 0000000000000040 000000000000F03F"
+      " 000000000000E03F 0000000000000040"
+      " 0304 0203 0002 00000000");
   ASSERT_EQ(small.size(), 138u);
   EXPECT_EQ(Block(Small()), small);
   EXPECT_EQ(ZvMotionPath3d_GetBufferBodyLengthSize(), 4u);
@@ -155,10 +143,6 @@ TEST(MotionBuffer, CutAndDamagedBlocksAreRefusedWithoutChange) {
 
 TEST(MotionBuffer, FuzzSeedsAreTheWrittenBlocks) {
   // ZV_WRITE_FUZZ_SEEDS=1 rewrites the committed seeds; otherwise they must match the writer.
-  std::string dir = __FILE__;
-  for (int up = 0; up < 3; ++up)
-    dir = dir.substr(0, dir.find_last_of('/'));
-  dir += "/fuzz/corpus/fuzz_motion_path_buffer/";
   std::mt19937 rng(19);
   const struct {
     const char* name;
@@ -167,19 +151,9 @@ TEST(MotionBuffer, FuzzSeedsAreTheWrittenBlocks) {
                {"small", Small()},
                {"wave", Wave()},
                {"random", RandomPath(rng, 6)}};
-  const bool write = std::getenv("ZV_WRITE_FUZZ_SEEDS") != nullptr;
   for (const auto& seed : seeds) {
     // The fuzz target reads bodies: the length field is not part of the input.
     const Bytes whole = Block(seed.path);
-    const Bytes body(whole.begin() + 4, whole.end());
-    const std::string file = dir + seed.name;
-    if (write) {
-      std::ofstream(file, std::ios::binary)
-          .write(reinterpret_cast<const char*>(body.data()), body.size());
-    }
-    std::ifstream in(file, std::ios::binary);
-    ASSERT_TRUE(in.good()) << file;
-    const Bytes stored((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
-    EXPECT_EQ(stored, body) << file;
+    ExpectFuzzSeed("fuzz_motion_path_buffer", seed.name, Bytes(whole.begin() + 4, whole.end()));
   }
 }

@@ -18,6 +18,7 @@
 #include <vector>
 
 #include "mip_path_fixtures.h"
+#include "tests/support/byte_blocks.h"
 
 namespace {
 
@@ -27,19 +28,6 @@ Bytes Block(const ZvMipPath2fProp1d& mip) {
   Bytes block(mip.GetBufferSize(), 0xee);
   EXPECT_EQ(mip.WriteToBuffer(block.data()), block.size());
   return block;
-}
-
-Bytes Hex(const char* text) {
-  Bytes out;
-  for (const char* p = text; *p;) {
-    if (*p == ' ') {
-      ++p;
-      continue;
-    }
-    out.push_back(static_cast<unsigned char>(std::stoi(std::string(p, 2), nullptr, 16)));
-    p += 2;
-  }
-  return out;
 }
 
 ZvPath2fProp1d Line(float x0, float y0, float x1, float y1) {
@@ -86,18 +74,18 @@ ZvMipPath2fProp1d RandomSequence(std::mt19937& rng) {
 
 TEST(MipPathBuffer, ExactBytes) {
   // Version 256, two keys in parameter order, each key path's whole block behind its parameter.
-  const Bytes expected =
-      Hex("74000000 00010000 02000000"
-          " 00000000000000c0"
-          "   2a000000 0400 0001"
-          "     1e000000 0100 0000 02000000 00000000 00000000 000080bf 0000003f 01 03 01000000"
-          "   00000000"
-          " 000000000000e03f"
-          "   2a000000 0400 0001"
-          "     1e000000 0100 0000 02000000 0000803f 00000040 00004040 00008040 01 03 01000000"
-          "   00000000");
+  const Bytes expected = HexBytes(
+      "74000000 00010000 02000000"
+      " 00000000000000c0"
+      "   2a000000 0400 0001"
+      "     1e000000 0100 0000 02000000 00000000 00000000 000080bf 0000003f 01 03 01000000"
+      "   00000000"
+      " 000000000000e03f"
+      "   2a000000 0400 0001"
+      "     1e000000 0100 0000 02000000 0000803f 00000040 00004040 00008040 01 03 01000000"
+      "   00000000");
   EXPECT_EQ(Block(TwoLines()), expected);
-  EXPECT_EQ(Block(ZvMipPath2fProp1d()), Hex("08000000 00010000 00000000"));
+  EXPECT_EQ(Block(ZvMipPath2fProp1d()), HexBytes("08000000 00010000 00000000"));
 }
 
 TEST(MipPathBuffer, RandomSequencesRoundTripThroughBothReaders) {
@@ -174,10 +162,6 @@ TEST(MipPathBuffer, ParametersThatAreNotFiniteReadAsZero) {
 
 TEST(MipPathBuffer, FuzzSeedsAreTheWrittenBlocks) {
   // ZV_WRITE_FUZZ_SEEDS=1 rewrites the committed seeds; otherwise they must match the writer.
-  std::string dir = __FILE__;
-  for (int up = 0; up < 3; ++up)
-    dir = dir.substr(0, dir.find_last_of('/'));
-  dir += "/fuzz/corpus/fuzz_mip_path_buffer/";
   std::mt19937 rng(21);
   ZvMipPath2fProp1d random = RandomSequence(rng);
   while (random.GetNumKeys() < 3)
@@ -193,19 +177,8 @@ TEST(MipPathBuffer, FuzzSeedsAreTheWrittenBlocks) {
                {"two_lines", Block(TwoLines())},
                {"bars", Block(bars)},
                {"random", Block(random)}};
-  const bool write = std::getenv("ZV_WRITE_FUZZ_SEEDS") != nullptr;
-  for (const auto& seed : seeds) {
-    const std::string file = dir + seed.name;
-    if (write) {
-      std::ofstream(file, std::ios::binary)
-          .write(reinterpret_cast<const char*>(seed.block.data()),
-                 static_cast<std::streamsize>(seed.block.size()));
-    }
-    std::ifstream in(file, std::ios::binary);
-    ASSERT_TRUE(in.good()) << file;
-    const Bytes stored((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
-    EXPECT_EQ(stored, seed.block) << file;
-  }
+  for (const auto& seed : seeds)
+    ExpectFuzzSeed("fuzz_mip_path_buffer", seed.name, seed.block);
 }
 
 }  // namespace

@@ -16,6 +16,7 @@
 #include <string>
 
 #include "path_fixtures.h"
+#include "tests/support/byte_blocks.h"
 
 namespace {
 
@@ -25,19 +26,6 @@ Bytes Block(const ZvShape2f& shape) {
   Bytes block(shape.GetBufferSize(), 0xee);
   EXPECT_EQ(shape.WriteToBuffer(block.data()), block.size());
   return block;
-}
-
-Bytes Hex(const char* text) {
-  Bytes out;
-  for (const char* p = text; *p;) {
-    if (*p == ' ') {
-      ++p;
-      continue;
-    }
-    out.push_back(static_cast<unsigned char>(std::stoi(std::string(p, 2), nullptr, 16)));
-    p += 2;
-  }
-  return out;
 }
 
 ZvPath2f Line() {
@@ -66,16 +54,16 @@ ZvPath2f HighDegrees() {
 
 TEST(Path2fBuffer, WrittenBytesAreFixed) {
   // The same bytes from every build: little-endian integers, binary32 floats, lock bits gone.
-  EXPECT_EQ(Block(ZvPath2f()), Hex("0c000000 0100 0000 00000000 00000000"));
-  EXPECT_EQ(Block(Line()), Hex("1e000000 0100 0000 02000000"
-                               "0000803f 000000c0 0000003f 00004040"
-                               "01 03 01000000"));
-  EXPECT_EQ(Block(LockedLoop()), Hex("4b000000 0100 0000 07000000"
-                                     "0000a041 00000000 0000c841 0000a0c0"
-                                     "0000f041 0000a0c0 00000c42 00000000"
-                                     "00002042 0000a040 00007041 0000a040"
-                                     "0000a041 00000000"
-                                     "01 08 09 0a 08 09 0b 00000000"));
+  EXPECT_EQ(Block(ZvPath2f()), HexBytes("0c000000 0100 0000 00000000 00000000"));
+  EXPECT_EQ(Block(Line()), HexBytes("1e000000 0100 0000 02000000"
+                                    "0000803f 000000c0 0000003f 00004040"
+                                    "01 03 01000000"));
+  EXPECT_EQ(Block(LockedLoop()), HexBytes("4b000000 0100 0000 07000000"
+                                          "0000a041 00000000 0000c841 0000a0c0"
+                                          "0000f041 0000a0c0 00000c42 00000000"
+                                          "00002042 0000a040 00007041 0000a040"
+                                          "0000a041 00000000"
+                                          "01 08 09 0a 08 09 0b 00000000"));
 }
 
 TEST(Path2fBuffer, RoundTripKeepsEverythingButLocks) {
@@ -316,10 +304,6 @@ TEST(Path2fBuffer, BoundedReaderHandsOnlyWellFormedPaths) {
 
 TEST(Path2fBuffer, FuzzSeedsAreTheWrittenBlocks) {
   // ZV_WRITE_FUZZ_SEEDS=1 rewrites the committed seeds; otherwise they must match the writer.
-  std::string dir = __FILE__;
-  for (int up = 0; up < 3; ++up)
-    dir = dir.substr(0, dir.find_last_of('/'));
-  dir += "/fuzz/corpus/fuzz_path_buffer/";
   const struct {
     const char* name;
     Bytes block;
@@ -330,17 +314,6 @@ TEST(Path2fBuffer, FuzzSeedsAreTheWrittenBlocks) {
                {"degrees", Block(HighDegrees())},
                {"rect", Block(ZvRect2f(P(2, 3), P(9, 4.5f), P(1, 8)))},
                {"oval", Block(ZvOval2f(P(4, 5), 6, 3))}};
-  const bool write = std::getenv("ZV_WRITE_FUZZ_SEEDS") != nullptr;
-  for (const auto& seed : seeds) {
-    const Bytes& block = seed.block;
-    const std::string file = dir + seed.name;
-    if (write) {
-      std::ofstream(file, std::ios::binary)
-          .write(reinterpret_cast<const char*>(block.data()), block.size());
-    }
-    std::ifstream in(file, std::ios::binary);
-    ASSERT_TRUE(in.good()) << file;
-    const Bytes stored((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
-    EXPECT_EQ(stored, block) << file;
-  }
+  for (const auto& seed : seeds)
+    ExpectFuzzSeed("fuzz_path_buffer", seed.name, seed.block);
 }

@@ -16,6 +16,7 @@
 
 #include "path_fixtures.h"
 #include "path_prop_fixtures.h"
+#include "tests/support/byte_blocks.h"
 
 namespace {
 
@@ -25,19 +26,6 @@ Bytes Block(const ZvShape2f& shape) {
   Bytes block(shape.GetBufferSize(), 0xee);
   EXPECT_EQ(shape.WriteToBuffer(block.data()), block.size());
   return block;
-}
-
-Bytes Hex(const char* text) {
-  Bytes out;
-  for (const char* p = text; *p;) {
-    if (*p == ' ') {
-      ++p;
-      continue;
-    }
-    out.push_back(static_cast<unsigned char>(std::stoi(std::string(p, 2), nullptr, 16)));
-    p += 2;
-  }
-  return out;
 }
 
 void PutU32(Bytes& b, std::uint32_t v) {
@@ -70,16 +58,16 @@ std::vector<double> Profile(const ZvPath2fProp1d& path) {
 
 TEST(PathPropBuffer, WrittenBytesAreFixed) {
   // Kind 4 with the format in the upper half, the whole path block, then the records.
-  const Bytes expected =
-      Hex("8e000000 0400 0001"
-          "1e000000 0100 0000 02000000 0000803f 00000040 00004040 00008040 01 03 01000000"
-          "01000000 00000000"
-          "5c000000 08010000 1e000000 000000000000f03f ffffffffffffefff ffffffffffffef7f"
-          "02000000 0000000000000000 000000000000f03f 0000000000000040 0000000000000840"
-          "00000000 02010000 01 00 05000000 0001000000 08010000 01");
+  const Bytes expected = HexBytes(
+      "8e000000 0400 0001"
+      "1e000000 0100 0000 02000000 0000803f 00000040 00004040 00008040 01 03 01000000"
+      "01000000 00000000"
+      "5c000000 08010000 1e000000 000000000000f03f ffffffffffffefff ffffffffffffef7f"
+      "02000000 0000000000000000 000000000000f03f 0000000000000040 0000000000000840"
+      "00000000 02010000 01 00 05000000 0001000000 08010000 01");
   EXPECT_EQ(Block(OneLine()), expected);
-  EXPECT_EQ(Block(ZvPath2fProp1d()), Hex("18000000 0400 0001 0c000000 0100 0000 00000000 "
-                                         "00000000 00000000"));
+  EXPECT_EQ(Block(ZvPath2fProp1d()), HexBytes("18000000 0400 0001 0c000000 0100 0000 00000000 "
+                                              "00000000 00000000"));
 }
 
 TEST(PathPropBuffer, RandomPathsReadBackWhole) {
@@ -200,10 +188,6 @@ TEST(PathPropBuffer, BadBlocksAreRefusedAndChangeNothing) {
 
 TEST(PathPropBuffer, FuzzSeedsAreTheWrittenBlocks) {
   // ZV_WRITE_FUZZ_SEEDS=1 rewrites the committed seeds; otherwise they must match the writer.
-  std::string dir = __FILE__;
-  for (int up = 0; up < 3; ++up)
-    dir = dir.substr(0, dir.find_last_of('/'));
-  dir += "/fuzz/corpus/fuzz_path_prop_buffer/";
   std::mt19937 rng(3);
   const struct {
     const char* name;
@@ -213,17 +197,6 @@ TEST(PathPropBuffer, FuzzSeedsAreTheWrittenBlocks) {
                {"two_lines", Block(TwoLinesWithCurves())},
                {"random_a", Block(RandomPropPath(rng))},
                {"random_b", Block(RandomPropPath(rng))}};
-  const bool write = std::getenv("ZV_WRITE_FUZZ_SEEDS") != nullptr;
-  for (const auto& seed : seeds) {
-    const std::string file = dir + seed.name;
-    if (write) {
-      std::ofstream(file, std::ios::binary)
-          .write(reinterpret_cast<const char*>(seed.block.data()),
-                 static_cast<std::streamsize>(seed.block.size()));
-    }
-    std::ifstream in(file, std::ios::binary);
-    ASSERT_TRUE(in.good()) << file;
-    const Bytes stored((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
-    EXPECT_EQ(stored, seed.block) << file;
-  }
+  for (const auto& seed : seeds)
+    ExpectFuzzSeed("fuzz_path_prop_buffer", seed.name, seed.block);
 }

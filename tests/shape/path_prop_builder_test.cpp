@@ -20,6 +20,7 @@
 #include "path_builder_feed.h"
 #include "path_fixtures.h"
 #include "tests/curvemath/bezier_fit_strokes.h"
+#include "tests/support/byte_blocks.h"
 
 namespace {
 struct Sample {
@@ -356,24 +357,12 @@ TEST(PathPropBuilder, FuzzSeedsAreTheWrittenStreams) {
     }
     return b;
   };
-  std::string dir = __FILE__;
-  for (int up = 0; up < 3; ++up)
-    dir = dir.substr(0, dir.find_last_of('/'));
-  dir += "/fuzz/corpus/fuzz_path_prop_builder/";
   const struct {
     const char* name;
     Bytes bytes;
   } seeds[] = {{"linear_open", stream(0, 40, 30, 3)},
                {"fit_closed_two_steps", stream(1 | (2 << 1), 50, 40, 3 | 4 | 8)},
                {"fit_reset", stream(1 | (4 << 1), 30, 20, 0x33)}};
-  const bool write = std::getenv("ZV_WRITE_FUZZ_SEEDS") != nullptr;
-  for (const auto& seed : seeds) {
-    const std::string file = dir + seed.name;
-    if (write)
-      std::ofstream(file, std::ios::binary)
-          .write(reinterpret_cast<const char*>(seed.bytes.data()), seed.bytes.size());
-    std::ifstream in(file, std::ios::binary);
-    const Bytes stored((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
-    EXPECT_EQ(stored, seed.bytes) << seed.name;
-  }
+  for (const auto& seed : seeds)
+    ExpectFuzzSeed("fuzz_path_prop_builder", seed.name, seed.bytes);
 }
