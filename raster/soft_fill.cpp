@@ -111,9 +111,12 @@ inline void FadeBy(float m, float& t) {
 }
 
 // The clip step: the shape's own antialiased coverage at full opacity multiplies the result.
-// The context's opacity is lent for the moment and given back on every way out.
+// The context's opacity is lent for the moment and given back on every way out. Outside `reach`
+// the result already holds `zero`; when that is a plain 0, fading leaves it so whatever the
+// mask, and only the pixels inside are visited.
 template <class T>
-int ClipToShape(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int (*callback)()) {
+int ClipToShape(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int (*callback)(),
+                ZvFillBox reach, T zero) {
   ZvGC& lent = const_cast<ZvGC&>(gc);
   const double opacity = gc.opacity;
   try {
@@ -123,10 +126,17 @@ int ClipToShape(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int (
     path.AAFill(gc, mask, nullptr, nullptr);
     lent.opacity = opacity;
     if (callback && callback()) return 0;
-    T* t = raster.GetRaster();
-    const T* m = mask.GetRaster();
-    for (int i = 0, n = raster.GetSize(); i < n; ++i)
-      FadeBy(m[i], t[i]);
+    // A negative or non-finite opacity leaves -0.0 or NaN in a float raster, which the fade
+    // turns into 0: then every pixel is visited.
+    if (!(zero == T(0) && !std::signbit(static_cast<double>(zero))))
+      reach = ZvFillBox{0, 0, raster.GetWidth(), raster.GetHeight()};
+    for (int y = reach.yMin; y < reach.yMax; ++y) {
+      const int offset = raster.CalculateOffsetForPos(reach.xMin, raster.ConvertBottomUpY(y));
+      T* t = raster.GetRaster() + offset;
+      const T* m = mask.GetRaster() + offset;
+      for (int i = 0, n = reach.xMax - reach.xMin; i < n; ++i)
+        FadeBy(m[i], t[i]);
+    }
   } catch (const std::bad_alloc&) {
     // Without a mask the unclipped result stands.
     lent.opacity = opacity;
@@ -235,7 +245,9 @@ int SoftFillPath(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int 
     if (n < band) return 0;
   }
 
-  if (gc.clipToShape == 1) return ClipToShape(path, gc, raster, callback);
+  if (gc.clipToShape == 1)
+    return ClipToShape(path, gc, raster, callback,
+                       ZvFillBox{reachFirst, outFirst, reachEnd, outEnd}, zero);
   return 1;
 }
 
