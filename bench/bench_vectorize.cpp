@@ -6,11 +6,12 @@
 // raster prepared outside the timing, in the form it takes (8-bit pixels for zv, a packed
 // bitmap for the peer), and builds its whole result every iteration.
 //
-// The sweep alone, writing no path, runs as a fourth case.
+// The sweep alone, writing no path, and the fitting recursion alone run as two more cases.
 //
 // Run with --benchmark_repetitions=N (N odd, 5 or more on a shared machine): the summary gives
 // median CPU times, the ratios to the peer (targets: Vectorize at most 0.1, VectorizeAndFit at
 // most 0.5), paths and segments of each result, and the growth from 1024^2 to 4096^2.
+#include <zv/bezier_fit.h>
 #include <zv/gc.h>
 #include <zv/path2f.h>
 #include <zv/vectorizer.h>
@@ -19,6 +20,7 @@
 
 #include "median_reporter.h"
 
+#include <algorithm>
 #include <cmath>
 #include <cstdio>
 #include <random>
@@ -158,6 +160,125 @@ void ZvVectorizeAndFit(benchmark::State& state, int scene) {
   Count(state, path);
 }
 
+// The fitting recursion alone, on the contours Vectorize traced: every contour resampled at its
+// pixel steps outside the timing, then fitted by the same recursion VectorizeAndFit runs (single
+// G1 cubic fits, split where a fit strays, tangents from samples 2 to 4 steps either side). Its
+// output is checked against VectorizeAndFit's before timing; the timed runs write no path, so
+// the figure is what the fits cost on their own.
+struct FitInput {
+  std::vector<ZvPoint2fArray> samples;
+  ZvDoubleArray steps{1};
+};
+
+FitInput Resampled(const ZvPath2f& polygons) {
+  FitInput in;
+  ZvPath2fIter it(polygons);
+  unsigned int first = 0, last = 0;
+  while (it.GetNextSubPathIndices(first, last)) {
+    in.samples.emplace_back(64);
+    ZvPoint2fArray& s = in.samples.back();
+    int x = static_cast<int>(polygons.GetPoint(first).x),
+        y = static_cast<int>(polygons.GetPoint(first).y);
+    s.Add(x, y);
+    for (unsigned int i = first + 1; i <= last; ++i) {
+      const int tx = static_cast<int>(polygons.GetPoint(i).x),
+                ty = static_cast<int>(polygons.GetPoint(i).y);
+      while (x != tx || y != ty) {
+        if (x != tx)
+          x += x < tx ? 1 : -1;
+        else
+          y += y < ty ? 1 : -1;
+        s.Add(x, y);
+      }
+    }
+    while (in.steps.size < s.size)
+      in.steps.Add(static_cast<double>(in.steps.size));
+  }
+  return in;
+}
+
+ZvPoint2<double> Tangent(const ZvPoint2fArray& s, unsigned int i) {
+  const unsigned int n = s.size - 1;
+  auto at = [&s](unsigned int k) { return ZvPoint2<double>{s[k].x, s[k].y}; };
+  ZvPoint2<double> v{0.0, 0.0};
+  for (unsigned int k = 2; k <= 4; ++k)
+    v += i >= 4 && i + 4 <= n ? at(i + k) - at(i - k) : at((i + k) % n) - at((n - i + k) % n);
+  if (std::fabs(static_cast<float>(v.x)) <= 1e-07f && std::fabs(static_cast<float>(v.y)) <= 1e-07f)
+    v = (i == 0 || i >= n) ? at(1) - at(n - 1) : at(i + 1) - at(i - 1);
+  const double len2 = v.x * v.x + v.y * v.y;
+  if ((std::fabs(v.x) <= 1e-09 && std::fabs(v.y) <= 1e-09) || len2 <= 1e-09) return v;
+  return {v.x / std::sqrt(len2), v.y / std::sqrt(len2)};
+}
+
+// Fits every contour; appends to `path` when given. Counts the single-curve fits and the samples
+// they covered.
+void FitRecursion(ZvBezierTool& tool, const FitInput& in, double tolerance, ZvPath2f* path,
+                  double& fits, double& covered) {
+  struct Range {
+    unsigned int first, last;
+    ZvPoint2<double> t0, t1;
+  };
+  std::vector<Range> todo;
+  for (const ZvPoint2fArray& s : in.samples) {
+    const ZvPoint2<double> t = Tangent(s, 0);
+    if (path) path->Moveto(s[0]);
+    todo.push_back({0, s.size - 1, t, t});
+    while (!todo.empty()) {
+      const Range r = todo.back();
+      todo.pop_back();
+      if (r.first + 2 >= r.last) {
+        if (path && r.first + 1 == r.last) path->Lineto(s[r.last]);
+        if (path && r.first + 2 == r.last) path->Curveto(s[r.first + 1], s[r.first + 1], s[r.last]);
+        continue;
+      }
+      ZvPoint2<float> control[4];
+      unsigned int split = (r.first + r.last) / 2;
+      ++fits;
+      covered += r.last - r.first + 1;
+      if (tool.SingleCurveFitG1G1(s, in.steps, r.first, r.last, r.t0, r.t1, tolerance, 3, control,
+                                  split)) {
+        if (path) path->AltCurveto(control + 1, 3);
+        continue;
+      }
+      if (split <= r.first || split >= r.last) split = (r.first + r.last) / 2;
+      const ZvPoint2<double> ts = Tangent(s, split);
+      todo.push_back({split, r.last, ts, r.t1});
+      todo.push_back({r.first, split, r.t0, ts});
+    }
+    if (path) path->Closeto();
+  }
+}
+
+void ZvFitAlone(benchmark::State& state, int scene) {
+  const ZvRaster<unsigned char>& r = GetScene(scene);
+  const ZvVectorizer v(0, 0);
+  const ZvGC gc;
+  ZvPath2f polygons, fitted, replayed;
+  v.Vectorize(r, 0, r.GetExtent2f(), polygons);
+  v.VectorizeAndFit(r, 0, r.GetExtent2f(), gc, fitted);
+  const FitInput in = Resampled(polygons);
+  ZvBezierTool tool;
+  double fits = 0, covered = 0;
+  FitRecursion(tool, in, gc.flattenTolerance, &replayed, fits, covered);
+  std::vector<unsigned char> a(fitted.GetBufferSize()), b(replayed.GetBufferSize());
+  fitted.WriteToBuffer(a.data());
+  replayed.WriteToBuffer(b.data());
+  if (a != b) {
+    state.SkipWithError("the replayed recursion differs from VectorizeAndFit");
+    return;
+  }
+  std::size_t samples = 0;
+  for (const ZvPoint2fArray& s : in.samples)
+    samples += s.size;
+  for (auto _ : state) {
+    fits = covered = 0;
+    FitRecursion(tool, in, gc.flattenTolerance, nullptr, fits, covered);
+  }
+  state.counters["fits"] = fits;
+  state.counters["samples"] = static_cast<double>(samples);
+  state.counters["covered"] = covered;
+}
+
 #if ZV_HAVE_POTRACE
 // The dark pixels packed one bit each, leftmost pixel in the highest bit of a word.
 struct Bitmap {
@@ -199,7 +320,7 @@ void Potrace(benchmark::State& state, int scene) {
 }
 #endif
 
-const char* const kContenders[] = {"vectorize", "vectorize_fit", "potrace", "sweep"};
+const char* const kContenders[] = {"vectorize", "vectorize_fit", "potrace", "sweep", "fit_alone"};
 
 std::string Key(int scene, const char* contender) {
   return std::string(kScenes[scene]) + "/" + contender;
@@ -216,6 +337,8 @@ void Register() {
         ->Unit(benchmark::kMillisecond);
 #endif
     benchmark::RegisterBenchmark(Key(scene, kContenders[3]).c_str(), ZvSweep, scene)
+        ->Unit(benchmark::kMillisecond);
+    benchmark::RegisterBenchmark(Key(scene, kContenders[4]).c_str(), ZvFitAlone, scene)
         ->Unit(benchmark::kMillisecond);
   }
 }
@@ -253,8 +376,18 @@ void PrintSummary(const ZvMedianReporter& reporter) {
       std::printf("  %-11s %8.3f ms, %.3f of the peer, %.0f corner calls\n", kScenes[scene], sw,
                   p > 0.0 ? sw / p : 0.0, counter(scene, 3, "corners"));
   }
+  std::printf("\nThe fitting recursion alone (same contours, no tracing, no path written):\n");
+  for (int scene = 0; scene < 3; ++scene) {
+    const double fit = ms(scene, 4), p = ms(scene, 2);
+    if (fit > 0.0)
+      std::printf(
+          "  %-11s %8.3f ms, %.3f of the peer; %.0f fits over %.0f samples (%.1f per sample)\n",
+          kScenes[scene], fit, p > 0.0 ? fit / p : 0.0, counter(scene, 4, "fits"),
+          counter(scene, 4, "samples"),
+          counter(scene, 4, "covered") / std::max(counter(scene, 4, "samples"), 1.0));
+  }
   std::printf("\nGrowth from glyphs1024 to glyphs4096 (16 times the pixels; target at most 16):\n");
-  for (int c = 0; c < 4; ++c) {
+  for (int c = 0; c < 5; ++c) {
     const double small = ms(0, c), large = ms(1, c);
     if (small > 0.0 && large > 0.0)
       std::printf("  %-14s %6.2f%s\n", kContenders[c], large / small,

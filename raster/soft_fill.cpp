@@ -48,8 +48,10 @@ void CFillContext::BuildFeatheringFilters(int radius, int taps, const ZvGC& gc) 
 
 namespace {
 
-// Columns convolved together in the vertical pass: H is read a band's width along each row.
-constexpr int kBand = 16;
+// Columns convolved together in the vertical pass: H is read, and the raster written, a band's
+// width along each row. Both are walked down their rows, a page or more apart, so a band must
+// span several cache lines of each to keep the pass from waiting on memory at every row.
+constexpr int kBand = 64;
 
 // The part of the filter that falls on a run of covered cells a..b when centred on cell `at`:
 // the taps j with at + j - R inside a..b. A cell whose every tap lies in the run gets exactly 1.
@@ -111,9 +113,12 @@ inline void FadeBy(float m, float& t) {
 }
 
 // The clip step: the shape's own antialiased coverage at full opacity multiplies the result.
-// The context's opacity is lent for the moment and given back on every way out.
+// The context's opacity is lent for the moment and given back on every way out. Outside `reach`
+// the result already holds `zero`; when that is a plain 0, fading leaves it so whatever the
+// mask, and only the pixels inside are visited.
 template <class T>
-int ClipToShape(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int (*callback)()) {
+int ClipToShape(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int (*callback)(),
+                ZvFillBox reach, T zero) {
   ZvGC& lent = const_cast<ZvGC&>(gc);
   const double opacity = gc.opacity;
   try {
@@ -123,10 +128,17 @@ int ClipToShape(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int (
     path.AAFill(gc, mask, nullptr, nullptr);
     lent.opacity = opacity;
     if (callback && callback()) return 0;
-    T* t = raster.GetRaster();
-    const T* m = mask.GetRaster();
-    for (int i = 0, n = raster.GetSize(); i < n; ++i)
-      FadeBy(m[i], t[i]);
+    // A negative or non-finite opacity leaves -0.0 or NaN in a float raster, which the fade
+    // turns into 0: then every pixel is visited.
+    if (!(zero == T(0) && !std::signbit(static_cast<double>(zero))))
+      reach = ZvFillBox{0, 0, raster.GetWidth(), raster.GetHeight()};
+    for (int y = reach.yMin; y < reach.yMax; ++y) {
+      const int offset = raster.CalculateOffsetForPos(reach.xMin, raster.ConvertBottomUpY(y));
+      T* t = raster.GetRaster() + offset;
+      const T* m = mask.GetRaster() + offset;
+      for (int i = 0, n = reach.xMax - reach.xMin; i < n; ++i)
+        FadeBy(m[i], t[i]);
+    }
   } catch (const std::bad_alloc&) {
     // Without a mask the unclipped result stands.
     lent.opacity = opacity;
@@ -156,7 +168,8 @@ int SoftFillPath(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int 
   // rows and columns the spans can reach are ever written or read, so only they are cleared.
   const std::size_t cells = static_cast<std::size_t>(columns) * static_cast<std::size_t>(rows);
   ctx.rowBuffer0 = new unsigned char[cells * sizeof(double)];
-  ctx.rowBuffer1 = new unsigned char[static_cast<std::size_t>(rows) * kBand * sizeof(double)];
+  const int band = std::min(kBand, width);
+  ctx.rowBuffer1 = new unsigned char[static_cast<std::size_t>(rows) * band * sizeof(double)];
   double* h = static_cast<double*>(ctx.rowBuffer0);
   double* buffers = static_cast<double*>(ctx.rowBuffer1);
   const int hTop = box.yMin + radius, hEnd = box.yMax + radius;  // rows of H spans reach
@@ -192,10 +205,10 @@ int SoftFillPath(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int 
   const int outFirst = std::max(box.yMin - radius, 0), outEnd = std::min(box.yMax + radius, height);
   const T zero = Quantise<T>(0.0 * gc.opacity);
   T* pixels = raster.GetRaster();
-  for (int x0 = 0; x0 < width; x0 += kBand) {
+  for (int x0 = 0; x0 < width; x0 += band) {
     int n = 0;
-    const int band = std::min(kBand, width - x0);
-    while (n < band && !(callback && callback()))
+    const int columnsHere = std::min(band, width - x0);
+    while (n < columnsHere && !(callback && callback()))
       ++n;
     int runStart[kBand];
     for (int c = 0; c < n; ++c) {
@@ -232,10 +245,12 @@ int SoftFillPath(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int 
                      ? Quantise<T>(buffers[c * rows + y + radius] * gc.opacity)
                      : zero;
     }
-    if (n < band) return 0;
+    if (n < columnsHere) return 0;
   }
 
-  if (gc.clipToShape == 1) return ClipToShape(path, gc, raster, callback);
+  if (gc.clipToShape == 1)
+    return ClipToShape(path, gc, raster, callback,
+                       ZvFillBox{reachFirst, outFirst, reachEnd, outEnd}, zero);
   return 1;
 }
 

@@ -10,16 +10,16 @@ VectClosure& Closure(void* p) {
   return *static_cast<VectClosure*>(p);
 }
 
-void Flush(VectClosure& c) {
-  if (!c.pending) return;
-  c.path->Lineto(c.point);
-  c.pending = 0;
+// Hands the gathered contour to the path in one call.
+void Flush(VectClosure& c, int close) {
+  c.path->AddPolyline(c.contour.data, c.contour.size, close);
+  c.contour.Chop(0);
 }
 }  // namespace
 
 int ShouldExtendLastSegment(const VectClosure& closure, const ZvPoint2<float>& p) {
-  const ZvPoint2<float>& a = closure.before;
-  const ZvPoint2<float>& b = closure.point;
+  const ZvPoint2<float>& a = closure.contour[closure.contour.size - 2];
+  const ZvPoint2<float>& b = closure.contour[closure.contour.size - 1];
   // Differences of floats are exact in double, so these tests see the exact geometry.
   auto same = [](float u, float v) { return std::fabs(static_cast<double>(u) - v) <= 1e-15; };
   if (b.x > a.x) return same(p.y, b.y) && p.x >= b.x;
@@ -37,37 +37,27 @@ void VectNewComponent(void* closure) {
 
 void VectMoveto(int x, int y, void* closure) {
   VectClosure& c = Closure(closure);
-  Flush(c);
   // A component's first contour starts fresh; the others close the contour before them.
-  if (c.newComponent)
-    c.newComponent = 0;
-  else
-    c.path->Closeto();
-  c.point = {static_cast<float>(x), static_cast<float>(y)};
-  c.path->Moveto(c.point);
+  if (c.contour.size) Flush(c, !c.newComponent);
+  c.newComponent = 0;
+  c.contour.Add(ZvPoint2<float>{static_cast<float>(x), static_cast<float>(y)});
   ++c.emitted;
-  c.contourPoints = 1;
 }
 
 void VectLineto(int x, int y, void* closure) {
   VectClosure& c = Closure(closure);
   const ZvPoint2<float> p{static_cast<float>(x), static_cast<float>(y)};
-  if (c.contourPoints >= 2 && ShouldExtendLastSegment(c, p)) {
-    c.point = p;
+  if (c.contour.size >= 2 && ShouldExtendLastSegment(c, p)) {
+    c.contour[c.contour.size - 1] = p;
     return;
   }
-  Flush(c);
-  c.before = c.point;
-  c.point = p;
-  c.pending = 1;
+  c.contour.Add(p);
   ++c.emitted;
-  ++c.contourPoints;
 }
 
 void VectCloseComponent(void* closure) {
   VectClosure& c = Closure(closure);
-  Flush(c);
-  c.path->Closeto();
+  if (c.contour.size) Flush(c, 1);
 }
 
 void VectClose(void*) {}

@@ -11,17 +11,16 @@ class ZvBezierTool;
 class ZvGC;
 class ZvPath2f;
 
-// The path callbacks' user data. The last corner of a contour is held back in `point` until the
-// next one shows whether it merely extends the same edge; the path is so never edited after an
-// append.
+// The path callbacks' user data. A contour's corners gather in `contour` and reach the path in
+// one append when the contour ends, so a trace takes the path's lock and grows its arrays once a
+// contour rather than once a corner; the buffer is reused from contour to contour.
 struct VectClosure {
-  ZvPoint2<float> point;   // last corner of the present contour
-  ZvPoint2<float> before;  // the corner before it
+  explicit VectClosure(ZvPath2f& target)
+      : path(&target), contour(256), emitted(0), newComponent(0) {}
   ZvPath2f* path;
-  unsigned int emitted;        // points counted for the whole call
-  unsigned int contourPoints;  // points of the present contour
-  int newComponent;            // set until the first contour of a component starts
-  int pending;                 // `point` is not in the path yet
+  ZvPoint2fArray contour;  // corners of the present contour, not in the path yet
+  unsigned int emitted;    // points counted for the whole call
+  int newComponent;        // set until the first contour of a component starts
 };
 
 void VectInit(const ZvExtent2<float>& extent, void* closure);
@@ -33,8 +32,9 @@ void VectClose(void* closure);
 // The table of the functions above.
 ObCallbackTable VectPathTable();
 
-// Whether p continues the contour's last edge in the same direction, so that the edge can simply
-// be lengthened. A step back is never merged, so unit edges make no spikes.
+// Whether p continues the edge between the contour's last two corners in the same direction, so
+// that the edge can simply be lengthened. A step back is never merged, so unit edges make no
+// spikes.
 int ShouldExtendLastSegment(const VectClosure& closure, const ZvPoint2<float>& p);
 
 // The unit tangent at sample `index` of a closed loop of samples whose last repeats the first.

@@ -50,8 +50,7 @@ int ZvVectorizer::Trace(const ZvRaster<unsigned char>& raster, unsigned char val
 
 unsigned int ZvVectorizer::Vectorize(const ZvRaster<unsigned char>& raster, unsigned char value,
                                      const ZvExtent2<float>& extent, ZvPath2f& path) const {
-  VectClosure closure{};
-  closure.path = &path;
+  VectClosure closure(path);
   // One hold for the whole trace: the appends below then take the recursive lock without a
   // round trip to the other threads, and no reader sees half a component.
   ZvShapeLock guard(path);

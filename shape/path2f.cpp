@@ -1,6 +1,8 @@
 // ZvPath2f: construction, copying, point access and drawing.
 #include <zv/path2f.h>
 
+#include <cstring>
+#include <functional>
 #include <new>
 
 #include "shape/path_codes.h"
@@ -157,6 +159,26 @@ void ZvPath2f::Moveto(const ZvPoint2<float>& p) {
   ZvShapeLock guard(*this);
   Append(&p, 1, kStart);
   currentSubpathOpen = 1;
+}
+
+void ZvPath2f::AddPolyline(const ZvPoint2<float>* p, unsigned int count, int close) {
+  if (count == 0) return;
+  ZvShapeLock guard(*this);
+  const unsigned int n = points.size;
+  // The source may be this path's own storage, which growing moves: find it again after.
+  const std::less<const ZvPoint2<float>*> before;
+  const bool own = !before(p, points.data) && before(p, points.data + n);
+  const std::size_t offset = own ? static_cast<std::size_t>(p - points.data) : 0;
+  GrowBoth(count);
+  std::memmove(points.data + n, own ? points.data + offset : p, count * sizeof(ZvPoint2<float>));
+  codes[n] = kStart;
+  std::memset(codes.data + n + 1, Base(1), count - 1);
+  currentSubpathOpen = 1;
+  // Closeto without its search for the subpath's start, which is known here.
+  const unsigned int last = n + count - 1;
+  if (!close || !Coincide(points[last], points[n])) return;
+  if (count > 1) codes[last] = ClosedFromOpen(codes[last]);
+  currentSubpathOpen = 0;
 }
 
 void ZvPath2f::AppendSegment(const ZvPoint2<float>* p, unsigned int degree) {

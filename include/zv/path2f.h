@@ -210,6 +210,10 @@ class ZV_API ZvPath2f : public ZvShape2f {
   void AltCurveto(const ZvPoint2<float>* points, unsigned int degree);
   // The same from array[first] on. Nothing when the points are not all inside the array.
   void AltAltCurveto(const ZvPoint2fArray& array, unsigned int first, unsigned int degree);
+  // A polyline as one new subpath: what Moveto(points[0]), a Lineto to each further point and,
+  // with `close` non-zero, Closeto would append, under one hold of the lock and with one growth
+  // of the arrays. The points may lie in this path. Nothing for a count of 0.
+  void AddPolyline(const ZvPoint2<float>* points, unsigned int count, int close);
   // Closes the last subpath if its end already lies within 1e-7 of its start (per axis, single
   // precision, bounds included): 1. Never adds a segment; 0 and no change when the ends are
   // apart or the path is empty.

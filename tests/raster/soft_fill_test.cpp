@@ -5,8 +5,11 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
+#include <cstring>
 #include <random>
+#include <string>
 #include <vector>
 
 namespace {
@@ -69,7 +72,70 @@ std::vector<double> Convolved(const ZvPath2f& path, const ZvGC& gc, int w, int h
   return out;
 }
 
+// The clip step's fade of one pixel, with the roundings each pixel type is documented to use.
+void Fade(unsigned char m, unsigned char& t) {
+  if (m == 0) t = 0;
+  if (m > 1)
+    t = static_cast<unsigned char>(float(m * 0.003921569f * (t * 0.003921569f)) * 255.0 + 0.5);
+}
+void Fade(short m, short& t) {
+  auto unit = [](short v) { return std::min(std::max(v * 6.1035156e-05, 0.0), 1.0); };
+  if (m == 0) t = 0;
+  if (m != 0 && m != 1) t = static_cast<short>(unit(m) * unit(t) * 16384.0 + 0.5);
+}
+void Fade(float m, float& t) {
+  if (m == 0) t = 0;
+  if (m != 0 && m != 1) t = t * m;
+}
+
+// The clipped soft fill must be the unclipped one faded by the shape's antialiased coverage over
+// the whole raster, to the bit, whatever part of the raster the blur reached.
+template <class T>
+void ExpectClippedIsFadedEverywhere(const ZvPath2f& path, ZvGC gc, int w, int h, int orientation,
+                                    const char* what) {
+  ZvRaster<T> clipped(w, h, 3), expected(w, h, 3), mask(w, h, 0);
+  clipped.SetOrientationFlag(orientation);
+  expected.SetOrientationFlag(orientation);
+  mask.SetOrientationFlag(orientation);
+  gc.clipToShape = 1;
+  const int drawn = path.SoftFill(gc, clipped, nullptr);
+  gc.clipToShape = 0;
+  ASSERT_EQ(path.SoftFill(gc, expected, nullptr), drawn) << what;
+  gc.opacity = 1.0;
+  path.AAFill(gc, mask, nullptr, nullptr);
+  if (drawn)
+    for (int i = 0; i < w * h; ++i)
+      Fade(mask.GetRaster()[i], expected.GetRaster()[i]);
+  EXPECT_EQ(std::memcmp(clipped.GetRaster(), expected.GetRaster(), sizeof(T) * w * h), 0) << what;
+}
+
 }  // namespace
+
+TEST(SoftFill, ClippedResultIsTheUnclippedOneFadedEverywhere) {
+  std::mt19937 rng(17);
+  std::uniform_real_distribution<float> coord(-10.0f, 70.0f);
+  std::vector<ZvPath2f> shapes = {Disc(30, 25, 14), Disc(4, 50, 20), Disc(58, 2, 9)};
+  for (int n = 0; n < 6; ++n) {
+    std::vector<ZvPoint2<float>> corners;
+    for (int i = 0; i < 3 + n % 3; ++i)
+      corners.push_back({coord(rng), coord(rng)});
+    shapes.push_back(Polygon(corners));
+  }
+  // Opacities below 0 leave -0.0 outside the blur in float rasters, which the fade rewrites.
+  const double opacities[] = {1.0, 0.55, -0.5};
+  for (std::size_t k = 0; k < shapes.size(); ++k)
+    for (int orientation = 0; orientation < 2; ++orientation) {
+      ZvGC gc;
+      gc.featherInner = 1.0 + 2.5 * (k % 4);
+      gc.opacity = opacities[k % 3];
+      gc.fillRule = static_cast<int>(k % 2);
+      const std::string what = std::to_string(k) + "/" + std::to_string(orientation);
+      ExpectClippedIsFadedEverywhere<float>(shapes[k], gc, 61, 53, orientation, what.c_str());
+      ExpectClippedIsFadedEverywhere<unsigned char>(shapes[k], gc, 61, 53, orientation,
+                                                    what.c_str());
+      ExpectClippedIsFadedEverywhere<short>(shapes[k], gc, 61, 53, orientation, what.c_str());
+    }
+}
 
 TEST(SoftFill, UnclippedResultIsTheConvolutionOfThePlainFill) {
   std::mt19937 rng(5);

@@ -132,6 +132,57 @@ TEST(Path2f, ClosetoNeedsCoincidentEnds) {
   EXPECT_EQ(Codes(lone), (Codeset{1}));
 }
 
+// AddPolyline must leave exactly what the calls it stands for would: points, codes and whether
+// the last subpath is open, on a path that already holds a curve.
+TEST(Path2f, AddPolylineEqualsItsDrawingCalls) {
+  const ZvPoint2<float> ring[] = {P(0, 0), P(0, 2), P(3, 2), P(3, 0), P(1e-7f, 0)};
+  const ZvPoint2<float> open[] = {P(5, 5), P(6, 5), P(6, 7)};
+  struct Case {
+    const ZvPoint2<float>* points;
+    unsigned int count;
+    int close;
+  };
+  const Case cases[] = {{ring, 5, 1}, {ring, 5, 0}, {open, 3, 1}, {open, 1, 1}, {open, 1, 0}};
+  for (const Case& c : cases) {
+    ZvPath2f base;
+    base.Moveto(P(9, 9));
+    base.Curveto(P(10, 9), P(10, 10), P(9, 10));
+    ZvPath2f bulk(base), calls(base);
+    bulk.AddPolyline(c.points, c.count, c.close);
+    calls.Moveto(c.points[0]);
+    for (unsigned int i = 1; i < c.count; ++i)
+      calls.Lineto(c.points[i]);
+    if (c.close) calls.Closeto();
+    EXPECT_EQ(Codes(bulk), Codes(calls)) << c.count << " " << c.close;
+    EXPECT_EQ(PathArrays::Open(bulk), PathArrays::Open(calls));
+    ASSERT_EQ(bulk.NumPoints(), calls.NumPoints());
+    for (unsigned int i = 0; i < bulk.NumPoints(); ++i)
+      EXPECT_TRUE(bulk.GetPoint(i).x == calls.GetPoint(i).x &&
+                  bulk.GetPoint(i).y == calls.GetPoint(i).y);
+    EXPECT_TRUE(PathInvariantHolds(bulk));
+  }
+  // Nothing at all for no points.
+  ZvPath2f empty;
+  empty.AddPolyline(ring, 0, 1);
+  EXPECT_EQ(empty.NumPoints(), 0u);
+}
+
+TEST(Path2f, AddPolylineFromItsOwnPoints) {
+  // Appending a run of the path's own points when the arrays are full, so that growing moves
+  // the block the source lies in.
+  ZvPath2f path(4);
+  path.Moveto(P(0, 0));
+  path.Lineto(P(4, 0));
+  path.Lineto(P(4, 3));
+  path.Lineto(P(0, 0));
+  ASSERT_EQ(PathArrays::Points(path).capacity, 4u);
+  path.AddPolyline(PathArrays::Points(path).data, 4, 1);
+  EXPECT_EQ(Codes(path), (Codeset{1, 3, 3, 3, 1, 3, 3, 4}));
+  EXPECT_EQ(path.GetPoint(6).x, 4.0f);
+  EXPECT_EQ(path.GetPoint(6).y, 3.0f);
+  EXPECT_EQ(PathArrays::Open(path), 0u);
+}
+
 TEST(Path2f, CloseSubpathInsideThePathInserts) {
   ZvPath2f path = ThreeSubpaths();
   EXPECT_EQ(path.CloseSubpath(1), 1);

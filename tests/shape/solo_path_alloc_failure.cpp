@@ -102,6 +102,7 @@ std::vector<Step> DrawingSteps() {
     steps.push_back([](ZvPath2f& p) { p.AltAltCurveto(array, 0, 8); });
     steps.push_back([](ZvPath2f& p) { p.Lineto(P(0, 0)); });
     steps.push_back([](ZvPath2f& p) { p.Closeto(); });
+    steps.push_back([](ZvPath2f& p) { p.AddPolyline(pts, 8, 1); });
   }
   return steps;
 }
@@ -118,7 +119,7 @@ TEST(PathAllocFailure, AppendsChopBackAndRethrow) {
     step(reference);
   }
   EXPECT_GT(failures, 0);
-  EXPECT_EQ(reference.NumSubpaths(), 3u);
+  EXPECT_EQ(reference.NumSubpaths(), 6u);
 }
 
 TEST(PathAllocFailure, CloseSubpathInsertionChopsBack) {
