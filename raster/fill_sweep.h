@@ -45,46 +45,50 @@ class CFillSweep {
   template <bool NonZero, class Span>
   void Spans(int leftLimit, int rightExclusive, Span&& span) {
     CFillActiveEdge* e = edges;
-    crossed = false;
+    const Limits limits(leftLimit, rightExclusive);
+    // A local, not the member: the member was read and written in memory at every edge.
+    bool cross = false;
     if (!NonZero) {
       for (int i = 0; i + 1 < numActive; i += 2) {
         const double xl = e[i].x;
         const double xr = e[i + 1].x;
-        if (xr > xl) Emit(xl, xr, leftLimit, rightExclusive, span);
-        Step(e, i);
-        Step(e, i + 1);
+        if (xr > xl) Emit(xl, xr, limits, span);
+        Step(e, i, cross);
+        Step(e, i + 1, cross);
       }
-      if (numActive & 1) Step(e, numActive - 1);
+      if (numActive & 1) Step(e, numActive - 1, cross);
+      crossed = cross;
       return;
     }
     int i = 0;
     while (i < numActive) {
       const double xl = e[i].x;
       int winding = e[i].direction;
-      Step(e, i);
+      Step(e, i, cross);
       ++i;
       double xr = xl;
       double end = HUGE_VAL;  // edges run out: the span reaches the right limit
       while (i < numActive) {
         xr = e[i].x;
         winding += e[i].direction;
-        Step(e, i);
+        Step(e, i, cross);
         ++i;
         if (winding == 0) {
           end = xr;
           break;
         }
       }
-      if (xr > xl) Emit(xl, end, leftLimit, rightExclusive, span);
+      if (xr > xl) Emit(xl, end, limits, span);
     }
+    crossed = cross;
   }
 
  private:
   // Advances edge i by one row and notes whether it went past the edge before it (advanced
   // already): the next row's ordering pass is skipped when no edge did, which is the usual case.
-  void Step(CFillActiveEdge* e, int i) {
+  static void Step(CFillActiveEdge* e, int i, bool& cross) {
     e[i].x += e[i].dxdy;
-    crossed |= i > 0 && After(e[i - 1], e[i]);
+    cross |= i > 0 && After(e[i - 1], e[i]);
   }
 
   static std::size_t Count(int n) { return n > 0 ? static_cast<std::size_t>(n) : 0; }
@@ -126,26 +130,35 @@ class CFillSweep {
     zvInsertionSort(e, numActive, After, [&](int at) { slots[e[at].id] = at; });
   }
 
-  // Writes the columns from ceil(xl) to floor(xr), clipped to [leftLimit, rightExclusive). An xr
-  // of +infinity reaches the right limit. Clipping happens in double precision so that no
-  // far-off crossing is converted to int, and the roundings of the crossings left inside are
-  // done on the integers: a crossing between the limits fits in an int.
+  // The clip limits of a row's spans, also in double so that no crossing is compared by
+  // converting the limit anew.
+  struct Limits {
+    Limits(int leftLimit, int rightExclusive)
+        : left(leftLimit), last(rightExclusive - 1), leftD(left), lastD(last) {}
+    int left, last;
+    double leftD, lastD;
+  };
+
+  // Writes the columns from ceil(xl) to floor(xr), clipped to the limits. An xr of +infinity
+  // reaches the right limit. Clipping happens in double precision so that no far-off crossing
+  // is converted to int, and the roundings of the crossings left inside are done on the
+  // integers: a crossing between the limits fits in an int. The two ends are rounded
+  // independently, so their conversions overlap.
   template <class Span>
-  static void Emit(double xl, double xr, int leftLimit, int rightExclusive, Span& span) {
-    const int last = rightExclusive - 1;
-    if (!(xl <= last)) return;  // ceil(xl) past the last column, or NaN
-    int left = leftLimit;
-    if (xl > leftLimit) {
+  static void Emit(double xl, double xr, const Limits& limits, Span& span) {
+    if (!(xl <= limits.lastD)) return;  // ceil(xl) past the last column, or NaN
+    if (!(xr >= limits.leftD)) return;  // floor(xr) before the first column, or NaN
+    int left = limits.left;
+    if (xl > limits.leftD) {
       left = static_cast<int>(xl);  // towards zero, then up to the ceiling
       left += left < xl;
     }
-    if (!(xr >= left)) return;  // floor(xr) < left, or NaN
-    int right = last;
-    if (xr < last) {
+    int right = limits.last;
+    if (xr < limits.lastD) {
       right = static_cast<int>(xr);
       right -= right > xr;
     }
-    if (left <= right) span(left, right);  // false only for limits that leave no column
+    if (left <= right) span(left, right);
   }
 
   CFillContext& ctx;
