@@ -21,7 +21,7 @@ class CFillSweep {
   CFillSweep(CFillContext& ctx, int numVertices)
       : ctx(ctx),
         numVertices(numVertices),
-        edgeEnds(ZvScratch_EdgeEnds, Count(numVertices)),
+        retiring(ZvScratch_RetiringEdges, Count(numVertices)),
         incoming(ZvScratch_IncomingEdges, Count(numVertices)),
         spare(ZvScratch_SpareEdges, Count(numVertices)),
         slots(ZvScratch_EdgeSlots, Count(numVertices)),
@@ -97,26 +97,22 @@ class CFillSweep {
   //
   // A vertex inside a chain ends one edge and starts the next: the new edge takes the slot of
   // the old one, found through the slot table, and the order is mended by the insertion sort.
-  // The other edges that end or begin are handled in one pass that copies the table into the
-  // spare one, rather than one search per ending edge and one insertion per beginning edge: an
-  // edge is retired at the first line that reaches its lower end, which is the line that takes
-  // that end's vertex, and the edges that begin, ordered among themselves, are merged in.
+  // The edges that end elsewhere are known by the vertices that end them, and the edges that
+  // begin, ordered among themselves, are merged in: only the part of the table from the first
+  // change on is rewritten, since shapes side by side give rows where a few edges change among
+  // many that go on.
   void TakeVertices(int y);
   bool Replace(int endId, const CFillVertex& at, const CFillVertex& other, int id, int direction,
                double yc);
   void Treat(const CFillVertex& at, const CFillVertex& other, int id, int direction, double yc,
-             double yAbove, int& numIncoming, bool& ending);
-  void Place(const CFillActiveEdge& e, int at) {
-    other[at] = e;
-    slots[e.id] = at;
-  }
+             double yAbove, int& numIncoming, int& numRetiring);
+  void Merge(int numIncoming, int numRetiring);
   void Start(CFillActiveEdge& e, const CFillVertex& at, const CFillVertex& other, int id,
              int direction, double yc) {
     e.dxdy = (other.x - at.x) / (other.y - at.y);
     e.x = (yc - at.y) * e.dxdy + at.x - 0.5;
     e.id = id;
     e.direction = direction;
-    edgeEnds[id] = other.y;
   }
 
   // Edges rarely swap between rows, so the insertion sort is linear on the usual nearly
@@ -163,12 +159,12 @@ class CFillSweep {
 
   CFillContext& ctx;
   int numVertices;
-  ZvScratchArray<double> edgeEnds;           // lower end y of each started edge, by edge id
+  ZvScratchArray<int> retiring;              // the edges that end on the current line
   ZvScratchArray<CFillActiveEdge> incoming;  // the edges that begin on the current line
   ZvScratchArray<CFillActiveEdge> spare;
   ZvScratchArray<int> slots;  // position of each active edge by edge id, -1 for the others
-  CFillActiveEdge* edges;     // the active edges: the context's table or the spare one
-  CFillActiveEdge* other;
+  CFillActiveEdge* edges;     // the active edges, the context's table
+  CFillActiveEdge* other;     // where the changed part of the table is merged
   int cursor = 0;
   int numActive = 0;
   bool crossed = true;  // the table may be out of order: edges moved since it was last ordered
