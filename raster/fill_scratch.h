@@ -24,7 +24,7 @@ enum ZvScratchSlot {
   ZvScratch_Vertices,
   ZvScratch_SortedVertices,
   ZvScratch_ActiveEdges,
-  ZvScratch_EdgeEnds,
+  ZvScratch_RetiringEdges,
   ZvScratch_IncomingEdges,
   ZvScratch_SpareEdges,
   ZvScratch_EdgeSlots,

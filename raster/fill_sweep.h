@@ -21,7 +21,7 @@ class CFillSweep {
   CFillSweep(CFillContext& ctx, int numVertices)
       : ctx(ctx),
         numVertices(numVertices),
-        edgeEnds(ZvScratch_EdgeEnds, Count(numVertices)),
+        retiring(ZvScratch_RetiringEdges, Count(numVertices)),
         incoming(ZvScratch_IncomingEdges, Count(numVertices)),
         spare(ZvScratch_SpareEdges, Count(numVertices)),
         slots(ZvScratch_EdgeSlots, Count(numVertices)),
@@ -45,46 +45,50 @@ class CFillSweep {
   template <bool NonZero, class Span>
   void Spans(int leftLimit, int rightExclusive, Span&& span) {
     CFillActiveEdge* e = edges;
-    crossed = false;
+    const Limits limits(leftLimit, rightExclusive);
+    // A local, not the member: the member was read and written in memory at every edge.
+    bool cross = false;
     if (!NonZero) {
       for (int i = 0; i + 1 < numActive; i += 2) {
         const double xl = e[i].x;
         const double xr = e[i + 1].x;
-        if (xr > xl) Emit(xl, xr, leftLimit, rightExclusive, span);
-        Step(e, i);
-        Step(e, i + 1);
+        if (xr > xl) Emit(xl, xr, limits, span);
+        Step(e, i, cross);
+        Step(e, i + 1, cross);
       }
-      if (numActive & 1) Step(e, numActive - 1);
+      if (numActive & 1) Step(e, numActive - 1, cross);
+      crossed = cross;
       return;
     }
     int i = 0;
     while (i < numActive) {
       const double xl = e[i].x;
       int winding = e[i].direction;
-      Step(e, i);
+      Step(e, i, cross);
       ++i;
       double xr = xl;
       double end = HUGE_VAL;  // edges run out: the span reaches the right limit
       while (i < numActive) {
         xr = e[i].x;
         winding += e[i].direction;
-        Step(e, i);
+        Step(e, i, cross);
         ++i;
         if (winding == 0) {
           end = xr;
           break;
         }
       }
-      if (xr > xl) Emit(xl, end, leftLimit, rightExclusive, span);
+      if (xr > xl) Emit(xl, end, limits, span);
     }
+    crossed = cross;
   }
 
  private:
   // Advances edge i by one row and notes whether it went past the edge before it (advanced
   // already): the next row's ordering pass is skipped when no edge did, which is the usual case.
-  void Step(CFillActiveEdge* e, int i) {
+  static void Step(CFillActiveEdge* e, int i, bool& cross) {
     e[i].x += e[i].dxdy;
-    crossed |= i > 0 && After(e[i - 1], e[i]);
+    cross |= i > 0 && After(e[i - 1], e[i]);
   }
 
   static std::size_t Count(int n) { return n > 0 ? static_cast<std::size_t>(n) : 0; }
@@ -93,26 +97,22 @@ class CFillSweep {
   //
   // A vertex inside a chain ends one edge and starts the next: the new edge takes the slot of
   // the old one, found through the slot table, and the order is mended by the insertion sort.
-  // The other edges that end or begin are handled in one pass that copies the table into the
-  // spare one, rather than one search per ending edge and one insertion per beginning edge: an
-  // edge is retired at the first line that reaches its lower end, which is the line that takes
-  // that end's vertex, and the edges that begin, ordered among themselves, are merged in.
+  // The edges that end elsewhere are known by the vertices that end them, and the edges that
+  // begin, ordered among themselves, are merged in: only the part of the table from the first
+  // change on is rewritten, since shapes side by side give rows where a few edges change among
+  // many that go on.
   void TakeVertices(int y);
   bool Replace(int endId, const CFillVertex& at, const CFillVertex& other, int id, int direction,
                double yc);
   void Treat(const CFillVertex& at, const CFillVertex& other, int id, int direction, double yc,
-             double yAbove, int& numIncoming, bool& ending);
-  void Place(const CFillActiveEdge& e, int at) {
-    other[at] = e;
-    slots[e.id] = at;
-  }
+             double yAbove, int& numIncoming, int& numRetiring);
+  void Merge(int numIncoming, int numRetiring);
   void Start(CFillActiveEdge& e, const CFillVertex& at, const CFillVertex& other, int id,
              int direction, double yc) {
     e.dxdy = (other.x - at.x) / (other.y - at.y);
     e.x = (yc - at.y) * e.dxdy + at.x - 0.5;
     e.id = id;
     e.direction = direction;
-    edgeEnds[id] = other.y;
   }
 
   // Edges rarely swap between rows, so the insertion sort is linear on the usual nearly
@@ -126,36 +126,45 @@ class CFillSweep {
     zvInsertionSort(e, numActive, After, [&](int at) { slots[e[at].id] = at; });
   }
 
-  // Writes the columns from ceil(xl) to floor(xr), clipped to [leftLimit, rightExclusive). An xr
-  // of +infinity reaches the right limit. Clipping happens in double precision so that no
-  // far-off crossing is converted to int, and the roundings of the crossings left inside are
-  // done on the integers: a crossing between the limits fits in an int.
+  // The clip limits of a row's spans, also in double so that no crossing is compared by
+  // converting the limit anew.
+  struct Limits {
+    Limits(int leftLimit, int rightExclusive)
+        : left(leftLimit), last(rightExclusive - 1), leftD(left), lastD(last) {}
+    int left, last;
+    double leftD, lastD;
+  };
+
+  // Writes the columns from ceil(xl) to floor(xr), clipped to the limits. An xr of +infinity
+  // reaches the right limit. Clipping happens in double precision so that no far-off crossing
+  // is converted to int, and the roundings of the crossings left inside are done on the
+  // integers: a crossing between the limits fits in an int. The two ends are rounded
+  // independently, so their conversions overlap.
   template <class Span>
-  static void Emit(double xl, double xr, int leftLimit, int rightExclusive, Span& span) {
-    const int last = rightExclusive - 1;
-    if (!(xl <= last)) return;  // ceil(xl) past the last column, or NaN
-    int left = leftLimit;
-    if (xl > leftLimit) {
+  static void Emit(double xl, double xr, const Limits& limits, Span& span) {
+    if (!(xl <= limits.lastD)) return;  // ceil(xl) past the last column, or NaN
+    if (!(xr >= limits.leftD)) return;  // floor(xr) before the first column, or NaN
+    int left = limits.left;
+    if (xl > limits.leftD) {
       left = static_cast<int>(xl);  // towards zero, then up to the ceiling
       left += left < xl;
     }
-    if (!(xr >= left)) return;  // floor(xr) < left, or NaN
-    int right = last;
-    if (xr < last) {
+    int right = limits.last;
+    if (xr < limits.lastD) {
       right = static_cast<int>(xr);
       right -= right > xr;
     }
-    if (left <= right) span(left, right);  // false only for limits that leave no column
+    if (left <= right) span(left, right);
   }
 
   CFillContext& ctx;
   int numVertices;
-  ZvScratchArray<double> edgeEnds;           // lower end y of each started edge, by edge id
+  ZvScratchArray<int> retiring;              // the edges that end on the current line
   ZvScratchArray<CFillActiveEdge> incoming;  // the edges that begin on the current line
   ZvScratchArray<CFillActiveEdge> spare;
   ZvScratchArray<int> slots;  // position of each active edge by edge id, -1 for the others
-  CFillActiveEdge* edges;     // the active edges: the context's table or the spare one
-  CFillActiveEdge* other;
+  CFillActiveEdge* edges;     // the active edges, the context's table
+  CFillActiveEdge* other;     // where the changed part of the table is merged
   int cursor = 0;
   int numActive = 0;
   bool crossed = true;  // the table may be out of order: edges moved since it was last ordered
