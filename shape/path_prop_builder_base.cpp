@@ -56,8 +56,11 @@ const ZvPoint2fArray& ZvBasePathPropBuilder::EndSubpathAndGetTrailingSamples(
 void ZvBasePathPropBuilder::CloseInput() {
   const unsigned int n = inputPoints.size;
   if (n < 2 || zvBuilderCoincide(inputPoints[n - 1], inputPoints[0])) return;
-  inputPoints.Add(inputPoints[0]);
-  inputProperties.Add(inputProperties[0]);
+  // Copies first: the arrays may move while they grow.
+  const ZvPoint2<float> firstPoint = inputPoints[0];
+  const double firstProperty = inputProperties[0];
+  inputPoints.Add(firstPoint);
+  inputProperties.Add(firstProperty);
 }
 
 void ZvBasePathPropBuilder::FinishCommit(int final) {
