@@ -145,11 +145,7 @@ void RepairOlderVersion(ZvStdFCurveImpl& s, unsigned int stamp) {
     for (unsigned int i = 0; i < n; ++i)
       s.keys[i].flags = static_cast<unsigned short>(s.keys[i].flags & ~CFCFlag_AutoTangent);
   }
-  // Continuity is claimed only where the handles agree.
-  for (unsigned int i = 1; i + 1 < n; ++i) {
-    if (!s.ActualTangentsAreUnified(i))
-      s.keys[i].flags = static_cast<unsigned short>(s.keys[i].flags & ~CFCFlag_TangentContinuity);
-  }
+  s.ClaimContinuityOnlyWhereUnified();
   // The outer handles of the end keys were not kept before 263: a collapsed one mirrors its
   // partner through the key.
   if (stamp > 262 || n < 2) return;
