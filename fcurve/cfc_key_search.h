@@ -71,20 +71,25 @@ class CFCKeySearch : public Store {
     }
     // Here k[low] < t < k[high]; the neighbourhood, when t lies outside it, narrows the range.
     // Which side t lies on is as good as random, so nothing below branches on it: a
-    // mispredicted branch per halving would cost more than the whole search. The step is added
-    // through a mask, which compilers do not turn back into a branch.
+    // mispredicted branch per halving would cost more than the whole search.
     unsigned int low = t > highEnd ? c + forward : 0;
     unsigned int length = (lowEnd > t ? c - back : n - 1) - low;
-    // k[low] < t <= k[low + length] holds throughout.
+    // k[low] < t <= k[low + length] holds throughout. Each pass halves twice: the middle key and
+    // the two keys the second halving may want are read together, so a pass waits for one load
+    // where two halvings in turn would wait for two; the loads themselves, not the comparisons,
+    // are the cost, in the first-level cache and beyond it alike. On a last pass over two or
+    // three keys the quarter may be 0, which rereads k[low] and moves nothing.
     while (length > 1) {
       const unsigned int half = length / 2;
-      // Both keys the next halving may read are fetched while this one waits for its own: on
-      // large keys the array outgrows the first-level cache.
-      const unsigned int next = (length - half) / 2;
-      __builtin_prefetch(&k[low + next]);
-      __builtin_prefetch(&k[low + half + next]);
-      low += (0u - static_cast<unsigned int>(t > k[low + half].parameter)) & half;
-      length -= half;
+      const unsigned int rest = length - half;
+      const unsigned int quarter = rest / 2;
+      const double middle = k[low + half].parameter;
+      const double lower = k[low + quarter].parameter;
+      const double upper = k[low + half + quarter].parameter;
+      const bool above = t > middle;
+      low += above ? half : 0;
+      low += t > (above ? upper : lower) ? quarter : 0;
+      length = rest - quarter;
     }
     // A key equal to t is the one above low. Equality is exact, on purpose; a NaN is equal to
     // no key.

@@ -9,6 +9,7 @@
 #include "fcurve/std_fcurve_buffer.h"
 #include "fcurve/std_fcurve_impl.h"
 
+#include <cstddef>
 #include <cstring>
 #include <utility>
 
@@ -21,9 +22,16 @@ bool IsOne(unsigned int byte) {
   return byte == 1;
 }
 
-// A key record from p; the caller checked that it lies inside the block. New keys claim
-// continuity until the flags say otherwise.
-const unsigned char* ReadKeyRecord(const unsigned char* p, CFCStdKey& k) {
+// Past the seven doubles of a key lie its small fields and the padding around them.
+constexpr std::size_t kKeyTailOffset = offsetof(CFCStdKey, segmentKind);
+static_assert(kKeyTailOffset == 7 * sizeof(double), "the doubles of a key are contiguous");
+
+// A key record from p into `to`; the caller checked that it lies inside the block. Every byte of
+// the key is written, padding zeroed with the small fields, so that keys read into a block that
+// was not zero-filled carry no stale byte. New keys claim continuity until the flags say
+// otherwise.
+inline const unsigned char* ReadKeyRecord(const unsigned char* p, CFCStdKey* to) {
+  CFCStdKey& k = *to;
   k.parameter = zvLoadF64(p);
   k.leftValue = zvLoadF64(p + 8);
   k.rightValue = zvLoadF64(p + 16);
@@ -31,9 +39,24 @@ const unsigned char* ReadKeyRecord(const unsigned char* p, CFCStdKey& k) {
   k.leftTangent.y = zvLoadF64(p + 32);
   k.rightTangent.x = zvLoadF64(p + 40);
   k.rightTangent.y = zvLoadF64(p + 48);
+  std::memset(reinterpret_cast<unsigned char*>(to) + kKeyTailOffset, 0,
+              sizeof(CFCStdKey) - kKeyTailOffset);
   k.segmentKind = p[56];
   k.flags = CFCFlag_TangentContinuity;
   return p + kKeyRecordSize;
+}
+
+// The keys of a fresh store become n unset ones in a block of exactly n, for the records to
+// overwrite: zero-filling first a block rounded up to a power of two wrote up to twice the
+// bytes of the keys, all of them written again at once.
+CFCStdKey* KeysToOverwrite(ZvStdFCurveImpl& s, unsigned int n) {
+  if (n == 0) return s.keys.data;
+  CFCStdKey* block = new CFCStdKey[n];
+  delete[] s.keys.data;
+  s.keys.data = block;
+  s.keys.capacity = n;
+  s.keys.size = n;
+  return block;
 }
 
 // The oldest layout: value when no keys, first segment kind, and 64-byte records whose last
@@ -44,9 +67,9 @@ bool ReadOldest(ZvByteReader& in, ZvStdFCurveImpl& s) {
   s.firstSegmentKind = in.U32();
   const unsigned int n = in.U32();
   if (!in.Has(static_cast<std::uint64_t>(kKeyRecordSize + 4) * n)) return false;
-  s.keys.Resize(n);
+  CFCStdKey* keys = KeysToOverwrite(s, n);
   for (unsigned int i = 0; i < n; ++i) {
-    const unsigned char* tail = ReadKeyRecord(in.Bytes(kKeyRecordSize + 4), s.keys[i]);
+    const unsigned char* tail = ReadKeyRecord(in.Bytes(kKeyRecordSize + 4), keys + i);
     if (zvLoadLE<4>(tail) != 0) return false;
   }
   return true;
@@ -62,11 +85,10 @@ bool ReadHeaderAndKeys(ZvByteReader& in, ZvStdFCurveImpl& s) {
   const unsigned int n = in.U32();
   // The records are checked before anything is allocated for them.
   if (!in.Has(static_cast<std::uint64_t>(kKeyRecordSize) * n)) return false;
-  s.keys.Resize(n);
+  CFCStdKey* keys = KeysToOverwrite(s, n);
   const unsigned char* p = in.Bytes(kKeyRecordSize * n);
-  CFCStdKey* keys = s.keys.data;
   for (unsigned int i = 0; i < n; ++i)
-    p = ReadKeyRecord(p, keys[i]);
+    p = ReadKeyRecord(p, keys + i);
   return true;
 }
 
@@ -81,17 +103,23 @@ bool ReadTaggedBlocks(ZvByteReader& in, unsigned int stamp, ZvStdFCurveImpl& s,
     return false;
   }
   const unsigned char* flags = in.Bytes((wide ? 2u : 1u) * n);
+  const unsigned char* extra = nullptr;
+  if (stamp >= kSettingsTag) {
+    if (!zvReadTag(in, kSettingsTag) || !in.Has(2 + 2 * static_cast<std::uint64_t>(n)))
+      return false;
+    s.extrapolation = in.U8();
+    s.readOnly = in.U8() != 0 ? 1 : 0;
+    extra = in.Bytes(2u * n);
+  }
+  // Flags and extra bytes in one pass over the keys rather than two: the keys of a long curve
+  // outgrow the first-level cache.
+  CFCStdKey* keys = s.keys.data;
   for (unsigned int i = 0; i < n; ++i) {
-    s.keys[i].flags = static_cast<unsigned short>(wide ? zvLoadLE<2>(flags + 2 * i) : flags[i]);
+    keys[i].flags = static_cast<unsigned short>(wide ? zvLoadLE<2>(flags + 2 * i) : flags[i]);
+    if (extra) std::memcpy(keys[i].extra, extra + 2 * i, 2);
   }
 
   if (stamp < kSettingsTag) return true;
-  if (!zvReadTag(in, kSettingsTag) || !in.Has(2 + 2 * static_cast<std::uint64_t>(n))) return false;
-  s.extrapolation = in.U8();
-  s.readOnly = in.U8() != 0 ? 1 : 0;
-  const unsigned char* extra = in.Bytes(2u * n);
-  for (unsigned int i = 0; i < n; ++i)
-    std::memcpy(s.keys[i].extra, extra + 2 * i, 2);
   if (readUserData(in) == 0) return false;
 
   if (stamp < kTangentConstraintTag) return true;
@@ -145,11 +173,7 @@ void RepairOlderVersion(ZvStdFCurveImpl& s, unsigned int stamp) {
     for (unsigned int i = 0; i < n; ++i)
       s.keys[i].flags = static_cast<unsigned short>(s.keys[i].flags & ~CFCFlag_AutoTangent);
   }
-  // Continuity is claimed only where the handles agree.
-  for (unsigned int i = 1; i + 1 < n; ++i) {
-    if (!s.ActualTangentsAreUnified(i))
-      s.keys[i].flags = static_cast<unsigned short>(s.keys[i].flags & ~CFCFlag_TangentContinuity);
-  }
+  s.ClaimContinuityOnlyWhereUnified();
   // The outer handles of the end keys were not kept before 263: a collapsed one mirrors its
   // partner through the key.
   if (stamp > 262 || n < 2) return;

@@ -145,6 +145,18 @@ int ZvStdFCurveImpl::ActualTangentsAreUnified(unsigned int i) const {
   return std::fabs(l.x * r.y - l.y * r.x) <= 1e-7;
 }
 
+// A key without the flag has nothing to clear, and the test is pure: only keys that claim
+// continuity are tested. A read runs this over every key of the block; flattened, the test and
+// the handle evaluation it calls are inlined into the loop instead of called per key.
+__attribute__((flatten)) void ZvStdFCurveImpl::ClaimContinuityOnlyWhereUnified() {
+  const unsigned int n = keys.size;
+  for (unsigned int i = 1; i + 1 < n; ++i) {
+    CFCStdKey& k = keys[i];
+    if ((k.flags & CFCFlag_TangentContinuity) && !ActualTangentsAreUnified(i))
+      k.flags = static_cast<unsigned short>(k.flags & ~CFCFlag_TangentContinuity);
+  }
+}
+
 int ZvStdFCurveImpl::LockTangentContinuity(unsigned int i) {
   CFCStdKey& k = keys[i];
   if (k.flags & CFCFlag_TangentContinuity) return 1;

@@ -22,8 +22,19 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
 
   // ---- Evaluated handles (std_fcurve_tangents.cpp) ----
 
-  ZvPoint2<double> GetEvaluatedLeftTgt(unsigned int i) const;
-  ZvPoint2<double> GetEvaluatedRightTgt(unsigned int i) const;
+  // A key with none of these flags is evaluated on its stored handles. The test stays inline:
+  // most keys have none, and a call per handle was most of the cost of checking a whole curve.
+  static constexpr unsigned short kDerivedHandleFlags =
+      CFCFlag_CollapsedTangent | CFCFlag_FlatTangent | CFCFlag_FlatAtExtremum |
+      CFCFlag_AutoTangent | CFCFlag_ChordTangent;
+  ZvPoint2<double> GetEvaluatedLeftTgt(unsigned int i) const {
+    const CFCStdKey& k = keys[i];
+    return (k.flags & kDerivedHandleFlags) ? DerivedLeftTgt(i) : k.leftTangent;
+  }
+  ZvPoint2<double> GetEvaluatedRightTgt(unsigned int i) const {
+    const CFCStdKey& k = keys[i];
+    return (k.flags & kDerivedHandleFlags) ? DerivedRightTgt(i) : k.rightTangent;
+  }
   double GetEvaluatedLeftTgtY(unsigned int i) const;
   double GetEvaluatedRightTgtY(unsigned int i) const;
   int IsKeyAnExtremum(unsigned int i) const;
@@ -145,12 +156,18 @@ class ZvStdFCurveImpl : public CFCBaseImpl<double, CFCStdKey, CFCKeyStoreC<doubl
   // side: ZvBaseFCurve::LeftSide or anything else for the right handle.
   int SetActualKeyTgtHandle(unsigned int i, int side, const ZvPoint2<double>& relative);
   int ActualTangentsAreUnified(unsigned int i) const;
+  // Clears TangentContinuity on every key strictly inside whose handles are not unified, so
+  // that the flag claims only what the handles show.
+  void ClaimContinuityOnlyWhereUnified();
   int LockTangentContinuity(unsigned int i);
   int UnifyActualRightTangentWithActualLeftTangent(unsigned int i);
   int UnifyActualLeftTangentWithActualRightTangent(unsigned int i);
   void ModifyFSK(unsigned int i, unsigned int kind);
 
  private:
+  // The evaluated handles of a key with one of kDerivedHandleFlags.
+  ZvPoint2<double> DerivedLeftTgt(unsigned int i) const;
+  ZvPoint2<double> DerivedRightTgt(unsigned int i) const;
   double EvaluatedRightX(unsigned int i) const;
   double EvalCubicSegment(double t, unsigned int i, bool keep) const;
 

@@ -47,11 +47,12 @@ double ZvStdFCurveImpl::EvaluatedRightX(unsigned int i) const {
   return k.rightTangent.x;
 }
 
-ZvPoint2<double> ZvStdFCurveImpl::GetEvaluatedRightTgt(unsigned int i) const {
+ZvPoint2<double> ZvStdFCurveImpl::DerivedRightTgt(unsigned int i) const {
   const CFCStdKey& k = keys[i];
   const unsigned short f = k.flags;
   if (f & CFCFlag_CollapsedTangent) return {k.parameter, k.rightValue};
   if (IsFlattened(f, *this, i)) return {k.rightTangent.x, k.rightValue};
+  // FlatAtExtremum away from an extremum.
   if (!(f & (CFCFlag_AutoTangent | CFCFlag_ChordTangent))) return k.rightTangent;
   return {EvaluatedRightX(i), GetEvaluatedRightTgtY(i)};
 }
@@ -85,11 +86,12 @@ double ZvStdFCurveImpl::GetEvaluatedRightTgtY(unsigned int i) const {
   return k.rightValue;  // an automatic end key is flat
 }
 
-ZvPoint2<double> ZvStdFCurveImpl::GetEvaluatedLeftTgt(unsigned int i) const {
+ZvPoint2<double> ZvStdFCurveImpl::DerivedLeftTgt(unsigned int i) const {
   const CFCStdKey& k = keys[i];
   const unsigned short f = k.flags;
   if (f & CFCFlag_CollapsedTangent) return {k.parameter, k.leftValue};
   if (IsFlattened(f, *this, i)) return {k.leftTangent.x, k.leftValue};
+  // FlatAtExtremum away from an extremum.
   if (!(f & (CFCFlag_AutoTangent | CFCFlag_ChordTangent))) return k.leftTangent;
   // Unlike the right handle, the neighbour's flags are not consulted here.
   double x = k.leftTangent.x;
