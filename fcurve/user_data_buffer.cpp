@@ -66,6 +66,17 @@ unsigned int CFCUserDataSet::ReadFromBufferBody(const void* body) {
   return ReadBody(in);
 }
 
+unsigned int CFCUserDataSet::ReadFromBufferBody(const void* body, unsigned int size) {
+  if (body == nullptr) return 0;
+  ZvByteReader in(body, size);
+  // Read aside, so that a block refused half-way leaves no items behind.
+  CFCUserDataSet read;
+  const unsigned int used = read.ReadBody(in);
+  if (used == 0) return 0;
+  if (IsEmpty()) m_items.swap(read.m_items);
+  return used;
+}
+
 unsigned int CFCUserDataSet::ReadBody(ZvByteReader& in) {
   if (!in.Has(8) || !IsReadableVersion(in.U32())) return 0;
   const unsigned int count = in.U32();

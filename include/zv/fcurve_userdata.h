@@ -108,6 +108,9 @@ class ZV_API CFCUserDataSet {
   // Given the block past its length field; returns the body bytes consumed,
   // 0 for a refused version. A set that already holds items is only walked.
   unsigned int ReadFromBufferBody(const void* body);
+  // The same, never reading beyond `size` bytes of the body; a block that is cut short, or
+  // whose items reach past it, is refused (0) and the set is left as it was.
+  unsigned int ReadFromBufferBody(const void* body, unsigned int size);
 
  private:
   friend class ZvBaseFCurve;

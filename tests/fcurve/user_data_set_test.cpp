@@ -1,6 +1,7 @@
 #include <zv/fcurve_userdata.h>
 
 #include "tests/fcurve/uid.h"
+#include "tests/support/byte_blocks.h"
 
 #include <gtest/gtest.h>
 
@@ -128,4 +129,48 @@ TEST(UserDataSet, BufferBlockLayoutAndRoundTrip) {
   std::vector<unsigned char> emptyBlock(12);
   ASSERT_EQ(empty.WriteToBuffer(emptyBlock.data()), 12u);
   EXPECT_EQ(empty.ReadFromBufferBody(emptyBlock.data() + 4), 8u);
+}
+
+namespace {
+std::vector<unsigned char> Written(const CFCUserDataSet& set) {
+  std::vector<unsigned char> block(set.GetBufferSize());
+  EXPECT_EQ(set.WriteToBuffer(block.data()), block.size());
+  return block;
+}
+}  // namespace
+
+TEST(UserDataSet, BoundedReadsRefuseCutBlocksAndChangeNothing) {
+  CFCUserDataSet set;
+  set.SetUserData(MakeUID(1), Bytes("abc"), 3);
+  set.SetUserData(MakeUID(2), nullptr, 0);
+  set.SetUserData(MakeUID(3), Bytes("longer item"), 11);
+  const std::vector<unsigned char> block = Written(set);
+  const unsigned int body = static_cast<unsigned int>(block.size() - 4);
+
+  CFCUserDataSet holder;
+  holder.SetUserData(MakeUID(9), Bytes("old"), 3);
+  for (unsigned int size = 0; size < body; ++size) {
+    CFCUserDataSet empty;
+    EXPECT_EQ(empty.ReadFromBufferBody(block.data() + 4, size), 0u) << size;
+    EXPECT_EQ(empty.IsEmpty(), 1u) << size;  // no item of the part that was read
+  }
+  CFCUserDataSet read;
+  EXPECT_EQ(read.ReadFromBufferBody(block.data() + 4, body), body);
+  EXPECT_EQ(Written(read), block);
+  // A set that holds items only walks the block, as the unbounded reader does.
+  EXPECT_EQ(holder.ReadFromBufferBody(block.data() + 4, body), body);
+  EXPECT_EQ(holder.GetCount(), 1u);
+
+  // An item size that reaches past the block.
+  std::vector<unsigned char> bad(block);
+  bad[12 + 16] = 0xFF;
+  CFCUserDataSet refused;
+  EXPECT_EQ(refused.ReadFromBufferBody(bad.data() + 4, body), 0u);
+  EXPECT_EQ(refused.IsEmpty(), 1u);
+
+  ExpectFuzzSeed("fuzz_fcurve_userdata", "three_items",
+                 std::vector<unsigned char>(block.begin() + 4, block.end()));
+  const std::vector<unsigned char> none = Written(CFCUserDataSet());
+  ExpectFuzzSeed("fuzz_fcurve_userdata", "empty",
+                 std::vector<unsigned char>(none.begin() + 4, none.end()));
 }
