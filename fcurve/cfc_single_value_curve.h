@@ -412,6 +412,7 @@ struct CFCSingleValueCurve {
       kFirst = std::floor((lo - s.keys[0].parameter) / period);
       kLast = std::floor((hi - s.keys[0].parameter) / period);
       if (!(kLast - kFirst <= kMaxSnapShotCycles)) return nullptr;
+      if (!((kLast - kFirst + 1.0) * n <= kCFCMaxSnapShotKeys)) return nullptr;
     }
     try {
       std::unique_ptr<Curve> out(new Curve(c));

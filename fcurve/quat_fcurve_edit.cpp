@@ -250,6 +250,10 @@ unsigned int ZvQuatFCurve::ScaleAndOffsetParameters(double start, double end, do
   }
   unsigned int first, last;
   if (!QuatKeyIndicesInInterval(m_curve->GetKeys(), start, end, first, last, 0, 0)) return 1;
+  // A NaN pivot, scale or offset, or an overflow, would store a time that is not finite.
+  for (unsigned int i = first; i <= last; ++i) {
+    if (!std::isfinite((m_curve->GetKeyTime(i) - pivot) * scale + pivot + offset)) return 0;
+  }
   // Keys with constraint data stay where they are.
   std::vector<ZvQuatKey> moved;
   for (unsigned int i = last + 1; i-- > first;) {

@@ -63,7 +63,9 @@ ZvBaseFCurve* ZvStdFCurve::SnapShot(double start, double end, ExtrapolationMetho
                                 : 0.0;
       double a, b;
       const double fs = s.CycleOffsetFold(lo, a, true), fe = s.CycleOffsetFold(hi, b, false);
-      if (b - a > kMaxSnapShotCycles) return nullptr;
+      if (!(b - a <= kMaxSnapShotCycles) || !((b - a + 1.0) * n <= kCFCMaxSnapShotKeys)) {
+        return nullptr;
+      }
       const double shift = lo - fs;
       if (a >= b) {
         // Within one period; deliberately without a value offset, also with the offset method.

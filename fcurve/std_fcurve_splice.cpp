@@ -103,19 +103,24 @@ int ZvStdFCurveImpl::SpliceAfter(unsigned int a, const ZvStdFCurveImpl& piece,
     this->DropKeys(a + 1, a + 1);
   } else {
     TakeRightSide(keys[a], head, dx);
+    // The inner keys go in as one run: one by one, each would move the whole tail again.
     const unsigned int inner = joinNext ? m - 1 : m;
-    for (unsigned int j = 1; j < inner; ++j) {
-      CFCStdKey k = piece.keys[j];
-      ShiftKey(k, dx);
-      keys.InsertBefore(a + j, k);
-    }
+    if (inner > 1) keys.InsertBefore(a + 1, piece.keys.data + 1, inner - 1);
+    for (unsigned int j = 1; j < inner; ++j)
+      ShiftKey(keys[a + j], dx);
     if (joinNext) TakeLeftSide(keys[a + m - 1], tail, dx);
   }
   for (unsigned int j = 0; j < m; ++j) {
     const double p = piece.keys[j].parameter;
     if (pieceCurve.GetUserDataSet(p) != nullptr) curve.CopyKeyUserData(pieceCurve, p, p + dx);
   }
+  // Both joins claim continuity only where the handles they met still agree; a block read back
+  // would drop the claim otherwise.
   if (!ActualTangentsAreUnified(a)) ClearBits(keys[a], CFCFlag_TangentContinuity);
+  const unsigned int far = a + m - 1;
+  if (joinNext && m > 1 && !ActualTangentsAreUnified(far)) {
+    ClearBits(keys[far], CFCFlag_TangentContinuity);
+  }
   return 1;
 }
 

@@ -10,6 +10,7 @@
 #include <gtest/gtest.h>
 
 #include <cfloat>
+#include <chrono>
 #include <cmath>
 #include <limits>
 #include <memory>
@@ -19,6 +20,17 @@ namespace {
 
 const double kNaN = std::numeric_limits<double>::quiet_NaN();
 const double kInf = std::numeric_limits<double>::infinity();
+
+void ExpectAscending(const std::vector<double>& k) {
+  for (size_t i = 1; i < k.size(); ++i)
+    EXPECT_LT(k[i - 1], k[i]) << "at " << i;
+}
+
+std::vector<unsigned char> BlockOf(const ZvBaseFCurve& c) {
+  std::vector<unsigned char> block(c.GetBufferSize());
+  c.WriteToBuffer(block.data());
+  return block;
+}
 
 std::vector<double> KeysOf(const ZvBaseFCurve& c) {
   ZvDoubleArray p;
@@ -217,6 +229,95 @@ TEST(HostileCurveInput, KeyQueriesAtNaNFindNoKey) {
     EXPECT_EQ(c->RemoveKey(kNaN, 1.0), 0u);
     EXPECT_EQ(c->GetNumKeys(), 3u);
   }
+}
+
+TEST(HostileCurveInput, RotationSplicesRefuseWhatWouldBreakKeyOrder) {
+  const auto rotation = [](std::vector<double> at) {
+    std::unique_ptr<ZvQuatFCurve> c(new ZvQuatFCurve(0));
+    for (double t : at)
+      c->CreateKey(t, t);
+    return c;
+  };
+  // Ends closer than the key tolerance find one key: nothing is cut, and the call returns.
+  auto narrow = rotation({31.5});
+  ZvQuatFCurve out(0);
+  EXPECT_EQ(narrow->Cut(-0.0, 5e-324, out), 1u);
+  EXPECT_EQ(KeysOf(*narrow), (std::vector<double>{0, 31.5}));
+  // The tail moved by the width of a cut from near the largest double lands on the keys before.
+  auto wide = rotation({0, 2, 3});
+  EXPECT_EQ(wide->Cut(1, 1e308, out), 0u);
+  EXPECT_EQ(KeysOf(*wide), (std::vector<double>{0, 2, 3}));
+  // A paste far to the left moves the tail onto one parameter.
+  auto pasted = rotation({0, 1, 2});
+  EXPECT_EQ(pasted->Paste(*rotation({0, 1}), -1e156, 0.5), 0u);
+  EXPECT_EQ(KeysOf(*pasted), (std::vector<double>{0, 1, 2}));
+  EXPECT_EQ(pasted->ScaleAndOffsetParameters(-DBL_MAX, DBL_MAX, kNaN, 2, 0, 0, 0,
+                                             ZvBaseFCurve::BottomHandle),
+            0u);
+  EXPECT_EQ(pasted->ScaleAndOffsetParameters(0, 2, 0, DBL_MAX, 0, 0, 0, ZvBaseFCurve::BottomHandle),
+            0u);
+  EXPECT_EQ(KeysOf(*pasted), (std::vector<double>{0, 1, 2}));
+  // Ordinary splices still join: the piece's first key replaces the key it lands on.
+  EXPECT_EQ(pasted->Paste(*rotation({0, 1}), 1, 1), 1u);
+  EXPECT_EQ(KeysOf(*pasted), (std::vector<double>{0, 1, 2, 3}));
+  EXPECT_EQ(pasted->Append(*rotation({10, 11})), 1u);
+  EXPECT_EQ(KeysOf(*pasted), (std::vector<double>{0, 1, 2, 3, 4}));
+}
+
+TEST(HostileCurveInput, LargeSplicesResamplingsAndReadsTakeLinearTime) {
+  // 2^17 keys: linear work takes a fraction of a second, work that moves the tail once per key or
+  // walks the keys once per key takes minutes. The bound leaves room for sanitizers and
+  // emulators.
+  const double n = 131072;
+  const auto start = std::chrono::steady_clock::now();
+  for (auto& c : AllKinds({0, 1})) {
+    SCOPED_TRACE(c->GetKind());
+    ASSERT_EQ(c->ResampleSequence(0, n, 1, 0, 0), 1u);
+    std::unique_ptr<ZvBaseFCurve> piece(c->Clone());
+    ASSERT_EQ(c->Paste(*piece, 10.5, 10.5), 1u);
+    EXPECT_EQ(c->GetNumKeys(), 2 * n + 2);
+    ASSERT_EQ(c->Append(*piece), 1u);
+    const std::vector<unsigned char> block = BlockOf(*c);
+    unsigned int consumed = 0;
+    std::unique_ptr<ZvBaseFCurve> back(
+        ZvBaseFCurve_CreateFromBuffer(block.data(), block.size(), consumed));
+    ASSERT_NE(back, nullptr);
+    EXPECT_EQ(back->GetNumKeys(), c->GetNumKeys());
+    ExpectAscending(KeysOf(*back));
+  }
+  EXPECT_LT(std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count(), 30.0);
+}
+
+TEST(HostileCurveInput, CycleSnapshotsAreBoundedByTheKeyCap) {
+  std::vector<double> at;
+  for (int i = 0; i < 4096; ++i)
+    at.push_back(i);
+  for (auto& c : AllKinds(at, false)) {
+    SCOPED_TRACE(c->GetKind());
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    // 1e4 periods of 4096 keys: 4e7 keys, refused before any is made.
+    std::unique_ptr<ZvBaseFCurve> huge(
+        c->SnapShot(0, 4095.0 * 1e4, ZvBaseFCurve::ConstantExtrapolation));
+    EXPECT_EQ(huge, nullptr);
+    std::unique_ptr<ZvBaseFCurve> some(
+        c->SnapShot(0, 4095.0 * 10, ZvBaseFCurve::ConstantExtrapolation));
+    ASSERT_NE(some, nullptr);
+    EXPECT_EQ(some->GetNumKeys(), 4095u * 10 + 1);
+  }
+}
+
+TEST(HostileCurveInput, EditedStandardCurvesWriteBlocksThatReadBackEqual) {
+  // A refitted run pasted back joins at keys whose handles may no longer agree; a block read
+  // back claims continuity only where they do, so the curve must not claim it either.
+  ZvStdFCurve c;
+  ASSERT_EQ(c.ResampleSequence(1e-7, -32, -32, 1, 0), 1u);
+  c.ReduceNumKeys(-32, -22.75, -32);
+  const std::vector<unsigned char> block = BlockOf(c);
+  unsigned int consumed = 0;
+  std::unique_ptr<ZvBaseFCurve> back(
+      ZvBaseFCurve_CreateFromBuffer(block.data(), block.size(), consumed));
+  ASSERT_NE(back, nullptr);
+  EXPECT_EQ(BlockOf(*back), block);
 }
 
 }  // namespace
