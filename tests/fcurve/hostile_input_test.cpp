@@ -257,6 +257,11 @@ TEST(HostileCurveInput, RotationSplicesRefuseWhatWouldBreakKeyOrder) {
   EXPECT_EQ(pasted->ScaleAndOffsetParameters(0, 2, 0, DBL_MAX, 0, 0, 0, ZvBaseFCurve::BottomHandle),
             0u);
   EXPECT_EQ(KeysOf(*pasted), (std::vector<double>{0, 1, 2}));
+  // A merge onto a parameter beyond the largest float from every key has no key to take the
+  // attributes from.
+  auto far = rotation({0, 1});
+  EXPECT_EQ(far->MergeAndCreateNonModifyingKey(-10, 11, -DBL_MAX, 0, 0, 1, 1), 1u);
+  EXPECT_EQ(KeysOf(*far), (std::vector<double>{-DBL_MAX}));
   // Ordinary splices still join: the piece's first key replaces the key it lands on.
   EXPECT_EQ(pasted->Paste(*rotation({0, 1}), 1, 1), 1u);
   EXPECT_EQ(KeysOf(*pasted), (std::vector<double>{0, 1, 2, 3}));
