@@ -264,7 +264,13 @@ unsigned int ZvStdFCurve::Append(const ZvBaseFCurve& source) {
     }
     return 1;
   }
+  const ZvStdFCurve saved(*this);
   if (!s.SpliceAfter(s.keys.size - 1, p, piece, false, *this)) return 0;
+  // Far from the origin the piece's keys, moved to the last key, can round onto each other.
+  if (!s.KeysAreOrdered()) {
+    Set(saved);
+    return 0;
+  }
   ReapplyHandleConstraint(s);
   return 1;
 }

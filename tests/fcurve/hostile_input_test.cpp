@@ -104,6 +104,18 @@ TEST(HostileCurveInput, CutNeverLeavesEqualKeys) {
   }
 }
 
+TEST(HostileCurveInput, AppendNeverRoundsKeysTogether) {
+  // Moved to a last key at 1e18, the piece's keys 6 apart round onto one parameter.
+  ZvStdFCurve c;
+  for (double t : {-32.0, -26.0, 1e18})
+    c.CreateKey(t, 0);
+  const ZvStdFCurve piece(c);
+  EXPECT_EQ(c.Append(piece), 0u);
+  EXPECT_EQ(KeysOf(c), (std::vector<double>{-32, -26, 1e18}));
+  EXPECT_EQ(c.Append(ZvStdFCurve(0, 1, 1024, 2)), 1u);
+  EXPECT_EQ(KeysOf(c), (std::vector<double>{-32, -26, 1e18, 1e18 + 1024}));
+}
+
 TEST(HostileCurveInput, WholeCurveMovesRefuseToMergeOrOverflowKeys) {
   ExpectRefusedUnchanged({0, 1}, [](ZvBaseFCurve& c) { return c.ShiftParameters(1e300); });
   ExpectRefusedUnchanged({1, 2}, [](ZvBaseFCurve& c) { return c.ScaleParameterAxis(1e308); });
