@@ -68,6 +68,11 @@ int ZvStdFCurveImpl::MoveTail(unsigned int first, double delta, ZvBaseFCurve& cu
     if (keys[i].flags & CFCFlag_ParameterLock) return 0;
   }
   if (first > 0 && !(keys[first].parameter + delta >= keys[first - 1].parameter)) return 0;
+  // Near the largest double the move can overflow; the moved keys stay in order, so the ends
+  // tell.
+  if (!std::isfinite(keys[first].parameter + delta) ||
+      !std::isfinite(keys[n - 1].parameter + delta))
+    return 0;
   ZvDoubleArray from(4), to(4);
   // A key sharing its parameter with the key before it (a duplicate about to be opened up)
   // leaves the user data there with that key.
