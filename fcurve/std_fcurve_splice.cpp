@@ -241,7 +241,9 @@ unsigned int ZvStdFCurve::Paste(const ZvBaseFCurve& source, double start, double
                                  : s.SpliceAfter(a, p, piece, true, *this);
   if (ok) {
     ReapplyHandleConstraint(s);
-    ok = s.IsValid();
+    // The keys stay ordered and finite: the ends tell whether a move overflowed.
+    ok = s.IsValid() && std::isfinite(s.keys[0].parameter) &&
+         std::isfinite(s.keys[s.keys.size - 1].parameter);
   }
   if (!ok) {
     Set(saved);

@@ -113,12 +113,12 @@ TEST(HostileCurveInput, AppendNeverRoundsKeysTogether) {
   EXPECT_EQ(c.Append(piece), 0u);
   EXPECT_EQ(KeysOf(c), (std::vector<double>{-32, -26, 1e18}));
   // Pasted into a curve that reaches the largest double, the piece would move its tail past it.
-  ZvStdFCurve wide;
-  for (double t : {-DBL_MAX, -32.0, 0.0, DBL_MAX})
-    wide.CreateKey(t, 0);
-  const ZvStdFCurve whole(wide);
-  EXPECT_EQ(wide.Paste(whole, 0, -32), 0u);
-  EXPECT_EQ(KeysOf(wide), (std::vector<double>{-DBL_MAX, -32, 0, DBL_MAX}));
+  for (auto& wide : AllKinds({-DBL_MAX, -32.0, 0.0, DBL_MAX}, false)) {
+    std::unique_ptr<ZvBaseFCurve> whole(wide->Clone());
+    EXPECT_EQ(wide->Paste(*whole, 0, -32), 0u) << wide->GetKind();
+    EXPECT_EQ(KeysOf(*wide), (std::vector<double>{-DBL_MAX, -32, 0, DBL_MAX}));
+    EXPECT_EQ(wide->Append(*whole), 0u) << wide->GetKind();
+  }
   EXPECT_EQ(c.Append(ZvStdFCurve(0, 1, 1024, 2)), 1u);
   EXPECT_EQ(KeysOf(c), (std::vector<double>{-32, -26, 1e18, 1e18 + 1024}));
 }
