@@ -470,6 +470,8 @@ struct CFCSingleValueCurve {
     ZvFCurveLockGuard guard(*this);                                                                \
     if (m_impl->readOnly || !std::isfinite(parameter)) return 0;                                   \
     if (!noFold) m_impl->FoldParameter(parameter);                                                 \
+    /* Folding by a period past the largest double gives no parameter. */                          \
+    if (!std::isfinite(parameter)) return 0;                                                       \
     unsigned int index;                                                                            \
     return m_impl->CreateNonModifyingKey(parameter, index, *this);                                 \
   }                                                                                                \

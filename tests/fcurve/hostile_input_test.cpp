@@ -215,6 +215,13 @@ TEST(HostileCurveInput, NonFiniteParametersAreNeverStored) {
     EXPECT_EQ(c->CreateKey(kNaN, 0), 0u);
     EXPECT_EQ(c->CreateKey(-kInf, 0), 0u);
     EXPECT_EQ(c->CreateNonModifyingKey(kInf, 1), 0u);
+    // Folding into a period from the lowest double overflows: no key may come of it.
+    std::unique_ptr<ZvBaseFCurve> wide(c->Clone());
+    wide->CreateKey(-DBL_MAX, 0);
+    wide->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    wide->CreateNonModifyingKey(1e308, 0);
+    for (double p : KeysOf(*wide))
+      EXPECT_TRUE(std::isfinite(p)) << c->GetKind();
     EXPECT_EQ(c->ShiftParameters(kInf), 0u);
     EXPECT_EQ(c->RemoveHead(kNaN), 0u);
     EXPECT_EQ(c->RemoveTail(kInf), 0u);
