@@ -437,7 +437,9 @@ struct CFCSingleValueCurve {
       };
       add(lo);
       o.KeepValueLeftOfFirstKey(s.ToStored(CFCEvalLeftUsingExtrapolationMethod(s, lo)));
-      for (double k = kFirst; k <= kLast; k += 1.0) {
+      // Counted from 0: far from the origin kFirst + 1 can round back to kFirst.
+      for (double counted = 0.0; counted <= kLast - kFirst; counted += 1.0) {
+        const double k = kFirst + counted;
         for (unsigned int i = 0; i < n; ++i) {
           const double t = s.keys[i].parameter + k * period;
           if (t > lo && t < hi) add(t);

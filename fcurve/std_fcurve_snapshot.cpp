@@ -81,7 +81,8 @@ ZvBaseFCurve* ZvStdFCurve::SnapShot(double start, double end, ExtrapolationMetho
           ZvStdFCurve whole(*this);
           whole.m_impl->readOnly = 0;
           MoveAlong(*whole.m_impl, whole, 0.0, (a + 1) * offset);
-          for (double c = a + 1; c < b; c += 1.0) {
+          // Counted from 0: far from the origin a + 1 can round back to a.
+          for (double counted = 1.0; counted < b - a; counted += 1.0) {
             if (out) {
               out->Append(whole);
             } else {
@@ -144,6 +145,8 @@ ZvBaseFCurve* ZvStdFCurve::SnapShot(double start, double end, ExtrapolationMetho
       }
     }
     out->m_impl->readOnly = 0;
+    // Periods moved far from the origin can round their keys onto each other: no snapshot then.
+    if (!out->m_impl->KeysAreOrdered()) return nullptr;
     out->SetExtrapolationMethod(method);
     return out.release();
   } catch (const std::bad_alloc&) {

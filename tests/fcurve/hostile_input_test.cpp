@@ -337,6 +337,20 @@ TEST(HostileCurveInput, CycleSnapshotsAreBoundedByTheKeyCap) {
   }
 }
 
+TEST(HostileCurveInput, CycleSnapshotsFarFromTheOriginReturn) {
+  // Periods are counted near 1e17 there, where adding one rounds back to the same count.
+  for (auto& c : AllKinds({0, 2, 7}, false)) {
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    for (double at : {1e18, -1e18}) {
+      std::unique_ptr<ZvBaseFCurve> snap(
+          c->SnapShot(at, at + 1e4, ZvBaseFCurve::LinearExtrapolation));
+      if (snap) ExpectAscending(KeysOf(*snap));
+      snap.reset(c->SnapShot(at, at, ZvBaseFCurve::ConstantExtrapolation));
+      if (snap) ExpectAscending(KeysOf(*snap));
+    }
+  }
+}
+
 TEST(HostileCurveInput, EditedStandardCurvesWriteBlocksThatReadBackEqual) {
   // A refitted run pasted back joins at keys whose handles may no longer agree; a block read
   // back claims continuity only where they do, so the curve must not claim it either.
