@@ -18,6 +18,9 @@ constexpr double kCFCMaxResampledKeys = 1048576.0;
 // Most key moves one resampling may cost (2^26): samples times the keys above the range, each
 // of which an insertion shifts.
 constexpr double kCFCMaxResampleMoves = 67108864.0;
+// Most keys a snapshot under the cycle methods repeats (2^20): periods times keys per period.
+// Each period is built whole, so more would only find the allocator's limit the slow way.
+constexpr double kCFCMaxSnapShotKeys = 1048576.0;
 
 template <class T, class Key, class Store>
 class CFCBaseImpl : public CFCKeySearch<T, Key, Store> {

@@ -8,6 +8,15 @@
 
 #include <vector>
 
+// Whether the keys stand in strictly ascending order: what every edit keeps, and what a bounded
+// reader asks of a block before it takes it.
+template <class Keys>
+bool CFCKeysStrictlyAscending(const Keys& keys) {
+  for (unsigned int i = 1; i < keys.size; ++i)
+    if (!(keys[i].parameter > keys[i - 1].parameter)) return false;
+  return true;
+}
+
 // Keeps, in order, the keys whose parameter is above the last kept one, and removes the per-key
 // user data of each dropped key unless a kept key has the same parameter. Works on any key store
 // (its MoveKey and DropKeys carry whatever the store keeps beside the keys).

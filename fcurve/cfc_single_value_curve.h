@@ -187,6 +187,12 @@ struct CFCSingleValueCurve {
     }
   }
 
+  // Whether the keys of p, moved by shift, stay finite: they stay ordered, so the ends tell.
+  static bool StaysFinite(const Impl& p, double shift) {
+    return p.keys.size == 0 || (std::isfinite(p.keys[0].parameter + shift) &&
+                                std::isfinite(p.keys[p.keys.size - 1].parameter + shift));
+  }
+
   // The piece's first key lands on the last key, which takes its value.
   static unsigned int Append(Curve& c, const ZvBaseFCurve& source) {
     const Curve* src = dynamic_cast<const Curve*>(source.QueryFCurveKind(c.GetKind()));
@@ -199,6 +205,7 @@ struct CFCSingleValueCurve {
     if (p.keys.size == 0) return 1;
     const double shift =
         s.keys.size ? s.keys[s.keys.size - 1].parameter - p.keys[0].parameter : 0.0;
+    if (!StaysFinite(p, shift)) return 0;
     AppendShifted(c, s, piece, shift);
     return 1;
   }
@@ -242,6 +249,8 @@ struct CFCSingleValueCurve {
         t.DropAllKeys();  // nothing of the curve lies beyond the interval
       }
     }
+    // Near the largest double the piece or the moved tail can overflow.
+    if (!StaysFinite(p, lo - p.keys[0].parameter) || !StaysFinite(t, 0.0)) return 0;
     const ZvBaseFCurve& headBase = head;
     c.ZvBaseFCurve::operator=(headBase);  // the user data of the head
     s = h;
@@ -412,6 +421,7 @@ struct CFCSingleValueCurve {
       kFirst = std::floor((lo - s.keys[0].parameter) / period);
       kLast = std::floor((hi - s.keys[0].parameter) / period);
       if (!(kLast - kFirst <= kMaxSnapShotCycles)) return nullptr;
+      if (!((kLast - kFirst + 1.0) * n <= kCFCMaxSnapShotKeys)) return nullptr;
     }
     try {
       std::unique_ptr<Curve> out(new Curve(c));
@@ -427,7 +437,9 @@ struct CFCSingleValueCurve {
       };
       add(lo);
       o.KeepValueLeftOfFirstKey(s.ToStored(CFCEvalLeftUsingExtrapolationMethod(s, lo)));
-      for (double k = kFirst; k <= kLast; k += 1.0) {
+      // Counted from 0: far from the origin kFirst + 1 can round back to kFirst.
+      for (double counted = 0.0; counted <= kLast - kFirst; counted += 1.0) {
+        const double k = kFirst + counted;
         for (unsigned int i = 0; i < n; ++i) {
           const double t = s.keys[i].parameter + k * period;
           if (t > lo && t < hi) add(t);
@@ -460,6 +472,8 @@ struct CFCSingleValueCurve {
     ZvFCurveLockGuard guard(*this);                                                                \
     if (m_impl->readOnly || !std::isfinite(parameter)) return 0;                                   \
     if (!noFold) m_impl->FoldParameter(parameter);                                                 \
+    /* Folding by a period past the largest double gives no parameter. */                          \
+    if (!std::isfinite(parameter)) return 0;                                                       \
     unsigned int index;                                                                            \
     return m_impl->CreateNonModifyingKey(parameter, index, *this);                                 \
   }                                                                                                \

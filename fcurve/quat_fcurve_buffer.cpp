@@ -71,16 +71,16 @@ unsigned int ZvQuatFCurve::WriteToBuffer(void* buffer) const {
 unsigned int ZvQuatFCurve::ReadFromBufferBody(const void* body) {
   if (body == nullptr) return 0;
   ZvByteReader in(body);
-  return ReadBody(in);
+  return ReadBody(in, false);
 }
 
 unsigned int ZvQuatFCurve::ReadFromBuffer(const void* buffer, std::size_t size) {
   ZvByteReader body(buffer, 0);
   const unsigned int whole = zvOpenBoundedBlock(buffer, size, body);
-  return whole != 0 && ReadBody(body) != 0 ? whole : 0;
+  return whole != 0 && ReadBody(body, true) != 0 ? whole : 0;
 }
 
-unsigned int ZvQuatFCurve::ReadBody(ZvByteReader& in) {
+unsigned int ZvQuatFCurve::ReadBody(ZvByteReader& in, bool ascendingKeysOnly) {
   if (!in.Has(12)) return 0;
   const std::uint32_t stamp = in.U32();
   if ((stamp != kStamp && stamp != kStampWithoutComponent) || in.U32() != QuatKind) return 0;
@@ -96,13 +96,22 @@ unsigned int ZvQuatFCurve::ReadBody(ZvByteReader& in) {
   for (unsigned int i = 0; i < n; ++i) {
     ZvQuatKey key;
     key.time = zvGetF64(in);
+    if (ascendingKeysOnly && i > 0 && !(key.time > read.GetKeyTime(i - 1))) return 0;
     key.angles = ReadPoint(in);
     in.F32(&key.tension);
     in.F32(&key.continuity);
     in.F32(&key.bias);
     key.flags = static_cast<unsigned short>(in.U16() & ZvQuatKey::SpinsMask);
     const unsigned int constraints = in.U16();
-    read.SetConstraintData(read.SetKey(key, 0.0), constraints);
+    // Blocks hold their keys in order: each goes behind the last without a search, and only a
+    // foreign block's key out of order is set in its place.
+    unsigned int at = static_cast<unsigned int>(read.keys.size());
+    if (at == 0 || key.time > read.keys.back().time) {
+      read.keys.push_back(key);
+    } else {
+      at = read.SetKey(key, 0.0);
+    }
+    read.SetConstraintData(at, constraints);
   }
   read.SetValueWhenNoKeys(ReadPoint(in));
   read.SetReadOnlyConstraint(in.U32() != 0);

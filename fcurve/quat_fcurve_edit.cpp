@@ -69,8 +69,10 @@ unsigned int ZvQuatFCurve::MergeAndCreateKey(double start, double end, double pa
   unsigned short donorFlags = 0;
   CFCUserDataSet donorData;
   int donorHasData = 0;
-  if (keepAttributes) {
-    const unsigned int donor = m_curve->FindKey(parameter, kLargestFloat);
+  // A parameter beyond the largest float from every key finds no donor: nothing is kept.
+  const unsigned int donor =
+      keepAttributes ? m_curve->FindKey(parameter, kLargestFloat) : ZvQuatCurve::NoKey;
+  if (donor != ZvQuatCurve::NoKey) {
     donorFlags = keys[donor].flags & locks;
     donorHasData = HasUserData(keys[donor].time);
     if (donorHasData) donorData = *GetUserDataSet(keys[donor].time);
@@ -79,7 +81,7 @@ unsigned int ZvQuatFCurve::MergeAndCreateKey(double start, double end, double pa
     RemoveKeyUserData(keys[i].time);
   m_curve->RemoveKeyRange(first, last);
   const unsigned int at = m_curve->SetKey(parameter, m_component, value, 0.0);
-  if (keepAttributes) {
+  if (donor != ZvQuatCurve::NoKey) {
     m_curve->SetConstraintData(at, (donorFlags & ZvQuatKey::ValueLockFlag ? 2u : 0u) |
                                        (donorFlags & ZvQuatKey::ParamLockFlag ? 4u : 0u));
     if (donorHasData) SetUserDataSet(donorData, parameter);
@@ -250,6 +252,10 @@ unsigned int ZvQuatFCurve::ScaleAndOffsetParameters(double start, double end, do
   }
   unsigned int first, last;
   if (!QuatKeyIndicesInInterval(m_curve->GetKeys(), start, end, first, last, 0, 0)) return 1;
+  // A NaN pivot, scale or offset, or an overflow, would store a time that is not finite.
+  for (unsigned int i = first; i <= last; ++i) {
+    if (!std::isfinite((m_curve->GetKeyTime(i) - pivot) * scale + pivot + offset)) return 0;
+  }
   // Keys with constraint data stay where they are.
   std::vector<ZvQuatKey> moved;
   for (unsigned int i = last + 1; i-- > first;) {

@@ -5,6 +5,7 @@
 #include <zv/quat_fcurve.h>
 #include <zv/transfo4.h>
 
+#include "fcurve/cfc_base_impl.h"
 #include "fcurve/fcurve_lock.h"
 
 #include <algorithm>
@@ -239,9 +240,8 @@ unsigned int ZvQuatFCurve::ResampleSequence(double start, double end, double ste
   };
   std::vector<Sample> samples;
   const double count = std::ceil((end - 1e-6 - start) / step);
-  // Every sample becomes a key, and each key is placed by a walk over those before it: beyond
-  // 2^14 samples the quadratic cost passes a second, and the call is refused before any is made.
-  if (!(count <= 16384.0)) return 0;
+  // The cap of every kind, checked before any key is made.
+  if (!(count <= kCFCMaxResampledKeys)) return 0;
   for (long i = 0; i < count; ++i) {
     const double t = start + static_cast<double>(i) * step;
     samples.push_back({t, m_curve->Eval(t), false});
@@ -262,9 +262,20 @@ unsigned int ZvQuatFCurve::ResampleSequence(double start, double end, double ste
     isKey.Add(s.key);
   }
   ZvQuatFCurveMakeContinuous(times, angles, isKey);
+  // The samples are in time order: each becomes a key behind the last one, or replaces the last
+  // one when within 1e-6 of it (the only key it can be near), as setting them one by one would.
+  std::vector<ZvQuatKey> keys;
+  keys.reserve(times.size);
+  for (unsigned int i = 0; i < times.size; ++i) {
+    const ZvQuatKey key(times[i], angles[i], 0.0f, 0.0f, 0.0f, 0);
+    if (!keys.empty() && std::fabs(keys.back().time - key.time) <= 1e-6) {
+      keys.back() = key;
+    } else {
+      keys.push_back(key);
+    }
+  }
   RemoveAllKeyUserData();
   m_curve->RemoveAllKeys();
-  for (unsigned int i = 0; i < times.size; ++i)
-    m_curve->SetKey(times[i], angles[i], 1e-6);
+  m_curve->keys.swap(keys);
   return 1;
 }

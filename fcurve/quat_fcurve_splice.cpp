@@ -8,6 +8,7 @@
 #include "fcurve/fcurve_lock.h"
 
 #include <cmath>
+#include <cstddef>
 #include <utility>
 #include <vector>
 
@@ -38,28 +39,79 @@ ZvQuatCurve Piece(const ZvQuatCurve& source, double start, double end) {
   return piece;
 }
 
-}  // namespace
+// What a splice does to the per-key user data, noted while the keys are edited aside and done
+// only once the edited keys are known to stay in order.
+struct KeyUserDataMoves {
+  ZvDoubleArray dropped, from, to;
 
-// Keys from `index` on move by delta; their per-key user data go with them.
-void ZvQuatFCurve::MoveTail(unsigned int index, double delta) {
-  ZvDoubleArray before, after;
-  for (unsigned int i = index; i < m_curve->GetNumKeys(); ++i) {
-    const double t = m_curve->GetKeyTime(i);
-    m_curve->SetParameter(i, t + delta);
-    if (HasUserData(t)) {
-      before.Add(t);
-      after.Add(t + delta);
+  void Apply(ZvBaseFCurve& curve) const {
+    for (unsigned int i = 0; i < dropped.size; ++i)
+      curve.RemoveKeyUserData(dropped[i]);
+    ZvDoubleArray before, after;
+    for (unsigned int i = 0; i < from.size; ++i) {
+      if (curve.HasUserData(from[i])) {
+        before.Add(from[i]);
+        after.Add(to[i]);
+      }
+    }
+    if (before.size) curve.MoveKeyUserDataTail(before, after);
+  }
+};
+
+// Takes keys first..last out of `keys`.
+void DropKeys(std::vector<ZvQuatKey>& keys, unsigned int first, unsigned int last,
+              KeyUserDataMoves& moves) {
+  for (unsigned int i = first; i <= last; ++i)
+    moves.dropped.Add(keys[i].time);
+  keys.erase(keys.begin() + first, keys.begin() + last + 1);
+}
+
+// Keys from `index` on move by delta.
+void MoveTail(std::vector<ZvQuatKey>& keys, unsigned int index, double delta,
+              KeyUserDataMoves& moves) {
+  for (unsigned int i = index; i < keys.size(); ++i) {
+    moves.from.Add(keys[i].time);
+    keys[i].time += delta;
+    moves.to.Add(keys[i].time);
+  }
+}
+
+// The keys of `into` with those of `piece`, moved by `shift`, put among them in one pass over
+// both: a piece key within 1e-12 of the key placed last or of the next key of `into` replaces
+// the nearer, as setting the keys one by one with that tolerance would.
+std::vector<ZvQuatKey> Merged(const std::vector<ZvQuatKey>& into,
+                              const std::vector<ZvQuatKey>& piece, double shift) {
+  std::vector<ZvQuatKey> out;
+  out.reserve(into.size() + piece.size());
+  size_t i = 0;
+  for (ZvQuatKey k : piece) {
+    k.time += shift;
+    while (i < into.size() && into[i].time < k.time - 1e-12)
+      out.push_back(into[i++]);
+    const double placed = out.empty() ? INFINITY : std::fabs(out.back().time - k.time);
+    const double next = i < into.size() ? std::fabs(into[i].time - k.time) : INFINITY;
+    if (placed <= 1e-12 && !(next < placed)) {
+      out.back() = k;
+    } else {
+      if (next <= 1e-12) ++i;
+      out.push_back(k);
     }
   }
-  if (before.size) MoveKeyUserDataTail(before, after);
+  out.insert(out.end(), into.begin() + static_cast<std::ptrdiff_t>(i), into.end());
+  return out;
 }
 
-// Drops keys first..last with this view's user data of them.
-void ZvQuatFCurve::DropKeys(unsigned int first, unsigned int last) {
-  for (unsigned int i = first; i <= last; ++i)
-    RemoveKeyUserData(m_curve->GetKeyTime(i));
-  m_curve->RemoveKeyRange(first, last);
+// Times finite and strictly increasing: what every edit must leave.
+bool Ordered(const std::vector<ZvQuatKey>& keys) {
+  for (size_t i = 0; i < keys.size(); ++i) {
+    if (!std::isfinite(keys[i].time) || (i > 0 && !(keys[i].time > keys[i - 1].time))) {
+      return false;
+    }
+  }
+  return true;
 }
+
+}  // namespace
 
 unsigned int ZvQuatFCurve::Cut(double start, double end, ZvBaseFCurve& cutOut) {
   ZvQuatFCurve* target = static_cast<ZvQuatFCurve*>(cutOut.QueryFCurveKind(QuatKind));
@@ -70,23 +122,24 @@ unsigned int ZvQuatFCurve::Cut(double start, double end, ZvBaseFCurve& cutOut) {
   if (AreAnyValuesLockedInInterval(start, end, 0, 0) || AnyParameterLockFrom(*m_curve, start)) {
     return 0;
   }
-  // The keys beyond the cut move left by its width; rounding must not land one on the cut.
-  double previous = start;
-  for (const ZvQuatKey& k : m_curve->GetKeys()) {
-    if (!(k.time - end > 1e-15)) continue;
-    const double moved = k.time + (start - end);
-    if (!(moved > previous) || !std::isfinite(moved)) return 0;
-    previous = moved;
-  }
   const ZvQuatCurve piece = Piece(*m_curve, start, end);
-  if (m_curve->GetNumKeys() > 0 && end > start) {
+  ZvQuatCurve cut(*m_curve);
+  KeyUserDataMoves moves;
+  if (cut.GetNumKeys() > 0 && end > start) {
     // The key at end takes the place of the key at start: the curve goes on from start as it
-    // went on from end.
-    const unsigned int a = KeyAt(*m_curve, start);
-    const unsigned int b = KeyAt(*m_curve, end);
-    DropKeys(a, b - 1);
-    MoveTail(a, start - end);
+    // went on from end. Ends closer than the key tolerance find one key: nothing lies between.
+    const unsigned int a = KeyAt(cut, start);
+    const unsigned int b = KeyAt(cut, end);
+    if (b > a) {
+      DropKeys(cut.keys, a, b - 1, moves);
+      MoveTail(cut.keys, a, start - end, moves);
+    }
   }
+  // Rounding of the moved tail can land a key on the one before the cut, or, on a cut as wide
+  // as the largest doubles, behind it.
+  if (!Ordered(cut.keys)) return 0;
+  moves.Apply(*this);
+  *m_curve = cut;
   if (target->m_curve != m_curve) {
     ZvFCurveLockGuard holdTarget(*target);
     *target->m_curve = piece;
@@ -109,17 +162,20 @@ unsigned int ZvQuatFCurve::Paste(const ZvBaseFCurve& source, double start, doubl
   if (AnyParameterLockFrom(*m_curve, start)) return 0;
   const double first = piece.GetKeyTime(0);
   const double length = piece.GetKeyTime(count - 1) - first;
-  if (m_curve->GetNumKeys() > 0) {
+  ZvQuatCurve pasted(*m_curve);
+  KeyUserDataMoves moves;
+  if (pasted.GetNumKeys() > 0) {
     // Keys of [start, end] give way to the piece; the tail makes room for its length.
-    const unsigned int a = KeyAt(*m_curve, start);
-    const unsigned int b = KeyAt(*m_curve, end);
-    DropKeys(a, b);
-    MoveTail(a, start + length - end);
+    const unsigned int a = KeyAt(pasted, start);
+    const unsigned int b = KeyAt(pasted, end);
+    DropKeys(pasted.keys, a, b, moves);
+    MoveTail(pasted.keys, a, start + length - end, moves);
   }
-  for (ZvQuatKey k : piece.GetKeys()) {
-    k.time += start - first;
-    m_curve->SetKey(k, 1e-12);
-  }
+  std::vector<ZvQuatKey> keys = Merged(pasted.keys, piece.keys, start - first);
+  if (!Ordered(keys)) return 0;
+  moves.Apply(*this);
+  pasted.keys.swap(keys);
+  *m_curve = pasted;
   return 1;
 }
 
@@ -137,9 +193,10 @@ unsigned int ZvQuatFCurve::Append(const ZvBaseFCurve& source) {
   if (count == 0) return 1;
   // The piece's first key lands on, and replaces, the last key; without keys it comes as it is.
   const double offset = n ? m_curve->GetKeyTime(n - 1) - piece.GetKeyTime(0) : 0.0;
-  for (ZvQuatKey k : piece.GetKeys()) {
-    k.time += offset;
-    m_curve->SetKey(k, 1e-12);
-  }
+  ZvQuatCurve appended(*m_curve);
+  std::vector<ZvQuatKey> keys = Merged(appended.keys, piece.keys, offset);
+  if (!Ordered(keys)) return 0;
+  appended.keys.swap(keys);
+  *m_curve = appended;
   return 1;
 }

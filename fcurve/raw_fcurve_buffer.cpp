@@ -86,16 +86,16 @@ unsigned int ZvRawFCurve::WriteToBuffer(void* buffer) const {
 unsigned int ZvRawFCurve::ReadFromBufferBody(const void* body) {
   if (body == nullptr) return 0;
   ZvByteReader in(body);
-  return ReadBody(in);
+  return ReadBody(in, false);
 }
 
 unsigned int ZvRawFCurve::ReadFromBuffer(const void* buffer, std::size_t size) {
   ZvByteReader body(buffer, 0);
   const unsigned int whole = zvOpenBoundedBlock(buffer, size, body);
-  return whole != 0 && ReadBody(body) != 0 ? whole : 0;
+  return whole != 0 && ReadBody(body, true) != 0 ? whole : 0;
 }
 
-unsigned int ZvRawFCurve::ReadBody(ZvByteReader& in) {
+unsigned int ZvRawFCurve::ReadBody(ZvByteReader& in, bool ascendingKeysOnly) {
   ZvRawFCurve read(0.0);
   ZvRawFCurveImpl& s = *read.m_impl;
   if (!in.Has(4)) return 0;
@@ -111,6 +111,7 @@ unsigned int ZvRawFCurve::ReadBody(ZvByteReader& in) {
     if (!zvReadTag(in, kTimeCurveTag) || !in.Has(1)) return 0;
     s.timeCurve = in.U8() == 1 ? 1 : 0;
   }
+  if (ascendingKeysOnly && !CFCKeysStrictlyAscending(s.keys)) return 0;
   ZvFCurveLockGuard guard(*this);
   ExchangeUserData(read);
   std::swap(m_impl, read.m_impl);

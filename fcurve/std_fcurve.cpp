@@ -193,6 +193,8 @@ unsigned int ZvStdFCurve::CreateNonModifyingKey(double parameter, int noFold) {
   ZvStdFCurveImpl& s = *m_impl;
   if (s.readOnly || !std::isfinite(parameter)) return 0;
   if (!noFold) s.FoldParameter(parameter);
+  // Folding by a period past the largest double gives no parameter.
+  if (!std::isfinite(parameter)) return 0;
   if (s.keys.size) {
     // Automatic neighbours would change shape once the new key is between them.
     int found;

@@ -5,6 +5,7 @@
 #include <zv/std_fcurve.h>
 
 #include "fcurve/buffer_bytes.h"
+#include "fcurve/cfc_key_order.h"
 #include "fcurve/fcurve_lock.h"
 #include "fcurve/std_fcurve_buffer.h"
 #include "fcurve/std_fcurve_impl.h"
@@ -195,16 +196,16 @@ void RepairOlderVersion(ZvStdFCurveImpl& s, unsigned int stamp) {
 unsigned int ZvStdFCurve::ReadFromBufferBody(const void* body) {
   if (body == nullptr) return 0;
   ZvByteReader in(body);
-  return ReadBody(in);
+  return ReadBody(in, false);
 }
 
 unsigned int ZvStdFCurve::ReadFromBuffer(const void* buffer, std::size_t size) {
   ZvByteReader body(buffer, 0);
   const unsigned int whole = zvOpenBoundedBlock(buffer, size, body);
-  return whole != 0 && ReadBody(body) != 0 ? whole : 0;
+  return whole != 0 && ReadBody(body, true) != 0 ? whole : 0;
 }
 
-unsigned int ZvStdFCurve::ReadBody(ZvByteReader& in) {
+unsigned int ZvStdFCurve::ReadBody(ZvByteReader& in, bool ascendingKeysOnly) {
   // The defaults of every field an older block does not hold.
   ZvStdFCurve read(0.0, CubicSegment);
   ZvStdFCurveImpl& s = *read.m_impl;
@@ -224,6 +225,7 @@ unsigned int ZvStdFCurve::ReadBody(ZvByteReader& in) {
       s.timeCurve = IsOne(in.U8());
     }
   }
+  if (ascendingKeysOnly && !CFCKeysStrictlyAscending(s.keys)) return 0;
   ZvFCurveLockGuard guard(*this);
   ExchangeUserData(read);
   std::swap(m_impl, read.m_impl);

@@ -63,7 +63,9 @@ ZvBaseFCurve* ZvStdFCurve::SnapShot(double start, double end, ExtrapolationMetho
                                 : 0.0;
       double a, b;
       const double fs = s.CycleOffsetFold(lo, a, true), fe = s.CycleOffsetFold(hi, b, false);
-      if (b - a > kMaxSnapShotCycles) return nullptr;
+      if (!(b - a <= kMaxSnapShotCycles) || !((b - a + 1.0) * n <= kCFCMaxSnapShotKeys)) {
+        return nullptr;
+      }
       const double shift = lo - fs;
       if (a >= b) {
         // Within one period; deliberately without a value offset, also with the offset method.
@@ -79,7 +81,8 @@ ZvBaseFCurve* ZvStdFCurve::SnapShot(double start, double end, ExtrapolationMetho
           ZvStdFCurve whole(*this);
           whole.m_impl->readOnly = 0;
           MoveAlong(*whole.m_impl, whole, 0.0, (a + 1) * offset);
-          for (double c = a + 1; c < b; c += 1.0) {
+          // Counted from 0: far from the origin a + 1 can round back to a.
+          for (double counted = 1.0; counted < b - a; counted += 1.0) {
             if (out) {
               out->Append(whole);
             } else {
@@ -142,6 +145,8 @@ ZvBaseFCurve* ZvStdFCurve::SnapShot(double start, double end, ExtrapolationMetho
       }
     }
     out->m_impl->readOnly = 0;
+    // Periods moved far from the origin can round their keys onto each other: no snapshot then.
+    if (!out->m_impl->KeysAreOrdered()) return nullptr;
     out->SetExtrapolationMethod(method);
     return out.release();
   } catch (const std::bad_alloc&) {

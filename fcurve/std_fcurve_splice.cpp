@@ -68,6 +68,11 @@ int ZvStdFCurveImpl::MoveTail(unsigned int first, double delta, ZvBaseFCurve& cu
     if (keys[i].flags & CFCFlag_ParameterLock) return 0;
   }
   if (first > 0 && !(keys[first].parameter + delta >= keys[first - 1].parameter)) return 0;
+  // Near the largest double the move can overflow; the moved keys stay in order, so the ends
+  // tell.
+  if (!std::isfinite(keys[first].parameter + delta) ||
+      !std::isfinite(keys[n - 1].parameter + delta))
+    return 0;
   ZvDoubleArray from(4), to(4);
   // A key sharing its parameter with the key before it (a duplicate about to be opened up)
   // leaves the user data there with that key.
@@ -103,19 +108,24 @@ int ZvStdFCurveImpl::SpliceAfter(unsigned int a, const ZvStdFCurveImpl& piece,
     this->DropKeys(a + 1, a + 1);
   } else {
     TakeRightSide(keys[a], head, dx);
+    // The inner keys go in as one run: one by one, each would move the whole tail again.
     const unsigned int inner = joinNext ? m - 1 : m;
-    for (unsigned int j = 1; j < inner; ++j) {
-      CFCStdKey k = piece.keys[j];
-      ShiftKey(k, dx);
-      keys.InsertBefore(a + j, k);
-    }
+    if (inner > 1) keys.InsertBefore(a + 1, piece.keys.data + 1, inner - 1);
+    for (unsigned int j = 1; j < inner; ++j)
+      ShiftKey(keys[a + j], dx);
     if (joinNext) TakeLeftSide(keys[a + m - 1], tail, dx);
   }
   for (unsigned int j = 0; j < m; ++j) {
     const double p = piece.keys[j].parameter;
     if (pieceCurve.GetUserDataSet(p) != nullptr) curve.CopyKeyUserData(pieceCurve, p, p + dx);
   }
+  // Both joins claim continuity only where the handles they met still agree; a block read back
+  // would drop the claim otherwise.
   if (!ActualTangentsAreUnified(a)) ClearBits(keys[a], CFCFlag_TangentContinuity);
+  const unsigned int far = a + m - 1;
+  if (joinNext && m > 1 && !ActualTangentsAreUnified(far)) {
+    ClearBits(keys[far], CFCFlag_TangentContinuity);
+  }
   return 1;
 }
 
@@ -231,7 +241,9 @@ unsigned int ZvStdFCurve::Paste(const ZvBaseFCurve& source, double start, double
                                  : s.SpliceAfter(a, p, piece, true, *this);
   if (ok) {
     ReapplyHandleConstraint(s);
-    ok = s.IsValid();
+    // The keys stay ordered and finite: the ends tell whether a move overflowed.
+    ok = s.IsValid() && std::isfinite(s.keys[0].parameter) &&
+         std::isfinite(s.keys[s.keys.size - 1].parameter);
   }
   if (!ok) {
     Set(saved);
@@ -259,7 +271,13 @@ unsigned int ZvStdFCurve::Append(const ZvBaseFCurve& source) {
     }
     return 1;
   }
+  const ZvStdFCurve saved(*this);
   if (!s.SpliceAfter(s.keys.size - 1, p, piece, false, *this)) return 0;
+  // Far from the origin the piece's keys, moved to the last key, can round onto each other.
+  if (!s.KeysAreOrdered()) {
+    Set(saved);
+    return 0;
+  }
   ReapplyHandleConstraint(s);
   return 1;
 }

@@ -121,16 +121,17 @@ bool Read(ZvByteReader& in, ZvStepFCurveImpl& s) {
   unsigned int Curve::ReadFromBufferBody(const void* body) {                          \
     if (body == nullptr) return 0;                                                    \
     ZvByteReader in(body);                                                            \
-    return ReadBody(in);                                                              \
+    return ReadBody(in, false);                                                       \
   }                                                                                   \
   unsigned int Curve::ReadFromBuffer(const void* buffer, std::size_t size) {          \
     ZvByteReader body(buffer, 0);                                                     \
     const unsigned int whole = zvOpenBoundedBlock(buffer, size, body);                \
-    return whole != 0 && ReadBody(body) != 0 ? whole : 0;                             \
+    return whole != 0 && ReadBody(body, true) != 0 ? whole : 0;                       \
   }                                                                                   \
-  unsigned int Curve::ReadBody(ZvByteReader& in) {                                    \
+  unsigned int Curve::ReadBody(ZvByteReader& in, bool ascendingKeysOnly) {            \
     Curve read(Blank);                                                                \
     if (!Read<Layout>(in, *read.m_impl) || read.ReadUserDataBlock(in) == 0) return 0; \
+    if (ascendingKeysOnly && !CFCKeysStrictlyAscending(read.m_impl->keys)) return 0;  \
     ZvFCurveLockGuard guard(*this);                                                   \
     ExchangeUserData(read);                                                           \
     std::swap(m_impl, read.m_impl);                                                   \

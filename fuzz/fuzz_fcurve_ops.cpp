@@ -1,7 +1,15 @@
 // Random sequences of public calls on function curves of every kind, with extreme arguments
 // (the largest doubles, infinities, NaN, denormals, values a hair off a key, reversed
-// intervals). After every call the keys must still be finite and strictly increasing; hangs and
-// runaway memory are caught by running with -timeout=1 -rss_limit_mb=512.
+// intervals). After every call the keys must still be finite and strictly increasing, and the
+// curve's block must read back through the bounded factory with the same keys and, read again,
+// give the same bytes; hangs and runaway memory are caught by running with -timeout=1
+// -rss_limit_mb=512.
+//
+// The library accepts up to 2^20 keys or samples a call, at a cost in proportion: a second and
+// more under the sanitizers. So that one input stays well within its second while a call that
+// is slower than linear still stands out, an input ends once its curve holds more than
+// kMaxKeys keys, and samplings finer than kMaxSamples samples are coarsened; a sampling past the
+// library's cap still goes through as it is, to be refused.
 //
 // Input: one byte picks the curve kind, then each step is one byte for the call and as many
 // more as its arguments take.
@@ -20,6 +28,7 @@
 #include <cstring>
 #include <limits>
 #include <memory>
+#include <vector>
 
 namespace {
 
@@ -53,6 +62,20 @@ const double kExtremes[] = {0.0,
                             1e-7,
                             1e-15};
 constexpr unsigned int kNumExtremes = sizeof(kExtremes) / sizeof(kExtremes[0]);
+
+constexpr unsigned int kMaxKeys = 4096;
+constexpr double kMaxSamples = 4096.0;
+// Samplings of more than this many samples are refused by the library, whatever their cost.
+constexpr double kRefusedSamples = 4.0 * 1048576.0;
+
+// The step, made coarse enough for at most kMaxSamples samples over [from, to] unless the
+// library refuses the sampling anyway.
+double Coarsened(double from, double to, double step) {
+  const double span = std::fabs(to - from);
+  const double count = span / std::fabs(step);
+  if (!(count > kMaxSamples) || count > kRefusedSamples) return step;
+  return std::copysign(span / kMaxSamples, step);
+}
 
 class Script {
  public:
@@ -100,6 +123,36 @@ void CheckKeys(const ZvBaseFCurve& c) {
     if (!std::isfinite(p[i])) std::abort();
     if (i > 0 && !(p[i] > p[i - 1])) std::abort();
   }
+}
+
+std::vector<unsigned char> BlockOf(const ZvBaseFCurve& c) {
+  std::vector<unsigned char> block(c.GetBufferSize());
+  if (c.WriteToBuffer(block.data()) != block.size()) std::abort();
+  return block;
+}
+
+std::unique_ptr<ZvBaseFCurve> ReadBack(const std::vector<unsigned char>& block) {
+  unsigned int consumed = 0;
+  std::unique_ptr<ZvBaseFCurve> copy(
+      ZvBaseFCurve_CreateFromBuffer(block.data(), block.size(), consumed));
+  if (!copy || consumed == 0) std::abort();
+  return copy;
+}
+
+// The keys come back from the block as they were. A reader keeps the continuity claim of a key
+// only where its handles agree within its tolerance, so after a far scale it may drop one: it is
+// the block of the curve read back that must then come back byte for byte.
+void CheckBlock(const ZvBaseFCurve& c) {
+  std::unique_ptr<ZvBaseFCurve> copy = ReadBack(BlockOf(c));
+  ZvDoubleArray kept, read;
+  c.GetAllKeyParameters(kept);
+  copy->GetAllKeyParameters(read);
+  if (kept.size != read.size ||
+      (kept.size && std::memcmp(kept.data, read.data, kept.size * sizeof(double)) != 0)) {
+    std::abort();
+  }
+  const std::vector<unsigned char> block = BlockOf(*copy);
+  if (BlockOf(*ReadBack(block)) != block) std::abort();
 }
 
 void Step(ZvBaseFCurve& c, Script& s) {
@@ -159,7 +212,7 @@ void Step(ZvBaseFCurve& c, Script& s) {
       break;
     case 15: {
       ZvDoubleArray params, values;
-      c.EvalSequence(a, b, d, s.Number(), params, values, f0);
+      c.EvalSequence(a, b, Coarsened(a, b, d), s.Number(), params, values, f0);
       break;
     }
     case 16: {
@@ -178,7 +231,7 @@ void Step(ZvBaseFCurve& c, Script& s) {
       break;
     }
     case 17:
-      c.ResampleSequence(a, b, d, f0, 0);
+      c.ResampleSequence(a, b, Coarsened(a, b, d), f0, 0);
       break;
     case 18: {
       const double kernel[5] = {a, b, d, 0.25, 0.5};
@@ -255,6 +308,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   for (int steps = 0; script.More() && steps < 24; ++steps) {
     Step(*curve, script);
     CheckKeys(*curve);
+    CheckBlock(*curve);
+    if (curve->GetNumKeys() > kMaxKeys) break;
   }
   return 0;
 }

@@ -136,6 +136,8 @@ class ZV_API ZvBaseFCurve {
   virtual ZvBaseFCurve* QueryFCurveKind(Kind kind) const = 0;
   virtual Kind GetKind() const = 0;
   virtual ZvBaseFCurve* Clone() const = 0;
+  // Under the cycle methods a snapshot repeats the keys of every period it shows: more than 1e5
+  // periods, or more than 2^20 repeated keys (1048576), are refused with null.
   virtual ZvBaseFCurve* SnapShot(double start, double end, ExtrapolationMethod method) const = 0;
 
   virtual unsigned int CreateKey(double parameter, double value) = 0;

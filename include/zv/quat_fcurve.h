@@ -133,6 +133,7 @@ class ZV_API ZvQuatCurve {
   int readOnly;
 
   friend struct CFCCurveStore;  // the interactive editing tools work on the keys directly
+  friend class ZvQuatFCurve;    // its splices build the new keys aside in one pass
 };
 
 // One Euler angle (component 0 x, 1 y, 2 z) of a shared ZvQuatCurve as a function curve, in
@@ -278,8 +279,9 @@ class ZV_API ZvQuatFCurve : public ZvBaseFCurve {
   unsigned int WriteToBuffer(void* buffer) const override;
   unsigned int ReadFromBufferBody(const void* body) override;
   // Reads a whole block of `size` bytes, length field included, refusing one whose length exceeds
-  // `size` or whose contents would be read past its body: the bytes taken (4 + the stored
-  // length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
+  // `size`, whose contents would be read past its body, or whose keys do not stand in strictly
+  // ascending order (the body reader takes those and repairs them on writing): the bytes taken
+  // (4 + the stored length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
   unsigned int ReadFromBuffer(const void* buffer, std::size_t size);
   unsigned int ScaleAndShiftValues(double scale, double offset) override;
   // Writes the largest float to `parameter` and returns 0: a rotation angle has no inverse.
@@ -293,10 +295,8 @@ class ZV_API ZvQuatFCurve : public ZvBaseFCurve {
   unsigned int Set(const ZvBaseFCurve& curve) override;
 
  private:
-  void MoveTail(unsigned int index, double delta);
-  void DropKeys(unsigned int first, unsigned int last);
-  // The reader behind ReadFromBufferBody and ReadFromBuffer.
-  unsigned int ReadBody(ZvByteReader& in);
+  // The reader behind ReadFromBufferBody and ReadFromBuffer; the latter asks for ascending keys.
+  unsigned int ReadBody(ZvByteReader& in, bool ascendingKeysOnly);
 
   ZvQuatCurve* m_curve;
   unsigned int m_component;

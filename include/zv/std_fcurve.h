@@ -182,8 +182,9 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   unsigned int WriteToBuffer(void* buffer) const override;
   unsigned int ReadFromBufferBody(const void* body) override;
   // Reads a whole block of `size` bytes, length field included, refusing one whose length exceeds
-  // `size` or whose contents would be read past its body: the bytes taken (4 + the stored
-  // length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
+  // `size`, whose contents would be read past its body, or whose keys do not stand in strictly
+  // ascending order (the body reader takes those and repairs them on writing): the bytes taken
+  // (4 + the stored length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
   unsigned int ReadFromBuffer(const void* buffer, std::size_t size);
   unsigned int ScaleAndShiftValues(double scale, double offset) override;
   // The parameter at which a bijective curve takes the value; the last argument is ignored.
@@ -307,8 +308,8 @@ class ZV_API ZvStdFCurve : public ZvBaseFCurve {
   // Copies under the source's lock, held from before the user data is copied until the keys are.
   ZvStdFCurve(const ZvStdFCurve& other, const ZvFCurveLockGuard& sourceLock);
   friend class ZvStdTgtMoverImpl;  // a drag writes handles that are valid only as a pair
-  // The reader behind ReadFromBufferBody and ReadFromBuffer.
-  unsigned int ReadBody(ZvByteReader& in);
+  // The reader behind ReadFromBufferBody and ReadFromBuffer; the latter asks for ascending keys.
+  unsigned int ReadBody(ZvByteReader& in, bool ascendingKeysOnly);
 
   ZvStdFCurveImpl* m_impl;
 

@@ -66,14 +66,15 @@ class ZV_API ZvBooleanFCurve : public ZvBaseFCurve {
   // The value before the first key.
   int GetValueBeforeFirstKey() const;
   // Reads a whole block of `size` bytes, length field included, refusing one whose length exceeds
-  // `size` or whose contents would be read past its body: the bytes taken (4 + the stored
-  // length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
+  // `size`, whose contents would be read past its body, or whose keys do not stand in strictly
+  // ascending order (the body reader takes those and repairs them on writing): the bytes taken
+  // (4 + the stored length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
   unsigned int ReadFromBuffer(const void* buffer, std::size_t size);
 
  private:
   ZvBooleanFCurve(const ZvBooleanFCurve& other, const ZvFCurveLockGuard& sourceLock);
-  // The reader behind ReadFromBufferBody and ReadFromBuffer.
-  unsigned int ReadBody(ZvByteReader& in);
+  // The reader behind ReadFromBufferBody and ReadFromBuffer; the latter asks for ascending keys.
+  unsigned int ReadBody(ZvByteReader& in, bool ascendingKeysOnly);
 
   ZvStepFCurveImpl* m_impl;
 
@@ -94,14 +95,15 @@ class ZV_API ZvIntegerFCurve : public ZvBaseFCurve {
 
   int GetValueBeforeFirstKey() const;
   // Reads a whole block of `size` bytes, length field included, refusing one whose length exceeds
-  // `size` or whose contents would be read past its body: the bytes taken (4 + the stored
-  // length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
+  // `size`, whose contents would be read past its body, or whose keys do not stand in strictly
+  // ascending order (the body reader takes those and repairs them on writing): the bytes taken
+  // (4 + the stored length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
   unsigned int ReadFromBuffer(const void* buffer, std::size_t size);
 
  private:
   ZvIntegerFCurve(const ZvIntegerFCurve& other, const ZvFCurveLockGuard& sourceLock);
-  // The reader behind ReadFromBufferBody and ReadFromBuffer.
-  unsigned int ReadBody(ZvByteReader& in);
+  // The reader behind ReadFromBufferBody and ReadFromBuffer; the latter asks for ascending keys.
+  unsigned int ReadBody(ZvByteReader& in, bool ascendingKeysOnly);
 
   ZvStepFCurveImpl* m_impl;
 

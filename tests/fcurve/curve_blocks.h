@@ -172,7 +172,7 @@ inline ZvIntegerFCurve SteppedInteger() {
 inline ByteVec QuatBlockWithoutComponent() {
   BlockBuilder b;
   b.U32(0x30313030).U32(ZvBaseFCurve::QuatKind).U32(2);
-  for (double time : {2.0, 1.0}) {
+  for (double time : {1.0, 2.0}) {
     b.F64(time).F64(time / 4).F64(0.0).F64(-time / 8);
     b.U32(0).U32(0).U32(0).U16(0xC005).U16(4);
   }

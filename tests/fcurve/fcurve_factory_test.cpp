@@ -1,13 +1,18 @@
 // The curve factories and the bounded readers: kinds, refusals, truncated blocks, blocks in a
 // row, and the fuzzing seeds, which are the blocks written here.
+#include <zv/quat_fcurve.h>
+#include <zv/raw_fcurve.h>
 #include <zv/std_fcurve.h>
+#include <zv/step_fcurve.h>
 
 #include <gtest/gtest.h>
 
 #include <cstdlib>
+#include <cstring>
 #include <fstream>
 #include <iterator>
 #include <memory>
+#include <vector>
 
 #include "tests/fcurve/curve_blocks.h"
 #include "tests/support/byte_blocks.h"
@@ -99,4 +104,58 @@ TEST(FCurveFactory, FuzzSeedsAreTheWrittenBlocks) {
   // ZV_WRITE_FUZZ_SEEDS=1 rewrites the committed seeds; otherwise they must match the writers.
   for (const auto& seed : SeedBlocks())
     ExpectFuzzSeed("fuzz_fcurve_buffer", seed.first, seed.second);
+}
+
+template <class Curve>
+unsigned int ReadBounded(ZvBaseFCurve& curve, const ByteVec& block) {
+  return static_cast<Curve&>(curve).ReadFromBuffer(block.data(), block.size());
+}
+
+TEST(FCurveFactory, BoundedReadersRefuseKeysOutOfOrder) {
+  // A curve of each kind with two keys, where the second key's parameter stands in its block,
+  // and the kind's own bounded reader.
+  struct Case {
+    std::unique_ptr<ZvBaseFCurve> curve;
+    std::size_t secondParameter;
+    unsigned int (*read)(ZvBaseFCurve&, const ByteVec&);
+  };
+  std::vector<Case> cases;
+  cases.push_back(
+      {std::unique_ptr<ZvBaseFCurve>(new ZvStdFCurve()), 44 + 60, &ReadBounded<ZvStdFCurve>});
+  cases.push_back(
+      {std::unique_ptr<ZvBaseFCurve>(new ZvRawFCurve()), 40 + 16, &ReadBounded<ZvRawFCurve>});
+  cases.push_back({std::unique_ptr<ZvBaseFCurve>(new ZvBooleanFCurve()), 36 + 11,
+                   &ReadBounded<ZvBooleanFCurve>});
+  cases.push_back({std::unique_ptr<ZvBaseFCurve>(new ZvIntegerFCurve()), 42 + 14,
+                   &ReadBounded<ZvIntegerFCurve>});
+  cases.push_back(
+      {std::unique_ptr<ZvBaseFCurve>(new ZvQuatFCurve(1)), 20 + 48, &ReadBounded<ZvQuatFCurve>});
+  for (Case& c : cases) {
+    SCOPED_TRACE(c.curve->GetKind());
+    ASSERT_EQ(c.curve->CreateKey(1.0, 1.0), 1u);
+    ASSERT_EQ(c.curve->CreateKey(2.0, 0.0), 1u);
+    const ByteVec good = BlockOf(*c.curve);
+    std::unique_ptr<ZvBaseFCurve> target(c.curve->Clone());
+    ASSERT_EQ(target->CreateKey(5.0, 1.0), 1u);
+    const ByteVec before = BlockOf(*target);
+    EXPECT_EQ(c.read(*target, good), good.size());
+    for (double second : {1.0, 0.5}) {
+      ByteVec bad = good;
+      std::memcpy(bad.data() + c.secondParameter, &second, 8);  // little-endian on every target
+      unsigned int consumed = 1;
+      EXPECT_EQ(ZvBaseFCurve_CreateFromBuffer(bad.data(), bad.size(), consumed), nullptr);
+      EXPECT_EQ(consumed, 0u);
+      ASSERT_EQ(c.read(*target, before), before.size());
+      EXPECT_EQ(c.read(*target, bad), 0u);
+      EXPECT_EQ(BlockOf(*target), before);
+      // The trusting body reader takes such a foreign block, and the curve writes it repaired.
+      ZvBaseFCurve* probe = nullptr;
+      ASSERT_EQ(ZvBaseFCurve_CreateFromBufferBody(bad.data() + 4, &probe), 1u);
+      std::unique_ptr<ZvBaseFCurve> foreign(probe);
+      const ByteVec rewritten = BlockOf(*foreign);
+      std::unique_ptr<ZvBaseFCurve> back(
+          ZvBaseFCurve_CreateFromBuffer(rewritten.data(), rewritten.size(), consumed));
+      EXPECT_NE(back, nullptr);
+    }
+  }
 }

@@ -10,6 +10,7 @@
 #include <gtest/gtest.h>
 
 #include <cfloat>
+#include <chrono>
 #include <cmath>
 #include <limits>
 #include <memory>
@@ -19,6 +20,17 @@ namespace {
 
 const double kNaN = std::numeric_limits<double>::quiet_NaN();
 const double kInf = std::numeric_limits<double>::infinity();
+
+void ExpectAscending(const std::vector<double>& k) {
+  for (size_t i = 1; i < k.size(); ++i)
+    EXPECT_LT(k[i - 1], k[i]) << "at " << i;
+}
+
+std::vector<unsigned char> BlockOf(const ZvBaseFCurve& c) {
+  std::vector<unsigned char> block(c.GetBufferSize());
+  c.WriteToBuffer(block.data());
+  return block;
+}
 
 std::vector<double> KeysOf(const ZvBaseFCurve& c) {
   ZvDoubleArray p;
@@ -90,6 +102,25 @@ TEST(HostileCurveInput, CutNeverLeavesEqualKeys) {
     for (size_t i = 1; i < k.size(); ++i)
       EXPECT_LT(k[i - 1], k[i]) << c->GetKind();
   }
+}
+
+TEST(HostileCurveInput, AppendNeverRoundsKeysTogether) {
+  // Moved to a last key at 1e18, the piece's keys 6 apart round onto one parameter.
+  ZvStdFCurve c;
+  for (double t : {-32.0, -26.0, 1e18})
+    c.CreateKey(t, 0);
+  const ZvStdFCurve piece(c);
+  EXPECT_EQ(c.Append(piece), 0u);
+  EXPECT_EQ(KeysOf(c), (std::vector<double>{-32, -26, 1e18}));
+  // Pasted into a curve that reaches the largest double, the piece would move its tail past it.
+  for (auto& wide : AllKinds({-DBL_MAX, -32.0, 0.0, DBL_MAX}, false)) {
+    std::unique_ptr<ZvBaseFCurve> whole(wide->Clone());
+    EXPECT_EQ(wide->Paste(*whole, 0, -32), 0u) << wide->GetKind();
+    EXPECT_EQ(KeysOf(*wide), (std::vector<double>{-DBL_MAX, -32, 0, DBL_MAX}));
+    EXPECT_EQ(wide->Append(*whole), 0u) << wide->GetKind();
+  }
+  EXPECT_EQ(c.Append(ZvStdFCurve(0, 1, 1024, 2)), 1u);
+  EXPECT_EQ(KeysOf(c), (std::vector<double>{-32, -26, 1e18, 1e18 + 1024}));
 }
 
 TEST(HostileCurveInput, WholeCurveMovesRefuseToMergeOrOverflowKeys) {
@@ -184,6 +215,13 @@ TEST(HostileCurveInput, NonFiniteParametersAreNeverStored) {
     EXPECT_EQ(c->CreateKey(kNaN, 0), 0u);
     EXPECT_EQ(c->CreateKey(-kInf, 0), 0u);
     EXPECT_EQ(c->CreateNonModifyingKey(kInf, 1), 0u);
+    // Folding into a period from the lowest double overflows: no key may come of it.
+    std::unique_ptr<ZvBaseFCurve> wide(c->Clone());
+    wide->CreateKey(-DBL_MAX, 0);
+    wide->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    wide->CreateNonModifyingKey(1e308, 0);
+    for (double p : KeysOf(*wide))
+      EXPECT_TRUE(std::isfinite(p)) << c->GetKind();
     EXPECT_EQ(c->ShiftParameters(kInf), 0u);
     EXPECT_EQ(c->RemoveHead(kNaN), 0u);
     EXPECT_EQ(c->RemoveTail(kInf), 0u);
@@ -217,6 +255,114 @@ TEST(HostileCurveInput, KeyQueriesAtNaNFindNoKey) {
     EXPECT_EQ(c->RemoveKey(kNaN, 1.0), 0u);
     EXPECT_EQ(c->GetNumKeys(), 3u);
   }
+}
+
+TEST(HostileCurveInput, RotationSplicesRefuseWhatWouldBreakKeyOrder) {
+  const auto rotation = [](std::vector<double> at) {
+    std::unique_ptr<ZvQuatFCurve> c(new ZvQuatFCurve(0));
+    for (double t : at)
+      c->CreateKey(t, t);
+    return c;
+  };
+  // Ends closer than the key tolerance find one key: nothing is cut, and the call returns.
+  auto narrow = rotation({31.5});
+  ZvQuatFCurve out(0);
+  EXPECT_EQ(narrow->Cut(-0.0, 5e-324, out), 1u);
+  EXPECT_EQ(KeysOf(*narrow), (std::vector<double>{0, 31.5}));
+  // The tail moved by the width of a cut from near the largest double lands on the keys before.
+  auto wide = rotation({0, 2, 3});
+  EXPECT_EQ(wide->Cut(1, 1e308, out), 0u);
+  EXPECT_EQ(KeysOf(*wide), (std::vector<double>{0, 2, 3}));
+  // A paste far to the left moves the tail onto one parameter.
+  auto pasted = rotation({0, 1, 2});
+  EXPECT_EQ(pasted->Paste(*rotation({0, 1}), -1e156, 0.5), 0u);
+  EXPECT_EQ(KeysOf(*pasted), (std::vector<double>{0, 1, 2}));
+  EXPECT_EQ(pasted->ScaleAndOffsetParameters(-DBL_MAX, DBL_MAX, kNaN, 2, 0, 0, 0,
+                                             ZvBaseFCurve::BottomHandle),
+            0u);
+  EXPECT_EQ(pasted->ScaleAndOffsetParameters(0, 2, 0, DBL_MAX, 0, 0, 0, ZvBaseFCurve::BottomHandle),
+            0u);
+  EXPECT_EQ(KeysOf(*pasted), (std::vector<double>{0, 1, 2}));
+  // A merge onto a parameter beyond the largest float from every key has no key to take the
+  // attributes from.
+  auto far = rotation({0, 1});
+  EXPECT_EQ(far->MergeAndCreateNonModifyingKey(-10, 11, -DBL_MAX, 0, 0, 1, 1), 1u);
+  EXPECT_EQ(KeysOf(*far), (std::vector<double>{-DBL_MAX}));
+  // Ordinary splices still join: the piece's first key replaces the key it lands on.
+  EXPECT_EQ(pasted->Paste(*rotation({0, 1}), 1, 1), 1u);
+  EXPECT_EQ(KeysOf(*pasted), (std::vector<double>{0, 1, 2, 3}));
+  EXPECT_EQ(pasted->Append(*rotation({10, 11})), 1u);
+  EXPECT_EQ(KeysOf(*pasted), (std::vector<double>{0, 1, 2, 3, 4}));
+}
+
+TEST(HostileCurveInput, LargeSplicesResamplingsAndReadsTakeLinearTime) {
+  // 2^17 keys: linear work takes a fraction of a second, work that moves the tail once per key or
+  // walks the keys once per key takes minutes. The bound leaves room for sanitizers and
+  // emulators.
+  const double n = 131072;
+  const auto start = std::chrono::steady_clock::now();
+  for (auto& c : AllKinds({0, 1})) {
+    SCOPED_TRACE(c->GetKind());
+    ASSERT_EQ(c->ResampleSequence(0, n, 1, 0, 0), 1u);
+    std::unique_ptr<ZvBaseFCurve> piece(c->Clone());
+    ASSERT_EQ(c->Paste(*piece, 10.5, 10.5), 1u);
+    EXPECT_EQ(c->GetNumKeys(), 2 * n + 2);
+    ASSERT_EQ(c->Append(*piece), 1u);
+    const std::vector<unsigned char> block = BlockOf(*c);
+    unsigned int consumed = 0;
+    std::unique_ptr<ZvBaseFCurve> back(
+        ZvBaseFCurve_CreateFromBuffer(block.data(), block.size(), consumed));
+    ASSERT_NE(back, nullptr);
+    EXPECT_EQ(back->GetNumKeys(), c->GetNumKeys());
+    ExpectAscending(KeysOf(*back));
+  }
+  EXPECT_LT(std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count(), 30.0);
+}
+
+TEST(HostileCurveInput, CycleSnapshotsAreBoundedByTheKeyCap) {
+  std::vector<double> at;
+  for (int i = 0; i < 4096; ++i)
+    at.push_back(i);
+  for (auto& c : AllKinds(at, false)) {
+    SCOPED_TRACE(c->GetKind());
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    // 1e4 periods of 4096 keys: 4e7 keys, refused before any is made.
+    std::unique_ptr<ZvBaseFCurve> huge(
+        c->SnapShot(0, 4095.0 * 1e4, ZvBaseFCurve::ConstantExtrapolation));
+    EXPECT_EQ(huge, nullptr);
+    std::unique_ptr<ZvBaseFCurve> some(
+        c->SnapShot(0, 4095.0 * 10, ZvBaseFCurve::ConstantExtrapolation));
+    ASSERT_NE(some, nullptr);
+    EXPECT_EQ(some->GetNumKeys(), 4095u * 10 + 1);
+  }
+}
+
+TEST(HostileCurveInput, CycleSnapshotsFarFromTheOriginReturn) {
+  // Periods are counted near 1e17 there, where adding one rounds back to the same count.
+  for (auto& c : AllKinds({0, 2, 7}, false)) {
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    for (double at : {1e18, -1e18}) {
+      std::unique_ptr<ZvBaseFCurve> snap(
+          c->SnapShot(at, at + 1e4, ZvBaseFCurve::LinearExtrapolation));
+      if (snap) ExpectAscending(KeysOf(*snap));
+      snap.reset(c->SnapShot(at, at, ZvBaseFCurve::ConstantExtrapolation));
+      if (snap) ExpectAscending(KeysOf(*snap));
+    }
+  }
+}
+
+TEST(HostileCurveInput, EditedStandardCurvesWriteBlocksThatReadBackEqual) {
+  // A refitted run pasted back joins at keys whose handles may no longer agree; a block read
+  // back claims continuity only where they do, so the curve must not claim it either.
+  ZvStdFCurve c;
+  ASSERT_EQ(c.ResampleSequence(1e-7, -32, -32, 1, 0), 1u);
+  c.ReduceNumKeys(-32, -22.75, -32);
+  const std::vector<unsigned char> block = BlockOf(c);
+  unsigned int consumed = 0;
+  std::unique_ptr<ZvBaseFCurve> back(
+      ZvBaseFCurve_CreateFromBuffer(block.data(), block.size(), consumed));
+  ASSERT_NE(back, nullptr);
+  EXPECT_EQ(BlockOf(*back), block);
 }
 
 }  // namespace
