@@ -146,8 +146,13 @@ int ClipToShape(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int (
   return 1;
 }
 
+// The filter's radius is counted in an int and its buffers grow with the square of the raster
+// widened by it: a wider feather is refused rather than cast out of range.
+constexpr double kMaxFeatherWidth = 1048576.0;
+
 template <class T>
 int SoftFillPath(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int (*callback)()) {
+  if (!(gc.featherInner + gc.featherOuter <= kMaxFeatherWidth)) return 0;
   if (!path.IsRasterExtentIntersecting(gc, raster.GetExtent2f())) return 0;
   CFillContext ctx;
   ZvFillBox box;

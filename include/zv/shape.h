@@ -101,6 +101,8 @@ class ZV_API ZvShape2f {
                      const IntBbox2l* box) const = 0;
   virtual int AAFill(const ZvGC& gc, ZvRaster<short>& raster, int (*callback)(),
                      const IntBbox2l* box) const = 0;
+  // SoftFill blurs over gc.featherInner + gc.featherOuter pixels; a width that is no number or
+  // above 2^20 pixels is refused (0, raster untouched).
   virtual int SoftFill(const ZvGC& gc, ZvRaster<unsigned char>& raster,
                        int (*callback)()) const = 0;
   virtual int SoftFill(const ZvGC& gc, ZvRaster<float>& raster, int (*callback)()) const = 0;

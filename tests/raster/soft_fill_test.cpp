@@ -237,4 +237,10 @@ TEST(SoftFill, CallbackEndsTheFillAndAMissedRasterIsLeftAlone) {
   ZvRaster<unsigned char> far(40, 40, 5);
   EXPECT_EQ(Disc(200, 200, 10).SoftFill(gc, far, nullptr), 0);
   EXPECT_TRUE(far.AllPixelValuesAre(5));
+  // A feather too wide for the filter's counts, or no number, is refused untouched.
+  for (double width : {1e300, std::nan("")}) {
+    gc.featherInner = width;
+    EXPECT_EQ(disc.SoftFill(gc, far, nullptr), 0);
+    EXPECT_TRUE(far.AllPixelValuesAre(5));
+  }
 }
