@@ -145,6 +145,23 @@ TEST(StdCurveBuffer, RandomCurvesComeBackEqual) {
   }
 }
 
+TEST(StdCurveBuffer, FiniteExtremesOfKeyFieldsWriteUnchanged) {
+  // Only an all-ones exponent is not finite: the largest double, the smallest subnormal and a
+  // negative zero must come back bit for bit.
+  StdFields f;
+  f.readOnly = 1;
+  f.keys[0].left = -0.0;
+  f.keys[0].right = std::numeric_limits<double>::denorm_min();
+  f.keys[1].left = std::numeric_limits<double>::max();
+  f.keys[1].right = std::numeric_limits<double>::lowest();
+  const ByteVec block = StdBlock(264, f);
+  // The written block only adds the four zeroed tail bytes, which its length word counts.
+  const ByteVec written = BlockOf(Read(block));
+  ASSERT_EQ(written.size(), block.size() + 4);
+  EXPECT_EQ(ByteVec(written.begin() + 4, written.end() - 4),
+            ByteVec(block.begin() + 4, block.end()));
+}
+
 TEST(StdCurveBuffer, WritingDropsKeysOutOfOrderWithTheirUserData) {
   // A foreign block may hold keys in any order; the curve reads them as they are and writes
   // only those above the last kept one.
