@@ -197,7 +197,9 @@ class CFCKeySearch : public Store {
         folded = std::fabs(w) <= 1e-9 ? last : last - w;
       }
     }
-    if (folded < first) folded = first;
+    // A period too small for the distance (a subnormal span, a parameter near the largest
+    // double) leaves no number of periods to count: such a parameter folds onto the first key.
+    if (!(folded >= first)) folded = first;
     if (folded > last) folded = last;
     return folded;
   }

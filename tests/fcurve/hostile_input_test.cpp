@@ -156,6 +156,15 @@ TEST(HostileCurveInput, KeyReductionReturnsNearTheLargestDouble) {
     for (size_t i = 1; i < k.size(); ++i)
       EXPECT_LT(k[i - 1], k[i]);
   }
+  // Keys scaled to a few subnormals apart: a far bound is more periods away than a double can
+  // count.
+  for (auto& c : AllKinds({-20, -9, -1, 8, 24})) {
+    c->ScaleParameterAxis(4.9406564584124654e-324);
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    c->ReduceNumKeys(-5e187, -5e187, 1e214);
+    c->ReduceNumKeys(-5e187, 5e187, 1.0);
+    ExpectAscending(KeysOf(*c));
+  }
 }
 
 TEST(HostileCurveInput, CycleSamplingOverTooManyPeriodsIsRefused) {
