@@ -38,9 +38,9 @@ void ClearBits(CFCStdKey& k, unsigned short bits) {
 }
 
 // Handles at the thirds toward the neighbours when the curve asks for that.
-void ReapplyHandleConstraint(ZvStdFCurveImpl& s) {
+void ReapplyHandleConstraint(ZvStdFCurveImpl& s, unsigned int from = 0) {
   if (!s.defaultBezierTangentConstraint) return;
-  for (unsigned int i = 0; i < s.keys.size; ++i) {
+  for (unsigned int i = from; i < s.keys.size; ++i) {
     const ZvPoint2<double> l = s.keys[i].leftTangent, r = s.keys[i].rightTangent;
     s.SetActualLeftTgt(i, l);
     s.SetActualRightTgt(i, r);
@@ -271,13 +271,16 @@ unsigned int ZvStdFCurve::Append(const ZvBaseFCurve& source) {
     }
     return 1;
   }
-  const ZvStdFCurve saved(*this);
-  if (!s.SpliceAfter(s.keys.size - 1, p, piece, false, *this)) return 0;
-  // Far from the origin the piece's keys, moved to the last key, can round onto each other.
-  if (!s.KeysAreOrdered()) {
-    Set(saved);
-    return 0;
-  }
-  ReapplyHandleConstraint(s);
+  // Far from the origin the piece's keys, moved to the last key, can round onto each other:
+  // found before anything changes, so that appending stays proportional to the piece (a cycle
+  // snapshot appends period after period).
+  const unsigned int last = s.keys.size - 1;
+  const double dx = s.keys[last].parameter - p.keys[0].parameter;
+  const bool ordered = ZvStdFCurveImpl::WouldBeOrdered(p.keys.size, [&](unsigned int j) {
+    return j == 0 ? s.keys[last].parameter : p.keys[j].parameter + dx;
+  });
+  if (!ordered || !s.SpliceAfter(last, p, piece, false, *this)) return 0;
+  // Only the joined key and the keys after it have new neighbours.
+  ReapplyHandleConstraint(s, last);
   return 1;
 }

@@ -130,6 +130,10 @@ TEST(HostileCurveInput, WholeCurveMovesRefuseToMergeOrOverflowKeys) {
   ExpectRefusedUnchanged({0, 1, 1e17}, [](ZvBaseFCurve& c) { return c.MirrorParameters(); });
   ExpectRefusedUnchanged({DBL_MAX / 2, DBL_MAX},
                          [](ZvBaseFCurve& c) { return c.MirrorParameters(); });
+  // Part of the keys scaled about a pivot at the far left: the last key overflows.
+  ExpectRefusedUnchanged({-32, -14, -13, 0}, [](ZvBaseFCurve& c) {
+    return c.ScaleAndOffsetParameters(0, 1e18, -DBL_MAX, 2, 0, 0, 0, ZvBaseFCurve::BottomHandle);
+  });
 }
 
 TEST(HostileCurveInput, KeyReductionReturnsNearTheLargestDouble) {
@@ -165,6 +169,26 @@ TEST(HostileCurveInput, KeyReductionReturnsNearTheLargestDouble) {
     c->ReduceNumKeys(-5e187, 5e187, 1.0);
     ExpectAscending(KeysOf(*c));
   }
+}
+
+TEST(HostileCurveInput, DrawingsAtATinyToleranceSkipPiecesOutsideTheBox) {
+  // Cubic segments flattened at 1e-15 take a million points each; 2,000 periods of them all
+  // lie below the box, so the drawing is empty and must not compute them.
+  ZvStdFCurve c;
+  c.CreateKey(0, 0);
+  c.CreateKey(0.25, 0.5);
+  c.CreateKey(0.5, 0);
+  c.SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+  ZvExtent2<double> box;
+  box.AddPoint(ZvPoint2<double>{0, 1});
+  box.AddPoint(ZvPoint2<double>{1000, DBL_MAX});
+  ZvPoint2dArray points;
+  ZvPointTagArray tags;
+  ZvBoolArray extrapolated;
+  const auto start = std::chrono::steady_clock::now();
+  EXPECT_EQ(c.FlattenFromTo(box, ZvTransfo4(), 1e-15, points, tags, extrapolated, 0), 1u);
+  EXPECT_EQ(points.size, 0u);
+  EXPECT_LT(std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count(), 5.0);
 }
 
 TEST(HostileCurveInput, CycleSamplingOverTooManyPeriodsIsRefused) {
@@ -326,6 +350,18 @@ TEST(HostileCurveInput, LargeSplicesResamplingsAndReadsTakeLinearTime) {
     ExpectAscending(KeysOf(*back));
   }
   EXPECT_LT(std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count(), 30.0);
+  // A snapshot of many short periods joins them one after the other: 10^5 periods take
+  // milliseconds, rescanning the snapshot at each takes many seconds.
+  const auto snapStart = std::chrono::steady_clock::now();
+  for (auto& c : AllKinds({0, 1}, false)) {
+    SCOPED_TRACE(c->GetKind());
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    std::unique_ptr<ZvBaseFCurve> snap(c->SnapShot(0, 99999, ZvBaseFCurve::CycleExtrapolation));
+    ASSERT_NE(snap, nullptr);
+    EXPECT_EQ(snap->GetNumKeys(), 100000u);
+  }
+  EXPECT_LT(std::chrono::duration<double>(std::chrono::steady_clock::now() - snapStart).count(),
+            5.0);
 }
 
 TEST(HostileCurveInput, CycleSnapshotsAreBoundedByTheKeyCap) {
