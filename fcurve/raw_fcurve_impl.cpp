@@ -8,7 +8,7 @@
 
 bool ZvRawFCurveImpl::KeysAreOrdered() const {
   for (unsigned int i = 0; i < keys.size; ++i) {
-    if (std::isnan(keys[i].value) || std::isnan(keys[i].parameter)) return false;
+    if (std::isnan(keys[i].value) || !std::isfinite(keys[i].parameter)) return false;
     if (i > 0 && !(keys[i].parameter > keys[i - 1].parameter)) return false;
   }
   return true;

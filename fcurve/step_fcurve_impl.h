@@ -68,12 +68,6 @@ class ZvStepFCurveImpl : public CFCBaseImpl<int, CFCStepKey, CFCKeyStoreA<int, C
       if (GetKeyFlags(i) & bits) return true;
     return false;
   }
-
-  bool KeysAreOrdered() const {
-    for (unsigned int i = 1; i < keys.size; ++i)
-      if (!(keys[i].parameter > keys[i - 1].parameter)) return false;
-    return true;
-  }
 };
 
 #endif
