@@ -52,6 +52,23 @@ bool ControlBoxInside(const ZvPoint2<double>* p, const ZvExtent2<double>& extent
   return true;
 }
 
+// Whether the curve lies wholly on the far side of one of the extent's edges, by a margin that
+// covers the rounding of the flattened points and the clip's own tolerance. The curve stays
+// within its control points, so every chord of its flattening would be clipped away: a drawing
+// mostly outside its box, or a fill under a large scale, then skips flattening what it would
+// drop.
+bool ControlBoxOutside(const ZvPoint2<double>* p, const ZvExtent2<double>& extent) {
+  double lx = p[0].x, hx = lx, ly = p[0].y, hy = ly, reach = 0.0;
+  for (int i = 0; i < 4; ++i) {
+    lx = std::fmin(lx, p[i].x), hx = std::fmax(hx, p[i].x);
+    ly = std::fmin(ly, p[i].y), hy = std::fmax(hy, p[i].y);
+    reach = std::fmax(reach, std::fmax(std::fabs(p[i].x), std::fabs(p[i].y)));
+  }
+  const double margin = 1e-8 + 1e-6 * reach;
+  return lx > extent.xmax + margin || hx < extent.xmin - margin || ly > extent.ymax + margin ||
+         hy < extent.ymin - margin;
+}
+
 // The monotone, non-degenerate shape the power-law walk expects; anything else is drawn as
 // its chord.
 bool IsWellFormedGamma(const ZvPoint2<double>* p, double tolerance) {
@@ -83,6 +100,7 @@ void ZvBezierTool_ClipAndFlattenCubic2d(const ZvPoint2<double>* p, double tolera
   if (!p || !points || !tags || !flags || extent.kind == ZvExtent2<double>::Empty) return;
   const ZvPoint2<double> c[4] = {p[0], p[1], p[2], p[3]};
   if (extent.kind != ZvExtent2<double>::Infinite && !ControlBoxInside(c, extent)) {
+    if (ControlBoxOutside(c, extent)) return;
     ZvPoint2dArray line(32);
     ZvBezierTool_FlattenCubic2d(c, tolerance, &line, 0);
     for (unsigned int i = 1; i < line.size; ++i) {

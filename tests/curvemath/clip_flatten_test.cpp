@@ -3,6 +3,8 @@
 #include <zv/bezier_tool.h>
 
 #include <cmath>
+#include <random>
+#include <utility>
 
 namespace {
 
@@ -114,6 +116,36 @@ TEST(ClipAndFlattenCubic2d, CurveLeavingTheExtentSplitsIntoClippedPieces) {
   Tagged outside;
   outside.ClipAndFlatten(kCurve, Extent(200, 200, 300, 300));
   EXPECT_EQ(outside.points.size, 0u);
+}
+
+// A curve wholly beyond one side of the extent is not flattened at all; the result must be the
+// plain one (every chord of the whole flattening clipped in turn) also for curves that end a
+// hair's breadth from the side, at any scale.
+TEST(ClipAndFlattenCubic2d, SkippingCurvesBeyondASideChangesNothing) {
+  std::mt19937 rng(11);
+  std::uniform_real_distribution<double> u(-1.0, 1.0);
+  for (int round = 0; round < 4000; ++round) {
+    const double scale = std::pow(10.0, round % 13 - 6);
+    const Extent box(-scale, -scale, scale, scale);
+    // Control points around a side, some exactly on it or one rounding step beyond.
+    P2 c[4];
+    for (P2& q : c) {
+      q = {u(rng) * scale, scale + u(rng) * scale * (round % 3 == 0 ? 1e-9 : 0.5)};
+      if (round % 7 == 0) q.y = std::nextafter(scale, 2 * scale);
+    }
+    if (round % 2) std::swap(c[0].x, c[0].y);
+    Tagged fast, plain;
+    fast.ClipAndFlatten(c, box);
+    ZvPoint2dArray line(32);
+    ZvBezierTool_FlattenCubic2d(c, 0.25, &line, 0);
+    for (unsigned int i = 1; i < line.size; ++i)
+      plain.ClipAndAdd(line[i - 1], line[i], box);
+    ASSERT_EQ(fast.points.size, plain.points.size) << round;
+    for (unsigned int i = 0; i < fast.points.size; ++i) {
+      ExpectSame(fast.points[i], plain.points[i]);
+      EXPECT_EQ(fast.tags[i], plain.tags[i]);
+    }
+  }
 }
 
 // Gamma piece y = 1 - x^2 over [0, 1], visible from x = 0.25 to x = 0.71.
