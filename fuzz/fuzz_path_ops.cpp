@@ -67,15 +67,18 @@ void Check(const ZvPath2f& path) {
 
 // A flatten's cost grows with the path's size over the tolerance, up to the flatteners' cap of
 // 2^24 points, and sampling's with the size over the spacing, up to 2^24 samples (both caps are
-// tested on their own): steps finer than 1e-3 of the path's size (a path's length can be many
-// times its size) would only measure that cost here. Non-positive and non-finite steps still
-// get through.
+// tested on their own): steps finer than 1e-3 of the size of the path's finite points (a path's
+// length can be many times its size; a point at infinity makes the whole extent infinite, yet
+// the cubics between finite points are still flattened at the tolerance asked) would only
+// measure that cost here. Non-positive and non-finite steps still get through.
 double Tolerance(const ZvPath2f& path, double asked) {
-  ZvExtent2<float> box;
-  path.GetExtent(box);
-  const double size =
-      std::fmax(std::fabs(double(box.xmax) - box.xmin), std::fabs(double(box.ymax) - box.ymin));
-  return std::isfinite(size) ? std::fmax(asked, size * 1e-3) : asked;
+  ZvExtent2<double> box;
+  for (unsigned int i = 0; i < path.NumPoints(); ++i) {
+    const ZvPoint2<float> q = path.GetPoint(i);
+    if (std::isfinite(q.x) && std::isfinite(q.y)) box.AddPoint(ZvPoint2<double>{q.x, q.y});
+  }
+  if (box.kind == ZvExtent2<double>::Empty) return asked;
+  return std::fmax(asked, std::fmax(box.xmax - box.xmin, box.ymax - box.ymin) * 1e-3);
 }
 
 void Step(ZvPath2f& path, Input& in) {
@@ -184,7 +187,7 @@ void Step(ZvPath2f& path, Input& in) {
       break;
     }
     case 21:
-      path.GetNodeNormalizedArcLength(in.Index(n), in.Number());
+      path.GetNodeNormalizedArcLength(in.Index(n), Tolerance(path, in.Number()));
       break;
     case 22: {
       gc.featherInner = in.Number();
@@ -200,6 +203,13 @@ void Step(ZvPath2f& path, Input& in) {
 }
 
 }  // namespace
+
+// The memory limit is meant for what the library holds. AddressSanitizer keeps freed blocks in
+// quarantine to catch late uses, 256 MB of them by default, which after a few large flattens or
+// curves is most of the process; a smaller quarantine still catches a use soon after a free.
+extern "C" const char* __asan_default_options() {
+  return "quarantine_size_mb=32";
+}
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   Input in(data, size);
