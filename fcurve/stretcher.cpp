@@ -277,14 +277,11 @@ int ZvFCurveStretcherImpl::Update(ZvPoint2<double>& translation, double viewStar
   if (!std::isfinite(InParameter() ? translation.x : translation.y)) return 0;
   ZvFCurveLockGuard guard(m_curve);
   if (m_keys->ReadOnly()) return 0;
+  ZvPoint2<double> asked = translation;
   double s = 1.0;
-  const int cut = ClampScale(translation, s);
-  for (double t : m_currentParameters)
-    oldParameters.Add(t);
-
+  const int cut = ClampScale(asked, s);
   const std::size_t count = m_moved.size();
   std::vector<CFCKeyPlace> places(count);
-  CurveEnds ends(m_curve);
   for (std::size_t i = 0; i < count; ++i) {
     const Moved& m = m_moved[i];
     const double sx = m.scaled ? s : 1.0;
@@ -293,8 +290,16 @@ int ZvFCurveStretcherImpl::Update(ZvPoint2<double>& translation, double viewStar
     if (sx < 0) std::swap(left, right);
     const double leftScale = m.leftScaled ? s : 1.0, rightScale = m.rightScaled ? s : 1.0;
     places[i] = CFCKeyPlace{m.parameter.At(s), right, left, sx, leftScale, rightScale};
-    ends.Note(m_currentParameters[i], places[i].parameter);
+    // A drag across most of the double range scales past it: refused, nothing moves.
+    if (!std::isfinite(places[i].parameter) || !std::isfinite(left) || !std::isfinite(right))
+      return 0;
   }
+  translation = asked;
+  for (double t : m_currentParameters)
+    oldParameters.Add(t);
+  CurveEnds ends(m_curve);
+  for (std::size_t i = 0; i < count; ++i)
+    ends.Note(m_currentParameters[i], places[i].parameter);
   m_ascending.resize(count);
   for (unsigned int i = 0; i < count; ++i)
     m_ascending[i] = i;

@@ -1,6 +1,7 @@
 // Curves under extreme arguments: an operation that cannot keep the keys strictly increasing
 // and finite refuses and leaves the curve as it was, and nothing runs or allocates without
 // bound.
+#include <zv/fcurve_stretcher.h>
 #include <zv/quat_fcurve.h>
 #include <zv/raw_fcurve.h>
 #include <zv/std_fcurve.h>
@@ -189,6 +190,24 @@ TEST(HostileCurveInput, DrawingsAtATinyToleranceSkipPiecesOutsideTheBox) {
   EXPECT_EQ(c.FlattenFromTo(box, ZvTransfo4(), 1e-15, points, tags, extrapolated, 0), 1u);
   EXPECT_EQ(points.size, 0u);
   EXPECT_LT(std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count(), 5.0);
+}
+
+TEST(HostileCurveInput, StretchesPastTheDoubleRangeAreRefused) {
+  // The left side dragged from near the lowest double by as much again: the scale is infinite,
+  // and the key at the pivot would become 0 * infinity.
+  for (auto& c : AllKinds({-32, 5})) {
+    SCOPED_TRACE(c->GetKind());
+    ZvExtent2<double> box(-DBL_MAX, -1e6, -13.25, 1e6), moved, changed;
+    ZvDoubleArray keys, before, after;
+    keys.Add(-32);
+    ZvFCurveStretcher stretch(*c, box, keys, ZvExtent2<double>(), ZvPoint2<double>{-32, 0},
+                              ZvBaseFCurve::LeftHandle, 0, 0.001);
+    ZvPoint2<double> drag{-DBL_MAX, 0};
+    int clamped = 0;
+    EXPECT_EQ(stretch.Update(drag, -1e9, 1e9, before, after, changed, moved, clamped), 0);
+    EXPECT_EQ(drag.x, -DBL_MAX);
+    EXPECT_EQ(KeysOf(*c), (std::vector<double>{-32, 5}));
+  }
 }
 
 TEST(HostileCurveInput, CycleSamplingOverTooManyPeriodsIsRefused) {
