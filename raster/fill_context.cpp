@@ -107,7 +107,11 @@ int CFillContext::BuildTables(const ZvPoint2dArray& points, const ZvPointTagArra
     rings[subpathStart].prev = n - 1;
     rings[n - 1].next = subpathStart;
   }
-  ZvOrderByRisingY(rings.get(), sortedVertices, n, vertices);
+  if (takenByLine) {
+    ZvOrderBySampleLine(rings.get(), sortedVertices, n, vertices);
+  } else {
+    ZvOrderByRisingY(rings.get(), sortedVertices, n, vertices);
+  }
   return n;
 }
 

@@ -60,6 +60,11 @@ class CFillContext {
   // coordinate is not finite. The tables get one slot per input point; bad_alloc propagates.
   int BuildTables(const ZvPoint2dArray& points, const ZvPointTagArray& tags, double scale);
 
+  // Set before BuildTables by fills whose spans set coverage and never add it up: the sorted
+  // records then only need to be grouped by the sample line that takes them (a counting sort by
+  // row), rather than ordered by y.
+  bool takenByLine = false;
+
   // Zeroed coverage rows of cells indexed first..end-1 (row pointers pre-offset by `first`): one
   // row, or three when `three`, and the row of runs.
   void AllocateCoverageRows4x4(int first, int end, bool three);

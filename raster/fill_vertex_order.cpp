@@ -9,6 +9,7 @@
 #include "raster/insertion_sort.h"
 
 #include <algorithm>
+#include <cmath>
 
 namespace {
 bool Before(const CFillSortedVertex& a, const CFillSortedVertex& b) {
@@ -66,4 +67,33 @@ void ZvOrderByRisingY(const CFillSortedVertex* records, CFillSortedVertex* sorte
     if (end - begin > 1) SortBucket(sorted + begin, end - begin);
     begin = end;
   }
+}
+
+void ZvOrderBySampleLine(const CFillSortedVertex* records, CFillSortedVertex* sorted, int n,
+                         const CFillVertex* vertices) {
+  if (n < kFewVertices) {
+    ZvOrderByRisingY(records, sorted, n, vertices);
+    return;
+  }
+  double lo = vertices[0].y, hi = lo;
+  for (int i = 1; i < n; ++i) {
+    lo = std::min(lo, vertices[i].y);
+    hi = std::max(hi, vertices[i].y);
+  }
+  // y - 0.5 is exact below 2^52; rows beyond a few per vertex would make the counts the cost.
+  const double first = std::ceil(lo - 0.5), rows = std::ceil(hi - 0.5) - first + 1.0;
+  if (!(std::fabs(lo) < 0x1p50 && std::fabs(hi) < 0x1p50 && rows <= 4.0 * n + 4096.0)) {
+    ZvOrderByRisingY(records, sorted, n, vertices);
+    return;
+  }
+  const int count = static_cast<int>(rows);
+  auto row = [&](double y) { return static_cast<int>(std::ceil(y - 0.5) - first); };
+  ZvScratchArray<int> starts(ZvScratch_SortCounts, static_cast<std::size_t>(count) + 1);
+  std::fill(starts.get(), starts.get() + count + 1, 0);
+  for (int i = 0; i < n; ++i)
+    ++starts[row(vertices[i].y) + 1];
+  for (int r = 0; r < count; ++r)
+    starts[r + 1] += starts[r];
+  for (int i = 0; i < n; ++i)
+    sorted[starts[row(vertices[i].y)]++] = records[i];
 }

@@ -15,6 +15,9 @@ int FillPath(const ZvPath2f& path, const ZvGC& gc, ZvRaster<T>& raster, int (*ca
              const IntBbox2l* box) {
   if (!path.IsRasterExtentIntersecting(gc, raster.GetExtent2f())) return 0;
   CFillContext ctx;
+  // Both write each span's pixels or coverage bits outright: a sample line's vertices may come in
+  // any order.
+  ctx.takenByLine = true;
   ZvFillBox pixels;
   int numVertices = 0;
   const double scale = K == FillKind::Aliased ? 1.0 : gc.samplingRate;

@@ -1,4 +1,5 @@
-// Polygons straight into a fill's tables, bypassing paths and flattening.
+// Polygons straight into a fill's tables, bypassing paths and flattening. Vertices are sorted by
+// y unless `byLine` asks for the grouping by sample line that the path fills use.
 #ifndef ZV_TESTS_RASTER_FILL_POLYGONS_H
 #define ZV_TESTS_RASTER_FILL_POLYGONS_H
 
@@ -32,22 +33,24 @@ inline ZvFillBox WholeRaster(int w, int h) {
 
 template <class T>
 int FillRings(const std::vector<Ring>& rings, int rule, ZvRaster<T>& raster, const ZvFillBox& box,
-              int (*callback)() = nullptr) {
+              int (*callback)() = nullptr, bool byLine = false) {
   ZvPoint2dArray points;
   ZvPointTagArray tags;
   ToArrays(rings, points, tags);
   CFillContext ctx;
+  ctx.takenByLine = byLine;
   const int n = ctx.BuildTables(points, tags, 1.0);
   return ZvScanlineFill(ctx, n, box, rule, raster, callback);
 }
 
 template <class T>
 int AAFillRings(const std::vector<Ring>& rings, const ZvGC& gc, ZvRaster<T>& raster,
-                int (*callback)() = nullptr) {
+                int (*callback)() = nullptr, bool byLine = false) {
   ZvPoint2dArray points;
   ZvPointTagArray tags;
   ToArrays(rings, points, tags);
   CFillContext ctx;
+  ctx.takenByLine = byLine;
   const int n = ctx.BuildTables(points, tags, gc.samplingRate);
   return ZvAntialiasedFill(ctx, n, WholeRaster(raster.GetWidth(), raster.GetHeight()), gc, raster,
                            callback);
