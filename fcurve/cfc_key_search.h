@@ -216,6 +216,9 @@ class CFCKeySearch : public Store {
     const double first = keys[0].parameter, last = keys[n - 1].parameter;
     double startCycle, endCycle;
     const double foldedStart = CycleOffsetFold(start, startCycle, true);
+    // A single parameter on a period boundary folds, as an end, onto the end of the period
+    // before: it is one point, not a range across the boundary.
+    if (start == end) return edit(foldedStart, foldedStart);
     const double foldedEnd = CycleOffsetFold(end, endCycle, false);
     if (startCycle == endCycle) return edit(foldedStart, foldedEnd);
     if (end - start <= last - first) return edit(first, foldedEnd) && edit(foldedStart, last);

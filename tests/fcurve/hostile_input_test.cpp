@@ -210,6 +210,17 @@ TEST(HostileCurveInput, StretchesPastTheDoubleRangeAreRefused) {
   }
 }
 
+TEST(HostileCurveInput, ResamplingOnePointOnAPeriodBoundaryLeavesTheOtherKeys) {
+  // The point folds, as an end, onto the end of the period before: it is no range across the
+  // boundary, whose two pieces would be the whole million-unit period twice.
+  for (auto& c : AllKinds({-14.25, 1e6}, false)) {
+    SCOPED_TRACE(c->GetKind());
+    c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+    EXPECT_EQ(c->ResampleSequence(-14.25, -14.25, 1.0, 0, 0), 1u);
+    EXPECT_EQ(KeysOf(*c), (std::vector<double>{-14.25, 1e6}));
+  }
+}
+
 TEST(HostileCurveInput, CycleSamplingOverTooManyPeriodsIsRefused) {
   for (auto& c : AllKinds({2, 4, 15}, false)) {
     c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
