@@ -5,11 +5,12 @@
 // give the same bytes; hangs and runaway memory are caught by running with -timeout=1
 // -rss_limit_mb=512.
 //
-// The library accepts up to 2^20 keys or samples a call, at a cost in proportion: a second and
-// more under the sanitizers. So that one input stays well within its second while a call that
-// is slower than linear still stands out, an input ends once its curve holds more than
-// kMaxKeys keys, and samplings finer than kMaxSamples samples are coarsened; a sampling past the
-// library's cap still goes through as it is, to be refused.
+// The library accepts up to 2^20 keys, samples or repeated keys a call, at a cost in
+// proportion: a second and more under the sanitizers. So that one input stays well within its
+// second while a call that is slower than linear still stands out, an input ends once its curve
+// holds more than kMaxKeys keys, samplings finer than kMaxSamples samples are coarsened and
+// cycle drawings narrowed to as many repeated keys; a call past the library's caps still goes
+// through as it is, to be refused.
 //
 // Input: one byte picks the curve kind, then each step is one byte for the call and as many
 // more as its arguments take.
@@ -75,6 +76,23 @@ double Coarsened(double from, double to, double step) {
   const double count = span / std::fabs(step);
   if (!(count > kMaxSamples) || count > kRefusedSamples) return step;
   return std::copysign(span / kMaxSamples, step);
+}
+
+// Under the cycle methods a drawing repeats every key once per period in the box. A box showing
+// more than kMaxSamples repeated keys is narrowed to about that many, unless the library
+// refuses the drawing anyway (a million periods or 2^20 repeated keys).
+void NarrowCycleBox(const ZvBaseFCurve& c, const ZvTransfo4& t, ZvExtent2<double>& box) {
+  const ZvBaseFCurve::ExtrapolationMethod m = c.GetExtrapolationMethod();
+  double first = 0, last = 0;
+  if ((m != ZvBaseFCurve::CycleExtrapolation && m != ZvBaseFCurve::CycleWithOffsetExtrapolation) ||
+      c.GetNumKeys() < 2 || !c.GetSmallestKeyParameter(first) || !c.GetLargestKeyParameter(last)) {
+    return;
+  }
+  const double scale = t.GetMatrixPtr()[0];
+  const double periods = std::fabs((box.xmax - box.xmin) / (scale * (last - first)));
+  const double pieces = periods * c.GetNumKeys();
+  if (!(pieces > kMaxSamples) || periods > 1e6 || pieces > kRefusedSamples / 4.0) return;
+  box.xmax = box.xmin + (box.xmax - box.xmin) * (kMaxSamples / pieces);
 }
 
 class Script {
@@ -224,6 +242,7 @@ void Step(ZvBaseFCurve& c, Script& s) {
       ZvPoint2dArray points;
       ZvPointTagArray tags;
       ZvBoolArray extrapolated;
+      NarrowCycleBox(c, t, box);
       c.FlattenFromTo(box, t, s.Number(), points, tags, extrapolated, f1);
       ZvPoint2dArray all;
       ZvPointTagArray allTags;
