@@ -208,21 +208,25 @@ class CFCKeySearch : public Store {
   // cycle methods (two keys or more) the interval is folded into the keyed range first - within
   // one period the folded interval; across a period boundary the two folded pieces up to the
   // ends of the keys; over more than a period the whole key range. Otherwise [start, end]
-  // itself. Stops at the first part that answers 0 and answers 0 then.
+  // itself. A reversed interval covers [end, start] and gets its pieces reversed. Stops at the
+  // first part that answers 0 and answers 0 then.
   template <class Edit>
   int ForFoldedRanges(double start, double end, Edit edit) const {
     const unsigned int n = keys.size;
     if ((this->extrapolation != 3 && this->extrapolation != 4) || n < 2) return edit(start, end);
+    const bool reversed = end < start;
+    const double lo = reversed ? end : start, hi = reversed ? start : end;
+    auto piece = [&](double a, double b) { return reversed ? edit(b, a) : edit(a, b); };
     const double first = keys[0].parameter, last = keys[n - 1].parameter;
-    double startCycle, endCycle;
-    const double foldedStart = CycleOffsetFold(start, startCycle, true);
+    double loCycle, hiCycle;
+    const double foldedLo = CycleOffsetFold(lo, loCycle, true);
     // A single parameter on a period boundary folds, as an end, onto the end of the period
     // before: it is one point, not a range across the boundary.
-    if (start == end) return edit(foldedStart, foldedStart);
-    const double foldedEnd = CycleOffsetFold(end, endCycle, false);
-    if (startCycle == endCycle) return edit(foldedStart, foldedEnd);
-    if (end - start <= last - first) return edit(first, foldedEnd) && edit(foldedStart, last);
-    return edit(first, last);
+    if (lo == hi) return edit(foldedLo, foldedLo);
+    const double foldedHi = CycleOffsetFold(hi, hiCycle, false);
+    if (loCycle == hiCycle) return piece(foldedLo, foldedHi);
+    if (hi - lo <= last - first) return piece(first, foldedHi) && piece(foldedLo, last);
+    return piece(first, last);
   }
 
   // Key reduction over [start, end] in either order, through ForFoldedRanges: refused on a

@@ -210,7 +210,7 @@ TEST(HostileCurveInput, StretchesPastTheDoubleRangeAreRefused) {
   }
 }
 
-TEST(HostileCurveInput, ResamplingOnePointOnAPeriodBoundaryLeavesTheOtherKeys) {
+TEST(HostileCurveInput, ResamplingAPointOrAReversedIntervalCoversOnlyItsFoldedPart) {
   // The point folds, as an end, onto the end of the period before: it is no range across the
   // boundary, whose two pieces would be the whole million-unit period twice.
   for (auto& c : AllKinds({-14.25, 1e6}, false)) {
@@ -218,6 +218,10 @@ TEST(HostileCurveInput, ResamplingOnePointOnAPeriodBoundaryLeavesTheOtherKeys) {
     c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
     EXPECT_EQ(c->ResampleSequence(-14.25, -14.25, 1.0, 0, 0), 1u);
     EXPECT_EQ(KeysOf(*c), (std::vector<double>{-14.25, 1e6}));
+    // A reversed interval ending on the boundary covers the last 10.25 of the period before,
+    // whose step of 2 goes the other way: its two ends.
+    EXPECT_EQ(c->ResampleSequence(-14.25, -24.5, 2.0, 1, 0), 1u);
+    EXPECT_EQ(KeysOf(*c), (std::vector<double>{-14.25, 1e6 - 10.25, 1e6}));
   }
 }
 
