@@ -141,8 +141,15 @@ struct ObRun {
   int belowCount, belowFirst, belowLast;
 };
 
+struct ObContext;
+// How a closed component reaches its consumer: ObEmitComponent goes through the callback table;
+// ObEmitComponentToPath serves the library's own path table (raster/vect_path.h, userData a
+// VectClosure) with the same calls made directly, which spares two indirect calls a corner.
+using ObEmitter = void (*)(ObContext& ctx, ObComponent* component);
+
 struct ObContext {
   ObCallbackTable table;
+  ObEmitter emit;
   void* userData;
   int margin;  // a run's reach into its neighbour rows; 0 connects shared columns only
   double perimeterThreshold;
@@ -185,5 +192,6 @@ ObActiveWall* ObMakeMerge(ObContext& ctx, ObActiveWall* left, ObActiveWall* righ
 int ObTestContourArea(const ObContext& ctx, const ObContour* contour);
 int ObTestContourPerimeter(const ObContext& ctx, const ObContour* contour);
 void ObEmitComponent(ObContext& ctx, ObComponent* component);
+void ObEmitComponentToPath(ObContext& ctx, ObComponent* component);
 
 #endif

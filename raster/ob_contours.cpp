@@ -1,6 +1,7 @@
 // Closed components: the size tests of their contours, and their emission as pixel-exact
 // polygons through the callback table.
 #include "raster/ob_context.h"
+#include "raster/vect_path.h"
 
 #include <cmath>
 
@@ -37,10 +38,65 @@ int ObTestContourPerimeter(const ObContext& ctx, const ObContour* contour) {
 }
 
 namespace {
-void Lineto(ObContext& ctx, int x, int y) {
+// The calls of the callback table, each entry optional.
+struct TableSink {
+  const ObCallbackTable& table;
+  void* userData;
+  void NewComponent() {
+    if (table.newComponent) table.newComponent(userData);
+  }
+  void Moveto(int x, int y) {
+    if (table.moveto) table.moveto(x, y, userData);
+  }
+  void Lineto(int x, int y) {
+    if (table.lineto) table.lineto(x, y, userData);
+  }
+  void CloseComponent() {
+    if (table.closeComponent) table.closeComponent(userData);
+  }
+};
+
+// The path table's callbacks made directly, with VectLineto's test done on the integer corners.
+// The emitter never repeats a point and draws only horizontal and vertical lines, so
+// ShouldExtendLastSegment, which lengthens the last line when the new point carries it on in its
+// direction, comes down to comparing the headings of the two lines: no float tests, and one
+// branch-free store whether the point is new or moves the last one.
+struct PathSink {
+  VectClosure& closure;
+  int lastX = 0, lastY = 0;
+  int heading = 0;  // of the last line, a bit per sense of each axis; 0 before the first line
+
+  void NewComponent() { VectNewComponent(&closure); }
+  void Moveto(int x, int y) {
+    VectMoveto(x, y, &closure);
+    lastX = x;
+    lastY = y;
+    heading = 0;
+  }
+  void Lineto(int x, int y) {
+    const int dx = x - lastX, dy = y - lastY;
+    const int h = (dx > 0) | (dx < 0) << 1 | (dy > 0) << 2 | (dy < 0) << 3;
+    ZvPoint2fArray& c = closure.contour;
+    if (c.size == c.capacity) {
+      c.Resize(c.size + 1);
+      c.Chop(c.size - 1);
+    }
+    const unsigned int turn = h != heading;
+    c.size += turn;
+    c.data[c.size - 1] = ZvPoint2<float>{static_cast<float>(x), static_cast<float>(y)};
+    closure.emitted += turn;
+    heading = h;
+    lastX = x;
+    lastY = y;
+  }
+  void CloseComponent() { VectCloseComponent(&closure); }
+};
+
+template <class Sink>
+void Lineto(ObContext& ctx, Sink& sink, int x, int y) {
   ctx.penX = x;
   ctx.penY = y;
-  if (ctx.table.lineto) ctx.table.lineto(x, y, ctx.userData);
+  sink.Lineto(x, y);
 }
 
 // Each corner stands for one unit edge along its row, on the left edge of its pixel for corners
@@ -48,7 +104,8 @@ void Lineto(ObContext& ctx, int x, int y) {
 // the first kind and up the second. Joining the unit edges of consecutive corners gives only
 // horizontal and vertical lines, since a wall that steps sideways always has a corner in the
 // row before the step and in the row of it.
-void EmitCorner(ObContext& ctx, const ObVertex* v) {
+template <class Sink>
+void EmitCorner(ObContext& ctx, Sink& sink, const ObVertex* v) {
   int column = v->x - 2;
   switch (v->type) {
     case ObBirthLeft:
@@ -77,13 +134,14 @@ void EmitCorner(ObContext& ctx, const ObVertex* v) {
   ctx.edgeDirection = ctx.direction;
   const int from = ctx.direction > 0 ? v->y - 2 : v->y - 1;
   const int to = ctx.direction > 0 ? v->y - 1 : v->y - 2;
-  if (column != ctx.penX || from != ctx.penY) Lineto(ctx, column, from);
-  Lineto(ctx, column, to);
+  if (column != ctx.penX || from != ctx.penY) Lineto(ctx, sink, column, from);
+  Lineto(ctx, sink, column, to);
 }
 
 // An outer contour starts down the left edge of its first pixel, a hole up the right edge of
 // the pixel left of it.
-void EmitContour(ObContext& ctx, const ObContour* contour, bool hole) {
+template <class Sink>
+void EmitContour(ObContext& ctx, Sink& sink, const ObContour* contour, bool hole) {
   const ObVertex* first = contour->first;
   const int column = hole ? first->x - 1 : first->x - 2;
   const int from = hole ? first->y - 1 : first->y - 2;
@@ -92,24 +150,35 @@ void EmitContour(ObContext& ctx, const ObContour* contour, bool hole) {
   ctx.edgeColumn = column;
   ctx.edgeRow = first->y;
   ctx.edgeDirection = ctx.direction;
-  if (ctx.table.moveto) ctx.table.moveto(column, from, ctx.userData);
-  Lineto(ctx, column, to);
+  sink.Moveto(column, from);
+  Lineto(ctx, sink, column, to);
   for (const ObVertex* v = first->next; v != first; v = v->next)
-    EmitCorner(ctx, v);
-  if (ctx.penX != column || ctx.penY != from) Lineto(ctx, column, from);
+    EmitCorner(ctx, sink, v);
+  if (ctx.penX != column || ctx.penY != from) Lineto(ctx, sink, column, from);
 }
 
 bool Passes(const ObContext& ctx, const ObContour* contour) {
   return ObTestContourArea(ctx, contour) && ObTestContourPerimeter(ctx, contour);
 }
+
+template <class Sink>
+void Emit(ObContext& ctx, Sink& sink, ObComponent* component) {
+  const ObContour* outer = component->contours;
+  if (!Passes(ctx, outer)) return;
+  sink.NewComponent();
+  EmitContour(ctx, sink, outer, false);
+  for (const ObContour* c = outer->next; c != outer; c = c->next)
+    if (Passes(ctx, c)) EmitContour(ctx, sink, c, true);
+  sink.CloseComponent();
+}
 }  // namespace
 
 void ObEmitComponent(ObContext& ctx, ObComponent* component) {
-  const ObContour* outer = component->contours;
-  if (!Passes(ctx, outer)) return;
-  if (ctx.table.newComponent) ctx.table.newComponent(ctx.userData);
-  EmitContour(ctx, outer, false);
-  for (const ObContour* c = outer->next; c != outer; c = c->next)
-    if (Passes(ctx, c)) EmitContour(ctx, c, true);
-  if (ctx.table.closeComponent) ctx.table.closeComponent(ctx.userData);
+  TableSink sink{ctx.table, ctx.userData};
+  Emit(ctx, sink, component);
+}
+
+void ObEmitComponentToPath(ObContext& ctx, ObComponent* component) {
+  PathSink sink{*static_cast<VectClosure*>(ctx.userData)};
+  Emit(ctx, sink, component);
 }
