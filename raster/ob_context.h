@@ -156,10 +156,6 @@ struct ObContext {
   double areaThreshold;
   ObActiveWall* leftSentinel;
   ObActiveWall* rightSentinel;
-  // The emitter's pen and the last unit edge it drew (column, row, direction).
-  int penX, penY;
-  int edgeColumn, edgeRow, edgeDirection;
-  int direction;
 
   ObPool<ObVertex> vertices;
   ObPool<ObEvent> events;

@@ -92,12 +92,26 @@ struct PathSink {
   void CloseComponent() { VectCloseComponent(&closure); }
 };
 
+// The emitter's pen and the last unit edge it drew (column, row, direction), kept apart from the
+// context so that they can live in registers while a contour is walked.
 template <class Sink>
-void Lineto(ObContext& ctx, Sink& sink, int x, int y) {
-  ctx.penX = x;
-  ctx.penY = y;
-  sink.Lineto(x, y);
-}
+struct Pen {
+  Sink& sink;
+  int x, y;
+  int edgeColumn, edgeRow, edgeDirection;
+  int direction;
+
+  void Lineto(int toX, int toY) {
+    x = toX;
+    y = toY;
+    sink.Lineto(toX, toY);
+  }
+};
+
+// What a corner's type says of it: whether it stands on the right edge of its pixel rather than
+// the left, and the sense in which the ring runs there (+1 down, -1 up, 0 as before it).
+const int kOnRightEdge[11] = {0, 0, 1, 1, 0, 0, 1, 1, 0, 0, 1};
+const int kSense[11] = {0, 1, -1, -1, 1, 1, -1, -1, 1, 0, 0};
 
 // Each corner stands for one unit edge along its row, on the left edge of its pixel for corners
 // on walls with the region to their right and on the right edge otherwise; the ring runs down
@@ -105,56 +119,35 @@ void Lineto(ObContext& ctx, Sink& sink, int x, int y) {
 // horizontal and vertical lines, since a wall that steps sideways always has a corner in the
 // row before the step and in the row of it.
 template <class Sink>
-void EmitCorner(ObContext& ctx, Sink& sink, const ObVertex* v) {
-  int column = v->x - 2;
-  switch (v->type) {
-    case ObBirthLeft:
-    case ObSplitRight:
-    case ObDeathLeft:
-    case ObMergeRight:
-      ctx.direction = 1;
-      break;
-    case ObBirthRight:
-    case ObSplitLeft:
-    case ObDeathRight:
-    case ObMergeLeft:
-      ctx.direction = -1;
-      column = v->x - 1;
-      break;
-    case ObStepOnRightSide:
-      column = v->x - 1;
-      break;
-    default:
-      break;
-  }
+void EmitCorner(Pen<Sink>& pen, const ObVertex* v) {
+  const int column = v->x - 2 + kOnRightEdge[v->type];
+  if (kSense[v->type]) pen.direction = kSense[v->type];
   // A corner born and ended in one row doubles its partner's unit edge.
-  if (column == ctx.edgeColumn && v->y == ctx.edgeRow && ctx.direction == ctx.edgeDirection) return;
-  ctx.edgeColumn = column;
-  ctx.edgeRow = v->y;
-  ctx.edgeDirection = ctx.direction;
-  const int from = ctx.direction > 0 ? v->y - 2 : v->y - 1;
-  const int to = ctx.direction > 0 ? v->y - 1 : v->y - 2;
-  if (column != ctx.penX || from != ctx.penY) Lineto(ctx, sink, column, from);
-  Lineto(ctx, sink, column, to);
+  if (column == pen.edgeColumn && v->y == pen.edgeRow && pen.direction == pen.edgeDirection) return;
+  pen.edgeColumn = column;
+  pen.edgeRow = v->y;
+  pen.edgeDirection = pen.direction;
+  const int from = pen.direction > 0 ? v->y - 2 : v->y - 1;
+  const int to = pen.direction > 0 ? v->y - 1 : v->y - 2;
+  if (column != pen.x || from != pen.y) pen.Lineto(column, from);
+  pen.Lineto(column, to);
 }
 
 // An outer contour starts down the left edge of its first pixel, a hole up the right edge of
 // the pixel left of it.
 template <class Sink>
-void EmitContour(ObContext& ctx, Sink& sink, const ObContour* contour, bool hole) {
+void EmitContour(Sink& sink, const ObContour* contour, bool hole) {
   const ObVertex* first = contour->first;
   const int column = hole ? first->x - 1 : first->x - 2;
   const int from = hole ? first->y - 1 : first->y - 2;
   const int to = hole ? first->y - 2 : first->y - 1;
-  ctx.direction = hole ? -1 : 1;
-  ctx.edgeColumn = column;
-  ctx.edgeRow = first->y;
-  ctx.edgeDirection = ctx.direction;
+  const int direction = hole ? -1 : 1;
+  Pen<Sink> pen{sink, column, from, column, first->y, direction, direction};
   sink.Moveto(column, from);
-  Lineto(ctx, sink, column, to);
+  pen.Lineto(column, to);
   for (const ObVertex* v = first->next; v != first; v = v->next)
-    EmitCorner(ctx, sink, v);
-  if (ctx.penX != column || ctx.penY != from) Lineto(ctx, sink, column, from);
+    EmitCorner(pen, v);
+  if (pen.x != column || pen.y != from) pen.Lineto(column, from);
 }
 
 bool Passes(const ObContext& ctx, const ObContour* contour) {
@@ -166,9 +159,9 @@ void Emit(ObContext& ctx, Sink& sink, ObComponent* component) {
   const ObContour* outer = component->contours;
   if (!Passes(ctx, outer)) return;
   sink.NewComponent();
-  EmitContour(ctx, sink, outer, false);
+  EmitContour(sink, outer, false);
   for (const ObContour* c = outer->next; c != outer; c = c->next)
-    if (Passes(ctx, c)) EmitContour(ctx, sink, c, true);
+    if (Passes(ctx, c)) EmitContour(sink, c, true);
   sink.CloseComponent();
 }
 }  // namespace

@@ -1,19 +1,37 @@
 // The sweep: rows read one by one, each compared with the rows above and below.
 #include "raster/ob_context.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace {
 // A cursor into a neighbour row. It only moves forward, since the runs of the present row are
 // visited left to right: a row costs time linear in its runs.
 class ObNeighbours {
+  // Entry - 1 < bound as unsigned numbers: false for the 0 that closes a row.
+  static unsigned int Less(std::uint16_t entry, unsigned int bound) {
+    return static_cast<unsigned int>(entry) - 1 < bound;
+  }
+
  public:
   explicit ObNeighbours(const std::uint16_t* row) : row(row) {}
   // Overlaps of the columns start..end, widened by the margin on both sides.
   void Find(int start, int end, int margin, int& count, int& first, int& last) {
-    while (row[2 * ended] && row[2 * ended + 1] < start - margin)
+    // Each cursor moves over a run or two at most, most of the time: two steps taken without a
+    // branch leave a loop that rarely runs, where a loop alone would mispredict its exit on
+    // every irregular row. A step is one unsigned compare, the closing zeros of the row falling
+    // out as the largest values.
+    const unsigned int before = static_cast<unsigned int>(std::max(start - margin - 1, 0));
+    const unsigned int reach = static_cast<unsigned int>(end + margin);
+    auto endsBefore = [&](unsigned int k) { return Less(row[2 * k + 1], before); };
+    auto startsWithin = [&](unsigned int k) { return Less(row[2 * k], reach); };
+    ended += endsBefore(ended);
+    ended += endsBefore(ended);
+    while (endsBefore(ended))
       ++ended;
-    while (row[2 * started] && row[2 * started] <= end + margin)
+    started += startsWithin(started);
+    started += startsWithin(started);
+    while (startsWithin(started))
       ++started;
     count = static_cast<int>(started - ended);
     first = count ? static_cast<int>(ended) + 1 : 0;
