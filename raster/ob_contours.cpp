@@ -40,19 +40,19 @@ int ObTestContourPerimeter(const ObContext& ctx, const ObContour* contour) {
 namespace {
 // The calls of the callback table, each entry optional.
 struct TableSink {
-  const ObCallbackTable& table;
+  const ObCallbackTable* table;
   void* userData;
   void NewComponent() {
-    if (table.newComponent) table.newComponent(userData);
+    if (table->newComponent) table->newComponent(userData);
   }
   void Moveto(int x, int y) {
-    if (table.moveto) table.moveto(x, y, userData);
+    if (table->moveto) table->moveto(x, y, userData);
   }
   void Lineto(int x, int y) {
-    if (table.lineto) table.lineto(x, y, userData);
+    if (table->lineto) table->lineto(x, y, userData);
   }
   void CloseComponent() {
-    if (table.closeComponent) table.closeComponent(userData);
+    if (table->closeComponent) table->closeComponent(userData);
   }
 };
 
@@ -60,15 +60,32 @@ struct TableSink {
 // The emitter never repeats a point and draws only horizontal and vertical lines, so
 // ShouldExtendLastSegment, which lengthens the last line when the new point carries it on in its
 // direction, comes down to comparing the headings of the two lines: no float tests, and one
-// branch-free store whether the point is new or moves the last one.
+// branch-free store whether the point is new or moves the last one. The contour buffer's fields
+// and the count are worked on in copies, which the emitter keeps in registers while it walks a
+// contour (see EmitContour); they go back to the closure before anything else reads it.
 struct PathSink {
-  VectClosure& closure;
+  explicit PathSink(VectClosure& c) : closure(&c) { Load(); }
+  VectClosure* closure;
+  ZvPoint2<float>* data;
+  unsigned int size, capacity, emitted;
   int lastX = 0, lastY = 0;
   int heading = 0;  // of the last line, a bit per sense of each axis; 0 before the first line
 
-  void NewComponent() { VectNewComponent(&closure); }
+  void Load() {
+    data = closure->contour.data;
+    size = closure->contour.size;
+    capacity = closure->contour.capacity;
+    emitted = closure->emitted;
+  }
+  void Store() {
+    closure->contour.size = size;
+    closure->emitted = emitted;
+  }
+  void NewComponent() { VectNewComponent(closure); }
   void Moveto(int x, int y) {
-    VectMoveto(x, y, &closure);
+    Store();
+    VectMoveto(x, y, closure);
+    Load();
     lastX = x;
     lastY = y;
     heading = 0;
@@ -76,20 +93,25 @@ struct PathSink {
   void Lineto(int x, int y) {
     const int dx = x - lastX, dy = y - lastY;
     const int h = (dx > 0) | (dx < 0) << 1 | (dy > 0) << 2 | (dy < 0) << 3;
-    ZvPoint2fArray& c = closure.contour;
-    if (c.size == c.capacity) {
-      c.Resize(c.size + 1);
-      c.Chop(c.size - 1);
+    if (size == capacity) {
+      Store();
+      closure->contour.Resize(size + 1);
+      closure->contour.Chop(size);
+      Load();
     }
     const unsigned int turn = h != heading;
-    c.size += turn;
-    c.data[c.size - 1] = ZvPoint2<float>{static_cast<float>(x), static_cast<float>(y)};
-    closure.emitted += turn;
+    size += turn;
+    data[size - 1] = ZvPoint2<float>{static_cast<float>(x), static_cast<float>(y)};
+    emitted += turn;
     heading = h;
     lastX = x;
     lastY = y;
   }
-  void CloseComponent() { VectCloseComponent(&closure); }
+  void CloseComponent() {
+    Store();
+    VectCloseComponent(closure);
+    Load();
+  }
 };
 
 // The emitter's pen and the last unit edge it drew (column, row, direction), kept apart from the
@@ -142,12 +164,15 @@ void EmitContour(Sink& sink, const ObContour* contour, bool hole) {
   const int from = hole ? first->y - 1 : first->y - 2;
   const int to = hole ? first->y - 2 : first->y - 1;
   const int direction = hole ? -1 : 1;
-  Pen<Sink> pen{sink, column, from, column, first->y, direction, direction};
-  sink.Moveto(column, from);
+  // A copy of the sink that nothing else can reach, so that its fields can stay in registers.
+  Sink local = sink;
+  Pen<Sink> pen{local, column, from, column, first->y, direction, direction};
+  local.Moveto(column, from);
   pen.Lineto(column, to);
   for (const ObVertex* v = first->next; v != first; v = v->next)
     EmitCorner(pen, v);
   if (pen.x != column || pen.y != from) pen.Lineto(column, from);
+  sink = local;
 }
 
 bool Passes(const ObContext& ctx, const ObContour* contour) {
@@ -167,11 +192,11 @@ void Emit(ObContext& ctx, Sink& sink, ObComponent* component) {
 }  // namespace
 
 void ObEmitComponent(ObContext& ctx, ObComponent* component) {
-  TableSink sink{ctx.table, ctx.userData};
+  TableSink sink{&ctx.table, ctx.userData};
   Emit(ctx, sink, component);
 }
 
 void ObEmitComponentToPath(ObContext& ctx, ObComponent* component) {
-  PathSink sink{*static_cast<VectClosure*>(ctx.userData)};
+  PathSink sink(*static_cast<VectClosure*>(ctx.userData));
   Emit(ctx, sink, component);
 }
