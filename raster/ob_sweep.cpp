@@ -48,25 +48,24 @@ class ObNeighbours {
 // where the sweep can inline it.
 inline void ObAdvanceWall(ObContext& ctx, ObActiveWall* wall, int x) {
   const int step = x - wall->x;
-  if (wall->fresh) {
-    // The birth or split corner already stands for the wall's first row.
-    wall->lastStep = step;
-    wall->fresh = false;
-  } else if (step != wall->lastStep || x != wall->x) {
-    // A straight wall makes no corner; a sideways step, or the end of one, does.
-    wall->lastStep = step;
+  // A straight wall makes no corner; a sideways step, or the end of one, does. A fresh wall's
+  // birth or split corner already stands for its first row. One branch on the outcome, rather
+  // than one per test, since on irregular regions each test is a coin toss.
+  const bool corner = (!wall->fresh) & ((step != wall->lastStep) | (x != wall->x));
+  wall->lastStep = step;
+  wall->fresh = false;
+  if (corner) {
+    // The ring runs down the walls with the region on their right and up the others, so the
+    // new corner follows the wall's last one or comes before it.
+    const bool down = ObHasRegionOnRight(wall->kind);
+    ObVertex* ObVertex::*const forward = down ? &ObVertex::next : &ObVertex::prev;
+    ObVertex* ObVertex::*const backward = down ? &ObVertex::prev : &ObVertex::next;
     ObVertex* v = ctx.vertices.New();
     v->x = wall->x;
     v->y = wall->y;
-    if (ObHasRegionOnRight(wall->kind)) {
-      v->type = ObStepOnLeftSide;
-      wall->last->next = v;
-      v->prev = wall->last;
-    } else {
-      v->type = ObStepOnRightSide;
-      v->next = wall->last;
-      wall->last->prev = v;
-    }
+    v->type = down ? ObStepOnLeftSide : ObStepOnRightSide;
+    wall->last->*forward = v;
+    v->*backward = wall->last;
     wall->last = v;
   }
   wall->y = static_cast<std::uint16_t>(wall->y + 1);
