@@ -17,20 +17,23 @@ class ObNeighbours {
   explicit ObNeighbours(const std::uint16_t* row) : row(row) {}
   // Overlaps of the columns start..end, widened by the margin on both sides.
   void Find(int start, int end, int margin, int& count, int& first, int& last) {
-    // Each cursor moves over a run or two at most, most of the time: two steps taken without a
-    // branch leave a loop that rarely runs, where a loop alone would mispredict its exit on
-    // every irregular row. A step is one unsigned compare, the closing zeros of the row falling
-    // out as the largest values.
+    // Each cursor moves over a run or two at most, most of the time. Runs are sorted, so the
+    // second run can pass only if the first does: both are tested at once, from loads that do
+    // not wait on each other, and the loop after them rarely runs, where a loop alone would
+    // mispredict its exit on every irregular row. A test is one unsigned compare, the closing
+    // zeros of the row falling out as the largest values; the second test may read the pair
+    // after them (the rows have room for it), but then the first has failed and its answer is
+    // dropped.
     const unsigned int before = static_cast<unsigned int>(std::max(start - margin - 1, 0));
     const unsigned int reach = static_cast<unsigned int>(end + margin);
     auto endsBefore = [&](unsigned int k) { return Less(row[2 * k + 1], before); };
     auto startsWithin = [&](unsigned int k) { return Less(row[2 * k], reach); };
-    ended += endsBefore(ended);
-    ended += endsBefore(ended);
+    const unsigned int e0 = endsBefore(ended), e1 = endsBefore(ended + 1);
+    const unsigned int s0 = startsWithin(started), s1 = startsWithin(started + 1);
+    ended += e0 + (e0 & e1);
+    started += s0 + (s0 & s1);
     while (endsBefore(ended))
       ++ended;
-    started += startsWithin(started);
-    started += startsWithin(started);
     while (startsWithin(started))
       ++started;
     count = static_cast<int>(started - ended);
@@ -135,7 +138,8 @@ void ObVectorize(ObContext& ctx, const ZvRaster<unsigned char>& raster, unsigned
 
   const int width = raster.GetWidth(), height = raster.GetHeight();
   const unsigned int entries = ObRowEntries(width);
-  std::vector<std::uint16_t> rows(3 * entries, 0);
+  // Two entries past the last row, for the neighbour cursors' look ahead.
+  std::vector<std::uint16_t> rows(3 * entries + 2, 0);
   std::uint16_t* prev = rows.data();
   std::uint16_t* cur = prev + entries;
   std::uint16_t* next = cur + entries;
