@@ -1,5 +1,5 @@
 // Closed components: the size tests of their contours, and their emission as pixel-exact
-// polygons through the callback table.
+// polygons, through the callback table or straight into the library's own path.
 #include "raster/ob_context.h"
 #include "raster/vect_path.h"
 

@@ -28,8 +28,9 @@ std::uint64_t ScalarMask(const unsigned char* p, int count, unsigned char value)
       mask |= std::uint64_t{0xff} << i;
       continue;
     }
-    // No zero byte in x: no pixel of the eight equals the value. The test may flag a zero byte
-    // that is not there, never miss one, so a flagged word is looked at byte by byte.
+    // No zero byte in x: no pixel of the eight equals the value. The test answers exactly
+    // whether there is one, but may flag bytes above it too, so such a word is read byte by
+    // byte.
     if (!((x - ones) & ~x & highs)) continue;
     for (int k = 0; k < 8; ++k)
       mask |= std::uint64_t{p[i + k] == value} << (i + k);
