@@ -101,34 +101,41 @@ inline bool ObHasRegionOnRight(int wallKind) {
   return wallKind == ObBirthLeftWall || wallKind == ObSplitRightWall;
 }
 
-// Records handed out zeroed and released all at once. Walls are recycled since a wall lives
-// only while its run does.
-template <class T>
+// Records handed out zeroed and released all at once. Walls are recycled (`Recycled`) since a
+// wall lives only while its run does; the other records stay to the end, so their pools skip
+// the free list, and hand out the next record of the present chunk after one compare.
+template <class T, bool Recycled = false>
 class ObPool {
  public:
   T* New() {
-    if (!freed.empty()) {
+    if (Recycled && !freed.empty()) {
       T* p = freed.back();
       freed.pop_back();
       *p = T{};
       return p;
     }
-    if (chunks.empty() || used == kChunk) {
-      // Owned before the list grows, so that a failure to grow it frees the chunk.
-      std::unique_ptr<T[]> chunk(new T[kChunk]);
-      chunks.push_back(std::move(chunk));
-      used = 0;
-    }
-    T* p = &chunks.back()[used++];
+    if (next == limit) Grow();
+    T* p = next++;
     *p = T{};
     return p;
   }
-  void Free(T* p) { freed.push_back(p); }
+  void Free(T* p) {
+    static_assert(Recycled, "records of this kind live to the end of the sweep");
+    freed.push_back(p);
+  }
 
  private:
   static constexpr unsigned int kChunk = 256;
+  void Grow() {
+    // Owned before the list grows, so that a failure to grow it frees the chunk.
+    std::unique_ptr<T[]> chunk(new T[kChunk]);
+    chunks.push_back(std::move(chunk));
+    next = chunks.back().get();
+    limit = next + kChunk;
+  }
   std::vector<std::unique_ptr<T[]>> chunks;
-  unsigned int used = 0;
+  T* next = nullptr;  // the present chunk's first unused record, up to limit
+  T* limit = nullptr;
   std::vector<T*> freed;
 };
 
@@ -161,7 +168,7 @@ struct ObContext {
   ObPool<ObEvent> events;
   ObPool<ObContour> contours;
   ObPool<ObComponent> components;
-  ObPool<ObActiveWall> walls;
+  ObPool<ObActiveWall, true> walls;
 };
 
 // Runs and rows.
