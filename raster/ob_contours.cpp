@@ -40,6 +40,7 @@ int ObTestContourPerimeter(const ObContext& ctx, const ObContour* contour) {
 namespace {
 // The calls of the callback table, each entry optional.
 struct TableSink {
+  static constexpr bool kTakesRepeats = false;
   const ObCallbackTable* table;
   void* userData;
   void NewComponent() {
@@ -57,13 +58,17 @@ struct TableSink {
 };
 
 // The path table's callbacks made directly, with VectLineto's test done on the integer corners.
-// The emitter never repeats a point and draws only horizontal and vertical lines, so
-// ShouldExtendLastSegment, which lengthens the last line when the new point carries it on in its
-// direction, comes down to comparing the headings of the two lines: no float tests, and one
-// branch-free store whether the point is new or moves the last one. The contour buffer's fields
+// The emitter draws only horizontal and vertical lines, and repeats a point only where this sink
+// lets it (a repeat has no heading and changes nothing), so ShouldExtendLastSegment, which
+// lengthens the last line when the new point carries it on in its direction, comes down to
+// comparing the headings of the two lines: no float tests, and one branch-free store whether
+// the point is new or moves the last one. The contour buffer's fields
 // and the count are worked on in copies, which the emitter keeps in registers while it walks a
 // contour (see EmitContour); they go back to the closure before anything else reads it.
 struct PathSink {
+  // The emitter may skip its test for a repeated point, a branch that irregular regions
+  // mispredict.
+  static constexpr bool kTakesRepeats = true;
   explicit PathSink(VectClosure& c) : closure(&c) { Load(); }
   VectClosure* closure;
   ZvPoint2<float>* data;
@@ -99,11 +104,11 @@ struct PathSink {
       closure->contour.Chop(size);
       Load();
     }
-    const unsigned int turn = h != heading;
+    const unsigned int turn = (h != heading) & (h != 0);
     size += turn;
     data[size - 1] = ZvPoint2<float>{static_cast<float>(x), static_cast<float>(y)};
     emitted += turn;
-    heading = h;
+    heading = h ? h : heading;
     lastX = x;
     lastY = y;
   }
@@ -151,7 +156,7 @@ void EmitCorner(Pen<Sink>& pen, const ObVertex* v) {
   pen.edgeDirection = pen.direction;
   const int from = pen.direction > 0 ? v->y - 2 : v->y - 1;
   const int to = pen.direction > 0 ? v->y - 1 : v->y - 2;
-  if (column != pen.x || from != pen.y) pen.Lineto(column, from);
+  if (Sink::kTakesRepeats || column != pen.x || from != pen.y) pen.Lineto(column, from);
   pen.Lineto(column, to);
 }
 
