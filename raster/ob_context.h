@@ -101,34 +101,41 @@ inline bool ObHasRegionOnRight(int wallKind) {
   return wallKind == ObBirthLeftWall || wallKind == ObSplitRightWall;
 }
 
-// Records handed out zeroed and released all at once. Walls are recycled since a wall lives
-// only while its run does.
-template <class T>
+// Records handed out zeroed and released all at once. Walls are recycled (`Recycled`) since a
+// wall lives only while its run does; the other records stay to the end, so their pools skip
+// the free list, and hand out the next record of the present chunk after one compare.
+template <class T, bool Recycled = false>
 class ObPool {
  public:
   T* New() {
-    if (!freed.empty()) {
+    if (Recycled && !freed.empty()) {
       T* p = freed.back();
       freed.pop_back();
       *p = T{};
       return p;
     }
-    if (chunks.empty() || used == kChunk) {
-      // Owned before the list grows, so that a failure to grow it frees the chunk.
-      std::unique_ptr<T[]> chunk(new T[kChunk]);
-      chunks.push_back(std::move(chunk));
-      used = 0;
-    }
-    T* p = &chunks.back()[used++];
+    if (next == limit) Grow();
+    T* p = next++;
     *p = T{};
     return p;
   }
-  void Free(T* p) { freed.push_back(p); }
+  void Free(T* p) {
+    static_assert(Recycled, "records of this kind live to the end of the sweep");
+    freed.push_back(p);
+  }
 
  private:
   static constexpr unsigned int kChunk = 256;
+  void Grow() {
+    // Owned before the list grows, so that a failure to grow it frees the chunk.
+    std::unique_ptr<T[]> chunk(new T[kChunk]);
+    chunks.push_back(std::move(chunk));
+    next = chunks.back().get();
+    limit = next + kChunk;
+  }
   std::vector<std::unique_ptr<T[]>> chunks;
-  unsigned int used = 0;
+  T* next = nullptr;  // the present chunk's first unused record, up to limit
+  T* limit = nullptr;
   std::vector<T*> freed;
 };
 
@@ -141,24 +148,27 @@ struct ObRun {
   int belowCount, belowFirst, belowLast;
 };
 
+struct ObContext;
+// How a closed component reaches its consumer: ObEmitComponent goes through the callback table;
+// ObEmitComponentToPath serves the library's own path table (raster/vect_path.h, userData a
+// VectClosure) with the same calls made directly, which spares two indirect calls a corner.
+using ObEmitter = void (*)(ObContext& ctx, ObComponent* component);
+
 struct ObContext {
   ObCallbackTable table;
+  ObEmitter emit;
   void* userData;
   int margin;  // a run's reach into its neighbour rows; 0 connects shared columns only
   double perimeterThreshold;
   double areaThreshold;
   ObActiveWall* leftSentinel;
   ObActiveWall* rightSentinel;
-  // The emitter's pen and the last unit edge it drew (column, row, direction).
-  int penX, penY;
-  int edgeColumn, edgeRow, edgeDirection;
-  int direction;
 
   ObPool<ObVertex> vertices;
   ObPool<ObEvent> events;
   ObPool<ObContour> contours;
   ObPool<ObComponent> components;
-  ObPool<ObActiveWall> walls;
+  ObPool<ObActiveWall, true> walls;
 };
 
 // Runs and rows.
@@ -185,5 +195,6 @@ ObActiveWall* ObMakeMerge(ObContext& ctx, ObActiveWall* left, ObActiveWall* righ
 int ObTestContourArea(const ObContext& ctx, const ObContour* contour);
 int ObTestContourPerimeter(const ObContext& ctx, const ObContour* contour);
 void ObEmitComponent(ObContext& ctx, ObComponent* component);
+void ObEmitComponentToPath(ObContext& ctx, ObComponent* component);
 
 #endif

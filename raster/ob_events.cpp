@@ -161,7 +161,7 @@ ObActiveWall* ObMakeDeath(ObContext& ctx, ObActiveWall* left, ObActiveWall* righ
   if (!ca && !cb) {
     // Both walls are ends of the outer chain: the component is complete.
     LinkEvent(a, e, b, true);
-    ObEmitComponent(ctx, component);
+    ctx.emit(ctx, component);
   } else if (!ca || !cb) {
     // A chain that began under a split turns out to open to the outside: it was no hole.
     ObContour* hole = ca ? ca : cb;

@@ -1,19 +1,40 @@
 // The sweep: rows read one by one, each compared with the rows above and below.
 #include "raster/ob_context.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace {
 // A cursor into a neighbour row. It only moves forward, since the runs of the present row are
 // visited left to right: a row costs time linear in its runs.
 class ObNeighbours {
+  // Entry - 1 < bound as unsigned numbers: false for the 0 that closes a row.
+  static unsigned int Less(std::uint16_t entry, unsigned int bound) {
+    return static_cast<unsigned int>(entry) - 1 < bound;
+  }
+
  public:
   explicit ObNeighbours(const std::uint16_t* row) : row(row) {}
   // Overlaps of the columns start..end, widened by the margin on both sides.
   void Find(int start, int end, int margin, int& count, int& first, int& last) {
-    while (row[2 * ended] && row[2 * ended + 1] < start - margin)
+    // Each cursor moves over a run or two at most, most of the time. Runs are sorted, so the
+    // second run can pass only if the first does: both are tested at once, from loads that do
+    // not wait on each other, and the loop after them rarely runs, where a loop alone would
+    // mispredict its exit on every irregular row. A test is one unsigned compare, the closing
+    // zeros of the row falling out as the largest values; the second test may read the pair
+    // after them (the rows have room for it), but then the first has failed and its answer is
+    // dropped.
+    const unsigned int before = static_cast<unsigned int>(std::max(start - margin - 1, 0));
+    const unsigned int reach = static_cast<unsigned int>(end + margin);
+    auto endsBefore = [&](unsigned int k) { return Less(row[2 * k + 1], before); };
+    auto startsWithin = [&](unsigned int k) { return Less(row[2 * k], reach); };
+    const unsigned int e0 = endsBefore(ended), e1 = endsBefore(ended + 1);
+    const unsigned int s0 = startsWithin(started), s1 = startsWithin(started + 1);
+    ended += e0 + (e0 & e1);
+    started += s0 + (s0 & s1);
+    while (endsBefore(ended))
       ++ended;
-    while (row[2 * started] && row[2 * started] <= end + margin)
+    while (startsWithin(started))
       ++started;
     count = static_cast<int>(started - ended);
     first = count ? static_cast<int>(ended) + 1 : 0;
@@ -30,25 +51,24 @@ class ObNeighbours {
 // where the sweep can inline it.
 inline void ObAdvanceWall(ObContext& ctx, ObActiveWall* wall, int x) {
   const int step = x - wall->x;
-  if (wall->fresh) {
-    // The birth or split corner already stands for the wall's first row.
-    wall->lastStep = step;
-    wall->fresh = false;
-  } else if (step != wall->lastStep || x != wall->x) {
-    // A straight wall makes no corner; a sideways step, or the end of one, does.
-    wall->lastStep = step;
+  // A straight wall makes no corner; a sideways step, or the end of one, does. A fresh wall's
+  // birth or split corner already stands for its first row. One branch on the outcome, rather
+  // than one per test, since on irregular regions each test is a coin toss.
+  const bool corner = (!wall->fresh) & ((step != wall->lastStep) | (x != wall->x));
+  wall->lastStep = step;
+  wall->fresh = false;
+  if (corner) {
+    // The ring runs down the walls with the region on their right and up the others, so the
+    // new corner follows the wall's last one or comes before it.
+    const bool down = ObHasRegionOnRight(wall->kind);
+    ObVertex* ObVertex::*const forward = down ? &ObVertex::next : &ObVertex::prev;
+    ObVertex* ObVertex::*const backward = down ? &ObVertex::prev : &ObVertex::next;
     ObVertex* v = ctx.vertices.New();
     v->x = wall->x;
     v->y = wall->y;
-    if (ObHasRegionOnRight(wall->kind)) {
-      v->type = ObStepOnLeftSide;
-      wall->last->next = v;
-      v->prev = wall->last;
-    } else {
-      v->type = ObStepOnRightSide;
-      v->next = wall->last;
-      wall->last->prev = v;
-    }
+    v->type = down ? ObStepOnLeftSide : ObStepOnRightSide;
+    wall->last->*forward = v;
+    v->*backward = wall->last;
     wall->last = v;
   }
   wall->y = static_cast<std::uint16_t>(wall->y + 1);
@@ -118,7 +138,8 @@ void ObVectorize(ObContext& ctx, const ZvRaster<unsigned char>& raster, unsigned
 
   const int width = raster.GetWidth(), height = raster.GetHeight();
   const unsigned int entries = ObRowEntries(width);
-  std::vector<std::uint16_t> rows(3 * entries, 0);
+  // Two entries past the last row, for the neighbour cursors' look ahead.
+  std::vector<std::uint16_t> rows(3 * entries + 2, 0);
   std::uint16_t* prev = rows.data();
   std::uint16_t* cur = prev + entries;
   std::uint16_t* next = cur + entries;

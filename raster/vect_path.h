@@ -7,6 +7,8 @@
 #include <zv/point.h>
 #include <zv/vectorizer.h>
 
+#include <cmath>
+
 class ZvBezierTool;
 class ZvGC;
 class ZvPath2f;
@@ -23,19 +25,61 @@ struct VectClosure {
   int newComponent;        // set until the first contour of a component starts
 };
 
-void VectInit(const ZvExtent2<float>& extent, void* closure);
-void VectNewComponent(void* closure);
-void VectMoveto(int x, int y, void* closure);
-void VectLineto(int x, int y, void* closure);
-void VectCloseComponent(void* closure);
-void VectClose(void* closure);
-// The table of the functions above.
-ObCallbackTable VectPathTable();
+// Hands the gathered contour to the path in one call, closed or not, and empties the buffer.
+void VectFlush(VectClosure& closure, int close);
 
 // Whether p continues the edge between the contour's last two corners in the same direction, so
 // that the edge can simply be lengthened. A step back is never merged, so unit edges make no
 // spikes.
-int ShouldExtendLastSegment(const VectClosure& closure, const ZvPoint2<float>& p);
+inline int ShouldExtendLastSegment(const VectClosure& closure, const ZvPoint2<float>& p) {
+  const ZvPoint2<float>& a = closure.contour[closure.contour.size - 2];
+  const ZvPoint2<float>& b = closure.contour[closure.contour.size - 1];
+  // Differences of floats are exact in double, so these tests see the exact geometry.
+  auto same = [](float u, float v) { return std::fabs(static_cast<double>(u) - v) <= 1e-15; };
+  if (b.x > a.x) return same(p.y, b.y) && p.x >= b.x;
+  if (b.x < a.x) return same(p.y, b.y) && b.x >= p.x;
+  if (b.y > a.y) return same(p.x, b.x) && p.y >= b.y;
+  if (b.y < a.y) return same(p.x, b.x) && b.y >= p.y;
+  return 0;
+}
+
+// The callbacks. They are defined here so that the sweep's own emitter, which calls them for
+// every corner, can inline them; the table below holds their addresses for everything else.
+inline void VectInit(const ZvExtent2<float>&, void*) {}
+
+inline void VectNewComponent(void* closure) {
+  static_cast<VectClosure*>(closure)->newComponent = 1;
+}
+
+inline void VectMoveto(int x, int y, void* closure) {
+  VectClosure& c = *static_cast<VectClosure*>(closure);
+  // A component's first contour starts fresh; the others close the contour before them.
+  if (c.contour.size) VectFlush(c, !c.newComponent);
+  c.newComponent = 0;
+  c.contour.Add(ZvPoint2<float>{static_cast<float>(x), static_cast<float>(y)});
+  ++c.emitted;
+}
+
+inline void VectLineto(int x, int y, void* closure) {
+  VectClosure& c = *static_cast<VectClosure*>(closure);
+  const ZvPoint2<float> p{static_cast<float>(x), static_cast<float>(y)};
+  if (c.contour.size >= 2 && ShouldExtendLastSegment(c, p)) {
+    c.contour[c.contour.size - 1] = p;
+    return;
+  }
+  c.contour.Add(p);
+  ++c.emitted;
+}
+
+inline void VectCloseComponent(void* closure) {
+  VectClosure& c = *static_cast<VectClosure*>(closure);
+  if (c.contour.size) VectFlush(c, 1);
+}
+
+inline void VectClose(void*) {}
+
+// The table of the functions above.
+ObCallbackTable VectPathTable();
 
 // The unit tangent at sample `index` of a closed loop of samples whose last repeats the first.
 void ComputeTgtVector(const ZvPoint2fArray& samples, unsigned int index, ZvPoint2<double>& tangent);

@@ -33,19 +33,30 @@ double ZvVectorizer::GetAreaThreshold() const {
   return thresholds->area;
 }
 
-int ZvVectorizer::Trace(const ZvRaster<unsigned char>& raster, unsigned char value,
-                        const ZvExtent2<float>& extent, const ObCallbackTable& table,
-                        void* userData) const {
+namespace {
+// The sweep over `raster` with the given consumer. Result: 0 for a raster out of range, else 1.
+int Sweep(double perimeter, double area, const ZvRaster<unsigned char>& raster, unsigned char value,
+          const ZvExtent2<float>& extent, const ObCallbackTable& table, void* userData,
+          ObEmitter emit) {
   // Corners are 16-bit, offset by 2 and one flush row past the end.
   const int kMaxSide = 32767;
   if (raster.GetWidth() > kMaxSide || raster.GetHeight() > kMaxSide) return 0;
   ObContext ctx{};
   ctx.table = table;
+  ctx.emit = emit;
   ctx.userData = userData;
-  ctx.perimeterThreshold = thresholds->perimeter;
-  ctx.areaThreshold = thresholds->area;
+  ctx.perimeterThreshold = perimeter;
+  ctx.areaThreshold = area;
   if (raster.GetWidth() > 0 && raster.GetHeight() > 0) ObVectorize(ctx, raster, value, extent);
   return 1;
+}
+}  // namespace
+
+int ZvVectorizer::Trace(const ZvRaster<unsigned char>& raster, unsigned char value,
+                        const ZvExtent2<float>& extent, const ObCallbackTable& table,
+                        void* userData) const {
+  return Sweep(thresholds->perimeter, thresholds->area, raster, value, extent, table, userData,
+               ObEmitComponent);
 }
 
 unsigned int ZvVectorizer::Vectorize(const ZvRaster<unsigned char>& raster, unsigned char value,
@@ -54,7 +65,8 @@ unsigned int ZvVectorizer::Vectorize(const ZvRaster<unsigned char>& raster, unsi
   // One hold for the whole trace: the appends below then take the recursive lock without a
   // round trip to the other threads, and no reader sees half a component.
   ZvShapeLock guard(path);
-  Trace(raster, value, extent, VectPathTable(), &closure);
+  Sweep(thresholds->perimeter, thresholds->area, raster, value, extent, VectPathTable(), &closure,
+        ObEmitComponentToPath);
   return closure.emitted;
 }
 
