@@ -216,13 +216,14 @@ ZvBaseFCurve* ZvQuatFCurve::SnapShot(double start, double end, ExtrapolationMeth
   ZvQuatCurve* copy = new ZvQuatCurve;
   copy->SetValueWhenNoKeys(m_curve->GetValueWhenNoKeys());
   copy->SetExtrapolationMethod(static_cast<unsigned int>(method));
-  double lastKey = 0.0;
+  // The samples come in rising time: each key goes after the last one, so the keys are built
+  // in one pass rather than searched and inserted one at a time.
+  std::vector<ZvQuatKey>& keys = copy->keys;
   for (unsigned int i = 0; i < times.size; ++i) {
     // Written so that a NaN bound or sample keeps nothing: no key may have a NaN time.
     if (!(times[i] >= start && times[i] <= end) || !std::isfinite(times[i])) continue;
-    if (copy->GetNumKeys() && !(std::fabs(times[i] - lastKey) > 1e-6)) continue;
-    copy->SetKey(times[i], angles[i], 0.0);
-    lastKey = times[i];
+    if (!keys.empty() && !(times[i] - keys.back().time > 1e-6)) continue;
+    keys.push_back(ZvQuatKey(times[i], angles[i], 0.0f, 0.0f, 0.0f, 0));
   }
   return new ZvQuatFCurve(copy, m_component);
 }

@@ -396,6 +396,19 @@ TEST(HostileCurveInput, LargeSplicesResamplingsAndReadsTakeLinearTime) {
   }
   EXPECT_LT(std::chrono::duration<double>(std::chrono::steady_clock::now() - snapStart).count(),
             5.0);
+  // A rotation's snapshot keys each sample of its drawing, several for each of these keys.
+  ZvQuatFCurve rotation(0);
+  for (int i = 0; i < 4096; ++i)
+    rotation.CreateKey(i, i % 2 ? 30.0 : 0.0);
+  const auto rotationStart = std::chrono::steady_clock::now();
+  std::unique_ptr<ZvBaseFCurve> snap(
+      rotation.SnapShot(0, 4095, ZvBaseFCurve::ConstantExtrapolation));
+  const double rotationSeconds =
+      std::chrono::duration<double>(std::chrono::steady_clock::now() - rotationStart).count();
+  ASSERT_NE(snap, nullptr);
+  EXPECT_GT(snap->GetNumKeys(), 4 * 4096u);
+  ExpectAscending(KeysOf(*snap));
+  EXPECT_LT(rotationSeconds, 2.0);
 }
 
 TEST(HostileCurveInput, CycleSnapshotsAreBoundedByTheKeyCap) {
