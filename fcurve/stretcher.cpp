@@ -294,18 +294,23 @@ int ZvFCurveStretcherImpl::Update(ZvPoint2<double>& translation, double viewStar
     if (!std::isfinite(places[i].parameter) || !std::isfinite(left) || !std::isfinite(right))
       return 0;
   }
-  translation = asked;
-  for (double t : m_currentParameters)
-    oldParameters.Add(t);
-  CurveEnds ends(m_curve);
-  for (std::size_t i = 0; i < count; ++i)
-    ends.Note(m_currentParameters[i], places[i].parameter);
   m_ascending.resize(count);
   for (unsigned int i = 0; i < count; ++i)
     m_ascending[i] = i;
   std::sort(m_ascending.begin(), m_ascending.end(), [&](unsigned int a, unsigned int b) {
     return places[a].parameter < places[b].parameter;
   });
+  // Keys a few units in the last place apart can round onto one parameter when they move
+  // together: refused like a scale past the double range.
+  for (std::size_t i = 1; i < count; ++i) {
+    if (!(places[m_ascending[i]].parameter > places[m_ascending[i - 1]].parameter)) return 0;
+  }
+  translation = asked;
+  for (double t : m_currentParameters)
+    oldParameters.Add(t);
+  CurveEnds ends(m_curve);
+  for (std::size_t i = 0; i < count; ++i)
+    ends.Note(m_currentParameters[i], places[i].parameter);
   Relayout(places.data(), m_ascending.data(), modifiedExtent);
   ends.Widen(modifiedExtent, viewStart, viewEnd);
   for (double t : m_currentParameters)

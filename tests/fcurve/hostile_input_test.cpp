@@ -225,6 +225,23 @@ TEST(HostileCurveInput, ResamplingAPointOrAReversedIntervalCoversOnlyItsFoldedPa
   }
 }
 
+TEST(HostileCurveInput, StretchesThatRoundKeysTogetherAreRefused) {
+  // Keys 3.6e-15 apart, carried 12 to the left by a ripple stretch, land on one parameter.
+  const std::vector<double> at{-21.5, -21.499999999999996, 1};
+  for (auto& c : AllKinds(at)) {
+    SCOPED_TRACE(c->GetKind());
+    ZvExtent2<double> box(0.5, -1e6, 1e300, 1e6), moved, changed;
+    ZvDoubleArray keys, before, after;
+    keys.Add(1);
+    ZvFCurveStretcher stretch(*c, box, keys, ZvExtent2<double>(-1e9, -1e9, 1e9, 1e9),
+                              ZvPoint2<double>{3.25, 0}, ZvBaseFCurve::LeftHandle, 1, 1.001);
+    ZvPoint2<double> drag{-12, 0};
+    int clamped = 0;
+    EXPECT_EQ(stretch.Update(drag, -1e9, 1e9, before, after, changed, moved, clamped), 0);
+    EXPECT_EQ(KeysOf(*c), at);
+  }
+}
+
 TEST(HostileCurveInput, CycleSamplingOverTooManyPeriodsIsRefused) {
   for (auto& c : AllKinds({2, 4, 15}, false)) {
     c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
