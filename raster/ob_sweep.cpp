@@ -67,7 +67,10 @@ inline void ObAdvanceWall(ObContext& ctx, ObActiveWall* wall, int x) {
     v->x = wall->x;
     v->y = wall->y;
     v->type = down ? ObStepOnLeftSide : ObStepOnRightSide;
-    wall->last->*forward = v;
+    // Every wall gets its first corner at its birth or split; only the sentinels have none,
+    // and no run of the first row can have one of them as its wall, since the row above it is
+    // empty. The analyzer cannot see that far.
+    wall->last->*forward = v;  // NOLINT(clang-analyzer-core.NullDereference)
     v->*backward = wall->last;
     wall->last = v;
   }
