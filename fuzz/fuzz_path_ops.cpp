@@ -207,8 +207,11 @@ void Step(ZvPath2f& path, Input& in) {
 // The memory limit is meant for what the library holds. AddressSanitizer keeps freed blocks in
 // quarantine to catch late uses, 256 MB of them by default, which after a few large flattens or
 // curves is most of the process; a smaller quarantine still catches a use soon after a free.
+// Over a long run its allocator's cached free blocks and the stacks it records for every
+// allocation grow the process too: freed pages go back to the system every second, and
+// allocation stacks keep their 10 innermost frames.
 extern "C" const char* __asan_default_options() {
-  return "quarantine_size_mb=32";
+  return "quarantine_size_mb=32:allocator_release_to_os_interval_ms=1000:malloc_context_size=10";
 }
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
