@@ -9,8 +9,8 @@
 // proportion: a second and more under the sanitizers. So that one input stays well within its
 // second while a call that is slower than linear still stands out, an input ends once its curve
 // holds more than kMaxKeys keys, samplings finer than kMaxSamples samples are coarsened and
-// cycle drawings narrowed to as many repeated keys; a call past the library's caps still goes
-// through as it is, to be refused.
+// cycle drawings and snapshots narrowed to as many repeated keys; a call past the library's caps
+// still goes through as it is, to be refused.
 //
 // Input: one byte picks the curve kind, then each step is one byte for the call and as many
 // more as its arguments take.
@@ -78,21 +78,32 @@ double Coarsened(double from, double to, double step) {
   return std::copysign(span / kMaxSamples, step);
 }
 
-// Under the cycle methods a drawing repeats every key once per period in the box. A box showing
-// more than kMaxSamples repeated keys is narrowed to about that many, unless the library
-// refuses the drawing anyway (a million periods or 2^20 repeated keys).
-void NarrowCycleBox(const ZvBaseFCurve& c, const ZvTransfo4& t, ZvExtent2<double>& box) {
+// Under the cycle methods a drawing or a snapshot repeats every key once per period in its
+// range. A range of more than kMaxSamples repeated keys is narrowed to about that many (its end
+// moved towards its start), unless the library refuses the call anyway: past a million periods
+// or 2^20 repeated keys for a drawing, past 10^5 periods for a snapshot. `unit` is the width on
+// screen of one unit of parameter.
+double NarrowedCycleEnd(const ZvBaseFCurve& c, double from, double to, double unit,
+                        double refusedPeriods) {
   const ZvBaseFCurve::ExtrapolationMethod m = c.GetExtrapolationMethod();
   double first = 0, last = 0;
   if ((m != ZvBaseFCurve::CycleExtrapolation && m != ZvBaseFCurve::CycleWithOffsetExtrapolation) ||
       c.GetNumKeys() < 2 || !c.GetSmallestKeyParameter(first) || !c.GetLargestKeyParameter(last)) {
-    return;
+    return to;
   }
-  const double scale = t.GetMatrixPtr()[0];
-  const double periods = std::fabs((box.xmax - box.xmin) / (scale * (last - first)));
+  const double periods = std::fabs((to - from) / (unit * (last - first)));
   const double pieces = periods * c.GetNumKeys();
-  if (!(pieces > kMaxSamples) || periods > 1e6 || pieces > kRefusedSamples / 4.0) return;
-  box.xmax = box.xmin + (box.xmax - box.xmin) * (kMaxSamples / pieces);
+  if (!(pieces > kMaxSamples) || periods > refusedPeriods || pieces > kRefusedSamples / 4.0)
+    return to;
+  return from + (to - from) * (kMaxSamples / pieces);
+}
+
+// A drawing's points grow with its size over the tolerance, up to the library's 2^20 (each a
+// few arrays of 16 bytes, and more under the sanitizers): tolerances finer than 1e-3 of the
+// drawing's width or height only measure that. Non-positive and non-finite ones go through.
+double DrawingTolerance(double asked, double width, double height) {
+  const double size = std::fmax(std::fabs(width), std::fabs(height));
+  return std::isfinite(size) && asked > 0.0 ? std::fmax(asked, size * 1e-3) : asked;
 }
 
 class Script {
@@ -242,11 +253,19 @@ void Step(ZvBaseFCurve& c, Script& s) {
       ZvPoint2dArray points;
       ZvPointTagArray tags;
       ZvBoolArray extrapolated;
-      NarrowCycleBox(c, t, box);
-      c.FlattenFromTo(box, t, s.Number(), points, tags, extrapolated, f1);
+      box.xmax = NarrowedCycleEnd(c, box.xmin, box.xmax, t.GetMatrixPtr()[0], 1e6);
+      c.FlattenFromTo(box, t,
+                      DrawingTolerance(s.Number(), box.xmax - box.xmin, box.ymax - box.ymin),
+                      points, tags, extrapolated, f1);
       ZvPoint2dArray all;
       ZvPointTagArray allTags;
-      c.Flatten(t, s.Number(), all, allTags, f1);
+      double first = 0, last = 0;
+      c.GetSmallestKeyParameter(first);
+      c.GetLargestKeyParameter(last);
+      const double* m = t.GetMatrixPtr();
+      const double height = c.GetValueUpperBound(0) - c.GetValueLowerBound(0);
+      c.Flatten(t, DrawingTolerance(s.Number(), (last - first) * m[0], height * m[5]), all, allTags,
+                f1);
       break;
     }
     case 17:
@@ -274,7 +293,8 @@ void Step(ZvBaseFCurve& c, Script& s) {
     }
     case 23: {
       std::unique_ptr<ZvBaseFCurve> snap(
-          c.SnapShot(a, b, static_cast<ZvBaseFCurve::ExtrapolationMethod>(1 + s.Byte() % 4)));
+          c.SnapShot(a, NarrowedCycleEnd(c, a, b, 1.0, 1e5),
+                     static_cast<ZvBaseFCurve::ExtrapolationMethod>(1 + s.Byte() % 4)));
       if (snap) CheckKeys(*snap);
       break;
     }
