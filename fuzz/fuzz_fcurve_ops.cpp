@@ -78,6 +78,19 @@ double Coarsened(double from, double to, double step) {
   return std::copysign(span / kMaxSamples, step);
 }
 
+// The same for a resampling, which under the cycle methods resamples the part of the keyed
+// range that the interval folds onto: at most one period, however long the interval.
+double CoarsenedResampling(const ZvBaseFCurve& c, double from, double to, double step) {
+  const ZvBaseFCurve::ExtrapolationMethod m = c.GetExtrapolationMethod();
+  double first = 0, last = 0;
+  if ((m != ZvBaseFCurve::CycleExtrapolation && m != ZvBaseFCurve::CycleWithOffsetExtrapolation) ||
+      c.GetNumKeys() < 2 || !c.GetSmallestKeyParameter(first) || !c.GetLargestKeyParameter(last) ||
+      !(std::fabs(to - from) > last - first)) {
+    return Coarsened(from, to, step);
+  }
+  return Coarsened(first, last, step);
+}
+
 // Under the cycle methods a drawing or a snapshot repeats every key once per period in its
 // range. A range of more than kMaxSamples repeated keys is narrowed to about that many (its end
 // moved towards its start), unless the library refuses the call anyway: past a million periods
@@ -269,7 +282,7 @@ void Step(ZvBaseFCurve& c, Script& s) {
       break;
     }
     case 17:
-      c.ResampleSequence(a, b, Coarsened(a, b, d), f0, 0);
+      c.ResampleSequence(a, b, CoarsenedResampling(c, a, b, d), f0, 0);
       break;
     case 18: {
       const double kernel[5] = {a, b, d, 0.25, 0.5};
