@@ -35,6 +35,9 @@ constexpr double kMaxRepeatedKeys = 1048576.0;
 // Most points one drawing adds and most samples one EvalSequence gives (2^20, about 25 MB of
 // output and a fraction of a second to make); more are refused rather than allocated.
 constexpr unsigned int kMaxOutput = 1048576;
+// Most points a sampling flattens on its way (2^24): they stream through a small buffer and are
+// never stored, but each costs its share of time.
+constexpr unsigned long kMaxStreamed = 1ul << 24;
 // A value change at one parameter larger than this is drawn as a jump.
 constexpr double kJumpEpsilon = 1e-15;
 
@@ -207,7 +210,7 @@ class Assembler {
       lo = s.keys[i].parameter;
       MoveTo(lo + dx, s.KeyRightValue(i) + dy);
     }
-    for (; i + 1 < n && s.keys[i].parameter < hi; ++i) {
+    for (; !overflow && i + 1 < n && s.keys[i].parameter < hi; ++i) {
       const double b = s.keys[i + 1].parameter < hi ? s.keys[i + 1].parameter : hi;
       const double a = s.keys[i].parameter > lo ? s.keys[i].parameter : lo;
       if (a < b) Segment(i, a, b, dx, dy);
@@ -287,6 +290,11 @@ class Assembler {
       return;
     }
     if (points.size < kPortion) return;
+    streamed += points.size - taken;
+    if (streamed > kMaxStreamed) {
+      overflow = true;
+      return;
+    }
     sink->Take(points, taken);
     const unsigned int last = points.size - 1;
     points[0] = points[last];
@@ -310,7 +318,8 @@ class Assembler {
   PolylineSink* const sink;
   const unsigned int first;
   unsigned int taken = 0;
-  bool overflow = false;  // more points than kMaxOutput: the drawing is abandoned
+  unsigned long streamed = 0;  // points handed to the sink
+  bool overflow = false;  // more points than kMaxOutput or kMaxStreamed: the drawing is abandoned
   ZvPoint2<double> pen{0.0, 0.0};
   bool hasPen = false;
 };

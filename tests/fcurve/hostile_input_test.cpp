@@ -242,6 +242,22 @@ TEST(HostileCurveInput, StretchesThatRoundKeysTogetherAreRefused) {
   }
 }
 
+TEST(HostileCurveInput, SamplingsThatWouldFlattenBeyondTheCapAreRefused) {
+  // A million points for each cubic at this tolerance, over 2,000 periods of two cubics: the
+  // samples are few, the points streamed through the sampler would be billions.
+  ZvStdFCurve c;
+  c.CreateKey(0, 0);
+  c.CreateKey(0.25, 0.5);
+  c.CreateKey(0.5, 0);
+  c.SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+  ZvDoubleArray params, values;
+  const auto start = std::chrono::steady_clock::now();
+  EXPECT_EQ(c.EvalSequence(0, 1000, 1.0, 1e-300, params, values, 0), 0u);
+  EXPECT_LT(std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count(), 10.0);
+  // At an ordinary tolerance the same sampling goes through.
+  EXPECT_EQ(c.EvalSequence(0, 1000, 1.0, 0.01, params, values, 0), 1001u);
+}
+
 TEST(HostileCurveInput, CycleSamplingOverTooManyPeriodsIsRefused) {
   for (auto& c : AllKinds({2, 4, 15}, false)) {
     c->SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
