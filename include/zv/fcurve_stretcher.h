@@ -63,8 +63,9 @@ class ZV_API ZvFCurveStretcher {
   // `modifiedExtent` is widened (Union) by what changed on screen, out to `viewStart` /
   // `viewEnd` when an end key of the curve moved; `boxExtent` receives the stretched box.
   // 0, with nothing changed (translation included), when the stretcher is inert, an array is
-  // not empty, viewStart > viewEnd, the curve is read-only, or the translation is not finite or
-  // would scale a key's parameter or value past the double range; else 1.
+  // not empty, viewStart > viewEnd, the curve is read-only, or the translation is not finite,
+  // would scale a key's parameter or value past the double range, or would round two moving keys
+  // onto one parameter; else 1.
   int Update(ZvPoint2<double>& translation, double viewStart, double viewEnd,
              ZvDoubleArray& oldParameters, ZvDoubleArray& newParameters,
              ZvExtent2<double>& modifiedExtent, ZvExtent2<double>& boxExtent, int& clamped);
