@@ -35,9 +35,9 @@ constexpr double kMaxRepeatedKeys = 1048576.0;
 // Most points one drawing adds and most samples one EvalSequence gives (2^20, about 25 MB of
 // output and a fraction of a second to make); more are refused rather than allocated.
 constexpr unsigned int kMaxOutput = 1048576;
-// Most points a sampling flattens on its way (2^24): they stream through a small buffer and are
-// never stored, but each costs its share of time.
-constexpr unsigned long kMaxStreamed = 1ul << 24;
+// Most points a sampling flattens on its way (2^22, four for each of the most samples): they
+// stream through a small buffer and are never stored, but each costs its share of time.
+constexpr unsigned long kMaxStreamed = 1ul << 22;
 // A value change at one parameter larger than this is drawn as a jump.
 constexpr double kJumpEpsilon = 1e-15;
 

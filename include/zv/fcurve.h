@@ -204,7 +204,7 @@ class ZV_API ZvBaseFCurve {
   virtual double Eval(double parameter, int clamped) const = 0;
   // Samples at start, start + step, ... and end, read from the curve flattened at `tolerance`.
   // More than 2^20 samples (1048576) are refused with 0 rather than allocated, and so is a
-  // sampling whose flattened curve would take more than 2^24 points (a tolerance far below the
+  // sampling whose flattened curve would take more than 2^22 points (a tolerance far below the
   // curve's size over many keys or periods).
   virtual unsigned int EvalSequence(double start, double end, double step, double tolerance,
                                     ZvDoubleArray& parameters, ZvDoubleArray& values,
