@@ -29,6 +29,27 @@ void SortBucket(CFillSortedVertex* r, int count) {
     });
   }
 }
+void YRange(const CFillVertex* vertices, int n, double& lo, double& hi) {
+  lo = hi = vertices[0].y;
+  for (int i = 1; i < n; ++i) {
+    lo = std::min(lo, vertices[i].y);
+    hi = std::max(hi, vertices[i].y);
+  }
+}
+
+// A stable counting sort of the records into `count` groups by key(y), key rising with y;
+// starts[g] ends as the end of group g.
+template <class Key>
+void Distribute(const CFillSortedVertex* records, CFillSortedVertex* sorted, int n,
+                const CFillVertex* vertices, int count, int* starts, Key key) {
+  std::fill(starts, starts + count + 1, 0);
+  for (int i = 0; i < n; ++i)
+    ++starts[key(vertices[i].y) + 1];
+  for (int g = 0; g < count; ++g)
+    starts[g + 1] += starts[g];
+  for (int i = 0; i < n; ++i)
+    sorted[starts[key(vertices[i].y)]++] = records[i];
+}
 }  // namespace
 
 void ZvOrderByRisingY(const CFillSortedVertex* records, CFillSortedVertex* sorted, int n,
@@ -38,11 +59,8 @@ void ZvOrderByRisingY(const CFillSortedVertex* records, CFillSortedVertex* sorte
     std::sort(sorted, sorted + n, Before);
     return;
   }
-  double lo = vertices[0].y, hi = lo;
-  for (int i = 1; i < n; ++i) {
-    lo = std::min(lo, vertices[i].y);
-    hi = std::max(hi, vertices[i].y);
-  }
+  double lo, hi;
+  YRange(vertices, n, lo, hi);
   // Keys are floor((y - lo) * k): subtracting, scaling by a positive factor and flooring never
   // reverse an order. A range too thin for the factor puts everything into one bucket.
   const int buckets = n;
@@ -53,14 +71,7 @@ void ZvOrderByRisingY(const CFillSortedVertex* records, CFillSortedVertex* sorte
     return b < buckets ? b : buckets - 1;
   };
   ZvScratchArray<int> starts(ZvScratch_SortCounts, static_cast<std::size_t>(buckets) + 1);
-  std::fill(starts.get(), starts.get() + buckets + 1, 0);
-  for (int i = 0; i < n; ++i)
-    ++starts[key(vertices[i].y) + 1];
-  for (int b = 0; b < buckets; ++b)
-    starts[b + 1] += starts[b];
-  for (int i = 0; i < n; ++i)
-    sorted[starts[key(vertices[i].y)]++] = records[i];
-  // starts[b] is now the end of bucket b.
+  Distribute(records, sorted, n, vertices, buckets, starts.get(), key);
   int begin = 0;
   for (int b = 0; b < buckets; ++b) {
     const int end = starts[b];
@@ -75,11 +86,8 @@ void ZvOrderBySampleLine(const CFillSortedVertex* records, CFillSortedVertex* so
     ZvOrderByRisingY(records, sorted, n, vertices);
     return;
   }
-  double lo = vertices[0].y, hi = lo;
-  for (int i = 1; i < n; ++i) {
-    lo = std::min(lo, vertices[i].y);
-    hi = std::max(hi, vertices[i].y);
-  }
+  double lo, hi;
+  YRange(vertices, n, lo, hi);
   // y - 0.5 is exact below 2^52; rows beyond a few per vertex would make the counts the cost.
   const double first = std::ceil(lo - 0.5), rows = std::ceil(hi - 0.5) - first + 1.0;
   if (!(std::fabs(lo) < 0x1p50 && std::fabs(hi) < 0x1p50 && rows <= 4.0 * n + 4096.0)) {
@@ -89,11 +97,5 @@ void ZvOrderBySampleLine(const CFillSortedVertex* records, CFillSortedVertex* so
   const int count = static_cast<int>(rows);
   auto row = [&](double y) { return static_cast<int>(std::ceil(y - 0.5) - first); };
   ZvScratchArray<int> starts(ZvScratch_SortCounts, static_cast<std::size_t>(count) + 1);
-  std::fill(starts.get(), starts.get() + count + 1, 0);
-  for (int i = 0; i < n; ++i)
-    ++starts[row(vertices[i].y) + 1];
-  for (int r = 0; r < count; ++r)
-    starts[r + 1] += starts[r];
-  for (int i = 0; i < n; ++i)
-    sorted[starts[row(vertices[i].y)]++] = records[i];
+  Distribute(records, sorted, n, vertices, count, starts.get(), row);
 }

@@ -172,14 +172,19 @@ TEST(HostileCurveInput, KeyReductionReturnsNearTheLargestDouble) {
   }
 }
 
-TEST(HostileCurveInput, DrawingsAtATinyToleranceSkipPiecesOutsideTheBox) {
-  // Cubic segments flattened at 1e-15 take a million points each; 2,000 periods of them all
-  // lie below the box, so the drawing is empty and must not compute them.
-  ZvStdFCurve c;
+// Two cubic segments rising to 0.5 and back over [0, 0.5], repeated by cycles.
+void MakeCyclicArch(ZvStdFCurve& c) {
   c.CreateKey(0, 0);
   c.CreateKey(0.25, 0.5);
   c.CreateKey(0.5, 0);
   c.SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+}
+
+TEST(HostileCurveInput, DrawingsAtATinyToleranceSkipPiecesOutsideTheBox) {
+  // Cubic segments flattened at 1e-15 take a million points each; 2,000 periods of them all
+  // lie below the box, so the drawing is empty and must not compute them.
+  ZvStdFCurve c;
+  MakeCyclicArch(c);
   ZvExtent2<double> box;
   box.AddPoint(ZvPoint2<double>{0, 1});
   box.AddPoint(ZvPoint2<double>{1000, DBL_MAX});
@@ -246,10 +251,7 @@ TEST(HostileCurveInput, SamplingsThatWouldFlattenBeyondTheCapAreRefused) {
   // A million points for each cubic at this tolerance, over 2,000 periods of two cubics: the
   // samples are few, the points streamed through the sampler would be billions.
   ZvStdFCurve c;
-  c.CreateKey(0, 0);
-  c.CreateKey(0.25, 0.5);
-  c.CreateKey(0.5, 0);
-  c.SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
+  MakeCyclicArch(c);
   ZvDoubleArray params, values;
   const auto start = std::chrono::steady_clock::now();
   EXPECT_EQ(c.EvalSequence(0, 1000, 1.0, 1e-300, params, values, 0), 0u);
