@@ -5,6 +5,7 @@
 #include <zv/path2f_prop1d.h>
 #include <zv/polyline.h>
 
+#include <algorithm>
 #include <cmath>
 
 #include "shape/morpher_impl.h"
@@ -71,4 +72,19 @@ int ZvMorpherImpl::Fit(ZvBezierTool& tool, const ZvPoint2fArray& points, int clo
   else
     tool.OpenFit(points, gc.fitTolerance, 3, gc.pointMergeDistance, 0, &output, 0);
   return output.NumPoints() > outputIndex;
+}
+
+int ZvMorpherImpl::BlendOpen(double t, const ZvMorphFlat& a, const ZvMorphFlat& b, Blend blend,
+                             ZvPath2fProp1d& output) {
+  const unsigned int n = StepsFor(std::max(a.length, b.length));
+  ZvPoint2fArray evenA, evenB;
+  if (!n || !ZvPoint2fArraySingleComponent_EvenSubdivide(a.points, a.chords, n, evenA) ||
+      !ZvPoint2fArraySingleComponent_EvenSubdivide(b.points, b.chords, n, evenB))
+    return 0;
+  ZvPoint2fArray work(evenA);
+  blend(evenA, evenB, t, work);
+  ZvBezierTool tool;
+  unsigned int outputIndex = 0;
+  if (Fit(tool, work, 0, output, outputIndex)) SetThePropertyCurve(t, output, n, 0, 0, outputIndex);
+  return 1;
 }

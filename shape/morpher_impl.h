@@ -50,6 +50,17 @@ class ZvMorpherImpl {
   // Flattens the subpath starting at `start` at the step and measures it. Result: points made.
   unsigned int FlattenSubpath(const ZvPath2f& path, unsigned int start, ZvMorphFlat& flat) const;
 
+  // A blend of two evenly resampled polylines of one size into out, which has that size already:
+  // point by point, or as turtle walks.
+  using Blend = int (*)(const ZvPoint2fArray& a, const ZvPoint2fArray& b, double t,
+                        ZvPoint2fArray& out);
+  // Resamples the measured polylines a and b in the same number of even steps, blends them at t
+  // and fits the result onto output as one open subpath, whose property curve blends those of the
+  // first subpaths. Result 0, output unchanged, when the steps would be too many or a side holds
+  // no segment to resample.
+  int BlendOpen(double t, const ZvMorphFlat& a, const ZvMorphFlat& b, Blend blend,
+                ZvPath2fProp1d& output);
+
  private:
   int EqualCountMorph(double t, ZvPath2fProp1d& output);
   int UnequalCountMorph(double t, ZvPath2fProp1d& output);

@@ -1,6 +1,5 @@
 // LinearMotionPathMorph: a section of each shape carried along two motion paths, and the
 // similarity that carries it.
-#include <zv/bezier_fit.h>
 #include <zv/gc.h>
 #include <zv/morpher.h>
 #include <zv/path2f_prop1d.h>
@@ -51,15 +50,14 @@ P2f MovedEnd(const MPathData& record, const P2f& a, const P2f& b, double t, doub
              static_cast<float>(p.y + (double(q.y) - p.y) * f)};
 }
 
-// The section first..last of `path`, carried by `transform`, flattened at s.
-double FlattenSection(const ZvPath2f& path, unsigned int first, unsigned int last,
-                      const ZvTransfo4& transform, double s, ZvPoint2fArray& flat,
-                      ZvDoubleArray& chords) {
+// The section first..last of `path`, carried by `transform`, flattened at s and measured.
+void FlattenSection(const ZvPath2f& path, unsigned int first, unsigned int last,
+                    const ZvTransfo4& transform, double s, ZvMorphFlat& flat) {
   ZvPath2f section(path, first, last);
   section.Transform(transform);
   ZvPointTagArray tags;
-  section.AltFlatten(s, flat, tags);
-  return ZvPoint2fArraySingleComponent_ComputeChordLength(flat, chords);
+  section.AltFlatten(s, flat.points, tags);
+  flat.length = ZvPoint2fArraySingleComponent_ComputeChordLength(flat.points, flat.chords);
 }
 
 }  // namespace
@@ -96,20 +94,9 @@ int ZvMorpherImpl::LinearMotionPathMorph(double t, ZvPath2fProp1d& output) {
   SetToSimilarityXY(toA, Widen(a0), Widen(m0), Widen(a1), Widen(m1));
   SetToSimilarityXY(toB, Widen(b0), Widen(m0), Widen(b1), Widen(m1));
 
-  ZvPoint2fArray flatA, flatB;
-  ZvDoubleArray chordsA, chordsB;
-  const double lengthA = FlattenSection(*pathA, r0.indexA, r1.indexA, toA, s, flatA, chordsA);
-  const double lengthB = FlattenSection(*pathB, r0.indexB, r1.indexB, toB, s, flatB, chordsB);
-  const unsigned int n = StepsFor(std::max(lengthA, lengthB));
-  ZvPoint2fArray evenA, evenB;
+  ZvMorphFlat sectionA, sectionB;
+  FlattenSection(*pathA, r0.indexA, r1.indexA, toA, s, sectionA);
+  FlattenSection(*pathB, r0.indexB, r1.indexB, toB, s, sectionB);
   // A section that holds no segment (ends reversed, or between two control points) is refused.
-  if (!n || !ZvPoint2fArraySingleComponent_EvenSubdivide(flatA, chordsA, n, evenA) ||
-      !ZvPoint2fArraySingleComponent_EvenSubdivide(flatB, chordsB, n, evenB))
-    return 0;
-  ZvPoint2fArray work(evenA);
-  ZvPoint2fArraySingleComponent_Lerp(evenA, evenB, t, work);
-  ZvBezierTool tool;
-  unsigned int outputIndex = 0;
-  if (Fit(tool, work, 0, output, outputIndex)) SetThePropertyCurve(t, output, n, 0, 0, outputIndex);
-  return 1;
+  return BlendOpen(t, sectionA, sectionB, &ZvPoint2fArraySingleComponent_Lerp, output);
 }
