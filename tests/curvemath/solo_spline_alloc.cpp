@@ -14,16 +14,14 @@ namespace {
 template <class Op>
 int FailUntilSuccess(const ZvSpline2d& watched, Op op) {
   const ZvSpline2d before(watched);
-  for (long k = 0;; ++k) {
-    zv_test::Arm(k);
-    const int result = op();
-    if (!zv_test::Disarm()) {
-      EXPECT_EQ(result, 1);
-      return static_cast<int>(k);
-    }
-    EXPECT_EQ(result, 0);
-    EXPECT_TRUE(SameSpline(watched, before)) << "failing allocation " << k;
-  }
+  int result = 0;
+  const int failures = zv_test::ForEachFailure([&] { result = op(); },
+                                               [&](bool) {
+                                                 EXPECT_EQ(result, 0);
+                                                 EXPECT_TRUE(SameSpline(watched, before));
+                                               });
+  EXPECT_EQ(result, 1);
+  return failures;
 }
 
 TEST(SplineAllocation, FailuresLeaveTheOldSplineWhole) {

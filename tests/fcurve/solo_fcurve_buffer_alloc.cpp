@@ -13,29 +13,7 @@
 #include "tests/fcurve/curve_blocks.h"
 #include "tests/support/failing_allocator.h"
 
-using zv_test::Arm;
-using zv_test::Disarm;
-
-namespace {
-
-// Runs `op` with the k-th allocation failing, for every k until none fails, calling `check` with
-// whether the operation threw. Returns the number of failures.
-int ForEachFailure(const std::function<void()>& op, const std::function<void(bool threw)>& check) {
-  for (long k = 0;; ++k) {
-    Arm(k);
-    bool threw = false;
-    try {
-      op();
-    } catch (const std::bad_alloc&) {
-      threw = true;
-    }
-    if (!Disarm()) return static_cast<int>(k);
-    check(threw);
-    if (::testing::Test::HasFatalFailure()) return static_cast<int>(k);
-  }
-}
-
-}  // namespace
+using zv_test::ForEachFailure;
 
 TEST(FCurveBufferAllocFailure, BodyReaderThrowsAndChangesNothing) {
   for (const auto& seed : SeedBlocks()) {

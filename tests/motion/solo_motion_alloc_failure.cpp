@@ -11,12 +11,12 @@
 #include <chrono>
 #include <functional>
 #include <future>
+#include <memory>
 
 #include "motion_fixtures.h"
 #include "tests/support/failing_allocator.h"
 
-using zv_test::Arm;
-using zv_test::Disarm;
+using zv_test::ForEachFailure;
 
 namespace {
 
@@ -27,25 +27,17 @@ bool Unlocked(const ZvMotionPath3d& path) {
 }
 
 // Runs `edit` on copies of `start` with the k-th allocation failing, for every k until it
-// succeeds; a failed run must leave the copy's block as it was.
+// succeeds; a failed run must let the failure through with the copy's block as it was.
 void EveryFailure(const ZvMotionPath3d& start, const std::function<void(ZvMotionPath3d&)>& edit) {
   const Bytes before = Block(start);
-  for (long k = 0; k < 10000; ++k) {
-    ZvMotionPath3d path(start);
-    bool threw = false;
-    Arm(k);
-    try {
-      edit(path);
-    } catch (const std::bad_alloc&) {
-      threw = true;
-    }
-    const bool fired = Disarm();
-    ASSERT_EQ(threw, fired) << k;
-    ASSERT_TRUE(Unlocked(path)) << k;
-    if (!fired) return;
-    ASSERT_EQ(Block(path), before) << k;
-  }
-  FAIL() << "never completed";
+  std::unique_ptr<ZvMotionPath3d> path;
+  ForEachFailure([&] { path.reset(new ZvMotionPath3d(start)); }, [&] { edit(*path); },
+                 [&](bool threw) {
+                   ASSERT_TRUE(threw);
+                   ASSERT_TRUE(Unlocked(*path));
+                   ASSERT_EQ(Block(*path), before);
+                 });
+  ASSERT_TRUE(Unlocked(*path));
 }
 
 }  // namespace
@@ -71,35 +63,30 @@ TEST(MotionAllocFailure, EvaluationAndReadingRecover) {
   const ZvMotionPath3d wave = Wave();
   P3 want;
   wave.Eval(1.7, 0.01, want);
-  for (long k = 0;; ++k) {
-    ZvMotionPath3d path(wave);
-    Arm(k);
-    P3 got{};
-    try {
-      path.Eval(1.7, 0.01, got);
-    } catch (const std::bad_alloc&) {
-    }
-    if (!Disarm()) break;
-    ASSERT_TRUE(Unlocked(path));
-    path.Eval(1.7, 0.01, got);
-    ASSERT_EQ(got.x, want.x) << k;
-    ASSERT_EQ(got.z, want.z) << k;
-  }
+  std::unique_ptr<ZvMotionPath3d> path;
+  P3 got{};
+  ForEachFailure([&] { path.reset(new ZvMotionPath3d(wave)); }, [&] { path->Eval(1.7, 0.01, got); },
+                 [&](bool) {
+                   ASSERT_TRUE(Unlocked(*path));
+                   path->Eval(1.7, 0.01, got);
+                   ASSERT_EQ(got.x, want.x);
+                   ASSERT_EQ(got.z, want.z);
+                 });
 
   const Bytes block = Block(wave);
-  for (long k = 0;; ++k) {
-    unsigned int consumed = 99;
-    Arm(k);
-    ZvMotionPath3d* read = ZvMotionPath3d_CreateFromBufferBody(
-        block.data() + 4, static_cast<unsigned int>(block.size() - 4), consumed);
-    const bool fired = Disarm();
-    if (!fired) {
-      ASSERT_NE(read, nullptr);
-      EXPECT_EQ(Block(*read), block);
-      delete read;
-      break;
-    }
-    EXPECT_EQ(read, nullptr) << k;
-    EXPECT_EQ(consumed, 0u) << k;
-  }
+  unsigned int consumed = 99;
+  ZvMotionPath3d* read = nullptr;
+  ForEachFailure(
+      [&] {
+        read = ZvMotionPath3d_CreateFromBufferBody(
+            block.data() + 4, static_cast<unsigned int>(block.size() - 4), consumed);
+      },
+      [&](bool threw) {
+        EXPECT_FALSE(threw);
+        EXPECT_EQ(read, nullptr);
+        EXPECT_EQ(consumed, 0u);
+      });
+  ASSERT_NE(read, nullptr);
+  EXPECT_EQ(Block(*read), block);
+  delete read;
 }

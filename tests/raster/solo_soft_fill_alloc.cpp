@@ -41,28 +41,19 @@ TEST(SoftFillMemory, OneTablePerCallAndNothingKeptOnFailure) {
   EXPECT_EQ(g_tables, 1);
   const ZvRaster<float> complete(raster);
 
-  int failures = 0;
-  for (long k = 0;; ++k) {
-    ZvRaster<float> target(64, 48, 0);
-    zv_test::Arm(k);
-    bool threw = false;
-    try {
-      square.SoftFill(gc, target, nullptr);
-    } catch (const std::bad_alloc&) {
-      threw = true;
-    }
-    const bool fired = zv_test::Disarm();
-    EXPECT_EQ(gc.opacity, 0.75) << k;
-    if (!fired) {
-      for (int i = 0; i < target.GetSize(); ++i)
-        ASSERT_EQ(target.GetVal(i), complete.GetVal(i)) << k;
-      break;
-    }
-    ++failures;
+  ZvRaster<float> target(64, 48, 0);
+  const auto check = [&](bool threw) {
+    EXPECT_EQ(gc.opacity, 0.75);
+    // Only the clip step catches its own failure: the blur is complete, merely unclipped.
     if (!threw) {
-      // Only the clip step catches its own failure: the blur is complete, merely unclipped.
-      EXPECT_GT(target.GetVal(30, 25), 0.74f) << k;
+      EXPECT_GT(target.GetVal(30, 25), 0.74f);
     }
-  }
+  };
+  const int failures =
+      zv_test::ForEachFailure([&] { target = ZvRaster<float>(64, 48, 0); },
+                              [&] { square.SoftFill(gc, target, nullptr); }, check);
+  EXPECT_EQ(gc.opacity, 0.75);
+  for (int i = 0; i < target.GetSize(); ++i)
+    ASSERT_EQ(target.GetVal(i), complete.GetVal(i));
   EXPECT_GT(failures, 3);
 }

@@ -9,6 +9,8 @@
 
 #include "trace_support.h"
 
+#include <memory>
+
 #include <gtest/gtest.h>
 
 TEST(VectorizeAlloc, EveryFailedAllocationLeavesAWellFormedPathAndNoLeak) {
@@ -22,28 +24,22 @@ TEST(VectorizeAlloc, EveryFailedAllocationLeavesAWellFormedPathAndNoLeak) {
     const unsigned int n = fit ? v.VectorizeAndFit(r, 1, r.GetExtent2f(), gc, whole)
                                : v.Vectorize(r, 1, r.GetExtent2f(), whole);
     ASSERT_GT(n, 0u);
-    int failures = 0;
-    for (long k = 0;; ++k) {
-      ZvPath2f path;
-      zv_test::Arm(k);
-      bool thrown = false;
-      try {
-        fit ? v.VectorizeAndFit(r, 1, r.GetExtent2f(), gc, path)
-            : v.Vectorize(r, 1, r.GetExtent2f(), path);
-      } catch (const std::bad_alloc&) {
-        thrown = true;
-      }
-      const bool fired = zv_test::Disarm();
-      EXPECT_EQ(thrown, fired) << k;
-      if (!fired) {
-        EXPECT_EQ(path.NumPoints(), whole.NumPoints());
-        break;
-      }
-      ++failures;
-      // What was appended before the failure is whole subpaths and lines, or a part of one.
-      EXPECT_LE(path.NumPoints(), whole.NumPoints()) << k;
-      EXPECT_TRUE(path.NumPoints() == 0 || path.IsStartOfSubpath(0)) << k;
-    }
+    std::unique_ptr<ZvPath2f> fresh;
+    const int failures =
+        zv_test::ForEachFailure([&] { fresh.reset(new ZvPath2f); },
+                                [&] {
+                                  fit ? v.VectorizeAndFit(r, 1, r.GetExtent2f(), gc, *fresh)
+                                      : v.Vectorize(r, 1, r.GetExtent2f(), *fresh);
+                                },
+                                [&](bool threw) {
+                                  const ZvPath2f& path = *fresh;
+                                  EXPECT_TRUE(threw);
+                                  // What was appended before the failure is whole subpaths and
+                                  // lines, or a part of one.
+                                  EXPECT_LE(path.NumPoints(), whole.NumPoints());
+                                  EXPECT_TRUE(path.NumPoints() == 0 || path.IsStartOfSubpath(0));
+                                });
+    EXPECT_EQ(fresh->NumPoints(), whole.NumPoints());
     EXPECT_GT(failures, 10) << fit;
   }
 }

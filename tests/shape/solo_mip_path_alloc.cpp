@@ -39,16 +39,9 @@ ZvMipPath2fProp1d Three() {
 // each failure must leave the sequence's block as it was. Returns the number of failures.
 int Failures(const std::function<void(ZvMipPath2fProp1d&)>& op) {
   const Bytes original = Block(Three());
-  for (long k = 0;; ++k) {
-    ZvMipPath2fProp1d mip = Three();
-    zv_test::Arm(k);
-    try {
-      op(mip);
-    } catch (const std::bad_alloc&) {
-    }
-    if (!zv_test::Disarm()) return static_cast<int>(k);
-    EXPECT_EQ(Block(mip), original) << "allocation " << k;
-  }
+  ZvMipPath2fProp1d mip;
+  return zv_test::ForEachFailure([&] { mip = Three(); }, [&] { op(mip); },
+                                 [&](bool) { EXPECT_EQ(Block(mip), original); });
 }
 
 TEST(MipPathAllocation, FailuresLeaveTheSequenceAsItWas) {

@@ -16,8 +16,7 @@
 #include "path_fixtures.h"
 #include "tests/support/failing_allocator.h"
 
-using zv_test::Arm;
-using zv_test::Disarm;
+using zv_test::ForEachFailure;
 
 namespace {
 
@@ -38,25 +37,6 @@ State Snapshot(const ZvPath2f& path) {
   s.codes = Codes(path, 255);
   s.open = PathArrays::Open(path);
   return s;
-}
-
-// Runs `op` with the k-th allocation failing, for every k until none fails, calling `check`
-// with whether the operation threw after each failure. Returns the number of failures.
-int ForEachFailure(const std::function<void()>& setup, const std::function<void()>& op,
-                   const std::function<void(bool threw)>& check) {
-  for (long k = 0;; ++k) {
-    setup();
-    Arm(k);
-    bool threw = false;
-    try {
-      op();
-    } catch (const std::bad_alloc&) {
-      threw = true;
-    }
-    if (!Disarm()) return static_cast<int>(k);
-    check(threw);
-    if (::testing::Test::HasFatalFailure()) return static_cast<int>(k);
-  }
 }
 
 using Step = std::function<void(ZvPath2f&)>;

@@ -14,8 +14,7 @@
 #include "path_prop_fixtures.h"
 #include "tests/support/failing_allocator.h"
 
-using zv_test::Arm;
-using zv_test::Disarm;
+using zv_test::ForEachFailure;
 
 namespace {
 
@@ -23,23 +22,6 @@ std::vector<unsigned char> Block(const ZvShape2f& shape) {
   std::vector<unsigned char> block(shape.GetBufferSize());
   shape.WriteToBuffer(block.data());
   return block;
-}
-
-// Runs `op` with the k-th allocation failing for k = 0, 1, ... until none fails; `check` sees
-// whether it threw. Returns the number of failures tried.
-int ForEachFailure(const std::function<void()>& op, const std::function<void(bool)>& check) {
-  for (long k = 0;; ++k) {
-    Arm(k);
-    bool threw = false;
-    try {
-      op();
-    } catch (const std::bad_alloc&) {
-      threw = true;
-    }
-    if (!Disarm()) return static_cast<int>(k);
-    check(threw);
-    if (::testing::Test::HasFatalFailure()) return static_cast<int>(k);
-  }
 }
 
 }  // namespace

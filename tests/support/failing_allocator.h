@@ -1,11 +1,15 @@
 // A global allocator for test executables that fails on demand: Arm(k) makes the k-th allocation
-// from now throw std::bad_alloc, once. Include this header in exactly one file of an executable
-// (a solo_ test), since it replaces the process's operator new and delete.
+// from now throw std::bad_alloc, once, and ForEachFailure tries every k in turn. Include this
+// header in exactly one file of an executable (a solo_ test), since it replaces the process's
+// operator new and delete.
 #ifndef ZV_TESTS_FAILING_ALLOCATOR_H
 #define ZV_TESTS_FAILING_ALLOCATOR_H
 
+#include <gtest/gtest.h>
+
 #include <cstdlib>
 #include <new>
+#include <string>
 
 namespace zv_test {
 
@@ -35,6 +39,33 @@ inline void Arm(long k) {
 inline bool Disarm() {
   g_countdown = -1;
   return g_fired;
+}
+
+// Runs `op` with the k-th allocation failing, for k = 0, 1, 2, ... until a run completes without
+// the failure firing. `setup` runs before each arming, so what it allocates is not counted; after
+// each failed run `check(threw)` is told whether op let std::bad_alloc through, with k in the
+// trace of anything it reports. Stops at a fatal test failure. Result: the number of failed runs.
+template <class Setup, class Op, class Check>
+int ForEachFailure(Setup&& setup, Op&& op, Check&& check) {
+  for (long k = 0;; ++k) {
+    setup();
+    Arm(k);
+    bool threw = false;
+    try {
+      op();
+    } catch (const std::bad_alloc&) {
+      threw = true;
+    }
+    if (!Disarm()) return static_cast<int>(k);
+    SCOPED_TRACE("failing allocation " + std::to_string(k));
+    check(threw);
+    if (::testing::Test::HasFatalFailure()) return static_cast<int>(k);
+  }
+}
+
+template <class Op, class Check>
+int ForEachFailure(Op&& op, Check&& check) {
+  return ForEachFailure([] {}, op, check);
 }
 
 }  // namespace zv_test
