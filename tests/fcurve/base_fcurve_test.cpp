@@ -47,7 +47,7 @@ TEST(BaseFCurve, LockCountFollowsNestedLocks) {
   curve.Lock();
   EXPECT_EQ(curve.GetLockCount(), 2u);
   // Operations inside a held lock nest on it and give it back.
-  EXPECT_EQ(curve.SetFCurveUserData(MakeUID(1), Bytes("a"), 1), 1u);
+  EXPECT_EQ(curve.SetFCurveUserData(MakeUID(1), TextBytes("a"), 1), 1u);
   EXPECT_EQ(curve.GetLockCount(), 2u);
   curve.Unlock();
   curve.Unlock();
@@ -65,8 +65,8 @@ TEST(BaseFCurve, CurveLevelUserData) {
   EXPECT_EQ(curve.HasUserData(), 0u);
 
   // A curve without keys takes curve-level items and creates the store.
-  EXPECT_EQ(curve.SetFCurveUserData(MakeUID(1), Bytes("first"), 5), 1u);
-  EXPECT_EQ(curve.SetFCurveUserData(MakeUID(1), Bytes("second"), 6), 1u);
+  EXPECT_EQ(curve.SetFCurveUserData(MakeUID(1), TextBytes("first"), 5), 1u);
+  EXPECT_EQ(curve.SetFCurveUserData(MakeUID(1), TextBytes("second"), 6), 1u);
   ASSERT_EQ(curve.GetFCurveUserData(MakeUID(1), data, size), 1u);
   EXPECT_EQ(AsString(data, size), "second");
   // The pointer is into the store: a second read gives the same one.
@@ -82,15 +82,15 @@ TEST(BaseFCurve, CurveLevelUserData) {
 TEST(BaseFCurve, KeyUserDataSnapsToTheNearestKey) {
   TestFCurve empty;
   double t = 0.0;
-  EXPECT_EQ(empty.SetKeyUserData(t, MakeUID(1), Bytes("a"), 1, 1.0), 0u);
+  EXPECT_EQ(empty.SetKeyUserData(t, MakeUID(1), TextBytes("a"), 1, 1.0), 0u);
   EXPECT_EQ(empty.HasUserData(), 0u);  // no store created
 
   TestFCurve curve({1.0, 2.0, 3.0});
   t = 2.3;
-  EXPECT_EQ(curve.SetKeyUserData(t, MakeUID(1), Bytes("two"), 3, 0.5), 1u);
+  EXPECT_EQ(curve.SetKeyUserData(t, MakeUID(1), TextBytes("two"), 3, 0.5), 1u);
   EXPECT_EQ(t, 2.0);
   t = 2.6;
-  EXPECT_EQ(curve.SetKeyUserData(t, MakeUID(1), Bytes("x"), 1, 0.1), 0u);
+  EXPECT_EQ(curve.SetKeyUserData(t, MakeUID(1), TextBytes("x"), 1, 0.1), 0u);
   EXPECT_EQ(t, 2.6);  // no key in reach: left alone
   EXPECT_EQ(curve.HasUserData(2.0), 1u);
   EXPECT_EQ(curve.HasUserData(2.0 + 1e-15), 0u);  // the per-key map is exact
@@ -108,7 +108,7 @@ TEST(BaseFCurve, KeyUserDataSnapsToTheNearestKey) {
 
   // The set goes with its last item.
   t = 2.0;
-  curve.SetKeyUserData(t, MakeUID(2), Bytes("b"), 1, 0.0);
+  curve.SetKeyUserData(t, MakeUID(2), TextBytes("b"), 1, 0.0);
   t = 2.1;
   EXPECT_EQ(curve.RemoveKeyUserData(t, MakeUID(1), 0.2), 1u);
   EXPECT_EQ(t, 2.0);
@@ -122,8 +122,8 @@ TEST(BaseFCurve, KeyUserDataSnapsToTheNearestKey) {
 TEST(BaseFCurve, WholeKeySetsAndCopies) {
   TestFCurve curve({1.0, 2.0});
   CFCUserDataSet set;
-  set.SetUserData(MakeUID(1), Bytes("one"), 3);
-  set.SetUserData(MakeUID(2), Bytes("two"), 3);
+  set.SetUserData(MakeUID(1), TextBytes("one"), 3);
+  set.SetUserData(MakeUID(2), TextBytes("two"), 3);
   EXPECT_EQ(curve.SetUserDataSet(set, 1.0), 1u);
   set.RemoveAllUserData();  // the curve holds a copy
   const CFCUserDataSet* held = curve.GetUserDataSet(1.0);
@@ -133,8 +133,8 @@ TEST(BaseFCurve, WholeKeySetsAndCopies) {
   // Copying merges into what the target key has, from another curve or the same.
   TestFCurve other({5.0});
   double t = 5.0;
-  other.SetKeyUserData(t, MakeUID(2), Bytes("old"), 3, 0.0);
-  other.SetKeyUserData(t, MakeUID(3), Bytes("three"), 5, 0.0);
+  other.SetKeyUserData(t, MakeUID(2), TextBytes("old"), 3, 0.0);
+  other.SetKeyUserData(t, MakeUID(3), TextBytes("three"), 5, 0.0);
   EXPECT_EQ(other.CopyKeyUserData(curve, 1.0, 5.0), 1u);
   const CFCUserDataSet* merged = other.GetUserDataSet(5.0);
   ASSERT_NE(merged, nullptr);
@@ -162,7 +162,7 @@ TEST(BaseFCurve, WholeKeySetsAndCopies) {
 TEST(BaseFCurve, HasKeyUserDataNeedsAKey) {
   TestFCurve curve;
   CFCUserDataSet set;
-  set.SetUserData(MakeUID(1), Bytes("a"), 1);
+  set.SetUserData(MakeUID(1), TextBytes("a"), 1);
   curve.SetUserDataSet(set, 1.0);
   EXPECT_EQ(curve.HasUserData(1.0), 0u);  // no keys at all
   EXPECT_NE(curve.GetUserDataSet(1.0), nullptr);
@@ -170,13 +170,13 @@ TEST(BaseFCurve, HasKeyUserDataNeedsAKey) {
 
 TEST(BaseFCurve, CopyAssignAndExchangeAreDeep) {
   TestFCurve a({0.0, 1.0});
-  a.SetFCurveUserData(MakeUID(1), Bytes("curve"), 5);
+  a.SetFCurveUserData(MakeUID(1), TextBytes("curve"), 5);
   double t = 1.0;
-  a.SetKeyUserData(t, MakeUID(2), Bytes("key"), 3, 0.0);
+  a.SetKeyUserData(t, MakeUID(2), TextBytes("key"), 3, 0.0);
 
   std::unique_ptr<ZvBaseFCurve> clone(a.Clone());
   a.RemoveAllKeyUserData();
-  a.SetFCurveUserData(MakeUID(1), Bytes("changed"), 7);
+  a.SetFCurveUserData(MakeUID(1), TextBytes("changed"), 7);
   const unsigned char* data = nullptr;
   unsigned int size = 0;
   ASSERT_EQ(clone->GetFCurveUserData(MakeUID(1), data, size), 1u);

@@ -19,15 +19,6 @@
 #include "tests/fcurve/uid.h"
 #include "tests/support/byte_blocks.h"
 
-using ByteVec = std::vector<unsigned char>;
-
-// The whole block a curve writes; bytes the writer would skip show as 0xEE.
-inline ByteVec BlockOf(const ZvBaseFCurve& curve) {
-  ByteVec block(curve.GetBufferSize(), 0xEE);
-  EXPECT_EQ(curve.WriteToBuffer(block.data()), block.size());
-  return block;
-}
-
 // A block assembled field by field; Finish() puts the body length in front.
 class BlockBuilder {
  public:
@@ -42,14 +33,14 @@ class BlockBuilder {
     std::memcpy(&bits, &v, 8);
     return U32(static_cast<std::uint32_t>(bits)).U32(static_cast<std::uint32_t>(bits >> 32));
   }
-  BlockBuilder& Raw(const ByteVec& bytes) {
+  BlockBuilder& Raw(const Bytes& bytes) {
     body.insert(body.end(), bytes.begin(), bytes.end());
     return *this;
   }
   // The user data block of a curve without a store.
   BlockBuilder& NoUserData() { return U32(5).U32(256).U8(0); }
-  ByteVec Finish() const {
-    ByteVec block;
+  Bytes Finish() const {
+    Bytes block;
     const std::uint32_t n = static_cast<std::uint32_t>(body.size());
     for (int i = 0; i < 4; ++i)
       block.push_back(static_cast<unsigned char>(n >> (8 * i)));
@@ -57,7 +48,7 @@ class BlockBuilder {
     return block;
   }
 
-  ByteVec body;
+  Bytes body;
 };
 
 // A key record of the blocks from 256 on: seven doubles, the segment kind, three zero bytes.
@@ -84,14 +75,14 @@ struct StdFields {
   unsigned int flags = 0x285;  // continuity, parameter lock, automatic, length continuity
   unsigned int extrapolation = 2;
   unsigned int readOnly = 7;  // any non-zero byte sets it
-  ByteVec userData = HexBytes("05 00 00 00 00 01 00 00 00");
+  Bytes userData = HexBytes("05 00 00 00 00 01 00 00 00");
   unsigned int tangentConstraint = 1;
   unsigned int timeCurve = 0;
 };
 
 // A standard block as the writer of `stamp` made it: the oldest layout for stamp 1, otherwise the
 // header and keys of today followed by the tag blocks of that version.
-inline ByteVec StdBlock(unsigned int stamp, const StdFields& f = StdFields()) {
+inline Bytes StdBlock(unsigned int stamp, const StdFields& f = StdFields()) {
   BlockBuilder b;
   const unsigned int n = static_cast<unsigned int>(f.keys.size());
   b.U32(stamp);
@@ -137,11 +128,11 @@ inline ZvStdFCurve RichStdCurve() {
   curve.SetConstraintAtIndex(3, ZvBaseFCurve::FlatTangent, 1);
   curve.SetClampingValues(-1.5, 2.75);
   curve.SetExtrapolationMethod(ZvBaseFCurve::CycleWithOffsetExtrapolation);
-  curve.SetFCurveUserData(MakeUID(1), Bytes("curve"), 5);
+  curve.SetFCurveUserData(MakeUID(1), TextBytes("curve"), 5);
   double t = 1.0;
-  curve.SetKeyUserData(t, MakeUID(2), Bytes("one"), 3, 0.0);
+  curve.SetKeyUserData(t, MakeUID(2), TextBytes("one"), 3, 0.0);
   t = 4.0;
-  curve.SetKeyUserData(t, MakeUID(3), Bytes("four"), 4, 0.0);
+  curve.SetKeyUserData(t, MakeUID(3), TextBytes("four"), 4, 0.0);
   curve.SetAsTimeFCurve(0);
   return curve;
 }
@@ -153,7 +144,7 @@ inline ZvBooleanFCurve SteppedBoolean() {
   curve.CreateKey(1.5, 1.0);
   double t = 1.5;
   curve.SetConstraint(t, ZvBaseFCurve::ValueLock, 1, 0.0);
-  curve.SetFCurveUserData(MakeUID(6), Bytes("on"), 2);
+  curve.SetFCurveUserData(MakeUID(6), TextBytes("on"), 2);
   return curve;
 }
 
@@ -163,13 +154,13 @@ inline ZvIntegerFCurve SteppedInteger() {
     curve.CreateKey(i * 0.75, i * i - 5.0);
   double t = 0.75;
   curve.SetConstraint(t, ZvBaseFCurve::WholeKeyLock, 1, 0.0);
-  curve.SetKeyUserData(t, MakeUID(7), Bytes("step"), 4, 0.0);
+  curve.SetKeyUserData(t, MakeUID(7), TextBytes("step"), 4, 0.0);
   return curve;
 }
 
 // A rotation block of the older form, "0010", which has no component: two keys out of time
 // order, spins with the top bits set (masked off on reading), parameter locks.
-inline ByteVec QuatBlockWithoutComponent() {
+inline Bytes QuatBlockWithoutComponent() {
   BlockBuilder b;
   b.U32(0x30313030).U32(ZvBaseFCurve::QuatKind).U32(2);
   for (double time : {1.0, 2.0}) {
@@ -189,20 +180,20 @@ inline std::unique_ptr<ZvQuatFCurve> RotationView() {
   rotation.SetKey(ZvQuatKey(1.5, {1.0, -0.5, 0.25}, 0.0f, 0.0f, 0.75f, 1), 0.0);
   rotation.SetConstraintData(1, 6);
   double t = 1.5;
-  view.SetKeyUserData(t, MakeUID(8), Bytes("turn"), 4, 0.0);
+  view.SetKeyUserData(t, MakeUID(8), TextBytes("turn"), 4, 0.0);
   return owner;
 }
 
 // The fuzzer's seeds: one block of each kind as written today and one of each older layout, by
 // file name under fuzz/corpus/fuzz_fcurve_buffer/.
-inline std::vector<std::pair<std::string, ByteVec>> SeedBlocks() {
-  std::vector<std::pair<std::string, ByteVec>> seeds = {
-      {"std_empty", BlockOf(ZvStdFCurve())},
-      {"std_rich", BlockOf(RichStdCurve())},
-      {"quat", BlockOf(*RotationView())},
-      {"boolean", BlockOf(SteppedBoolean())},
-      {"integer", BlockOf(SteppedInteger())},
-      {"raw", BlockOf(ZvRawFCurve(0.0, 1.0, 2.0, 3.0))},
+inline std::vector<std::pair<std::string, Bytes>> SeedBlocks() {
+  std::vector<std::pair<std::string, Bytes>> seeds = {
+      {"std_empty", Block(ZvStdFCurve())},
+      {"std_rich", Block(RichStdCurve())},
+      {"quat", Block(*RotationView())},
+      {"boolean", Block(SteppedBoolean())},
+      {"integer", Block(SteppedInteger())},
+      {"raw", Block(ZvRawFCurve(0.0, 1.0, 2.0, 3.0))},
       {"quat_v0010", QuatBlockWithoutComponent()},
   };
   for (unsigned int stamp : {1u, 256u, 257u, 259u, 261u, 262u})

@@ -67,7 +67,7 @@ inline std::unique_ptr<C> MakeCurve(C::Kind kind, std::mt19937& rng, unsigned in
     if (unit(rng) < 0.1) curve->SetConstraint(at, C::ParameterLock, 1, 0.0);
     if (unit(rng) < 0.1) curve->SetConstraint(at, C::ValueLock, 1, 0.0);
     const std::string data = "key " + std::to_string(i);
-    if (unit(rng) < 0.3) curve->SetKeyUserData(at, uid, Bytes(data), Size(data), 0.0);
+    if (unit(rng) < 0.3) curve->SetKeyUserData(at, uid, TextBytes(data), Size(data), 0.0);
   }
   if (auto* std = dynamic_cast<ZvStdFCurve*>(curve.get())) {
     for (unsigned int i = 0; i < keys.size; ++i) {

@@ -21,8 +21,8 @@ TEST(FCurveFactory, KindsOfBodies) {
   const auto body = [](std::uint32_t stamp, std::uint32_t kind) {
     return BlockBuilder().U32(stamp).U32(kind).body;
   };
-  const ByteVec oldest = body(1, 99), raw = body(264, 30), unknown = body(264, 21),
-                zero = body(0, 20);
+  const Bytes oldest = body(1, 99), raw = body(264, 30), unknown = body(264, 21),
+              zero = body(0, 20);
   EXPECT_EQ(ZvBaseFCurve_GetKindFromBufferBody(oldest.data()), 20u);
   EXPECT_EQ(ZvBaseFCurve_GetKindFromBufferBody(raw.data()), 30u);
   EXPECT_EQ(ZvBaseFCurve_GetKindFromBufferBody(unknown.data()), 0u);
@@ -41,17 +41,17 @@ TEST(FCurveFactory, KindsOfBodies) {
   EXPECT_EQ(ZvBaseFCurve_CreateFromBufferBody(zero.data(), &out), 0u);
   EXPECT_EQ(out, nullptr);
 
-  const ByteVec block = BlockOf(RichStdCurve());
+  const Bytes block = Block(RichStdCurve());
   ASSERT_EQ(ZvBaseFCurve_CreateFromBufferBody(block.data() + 4, &out), 1u);
   std::unique_ptr<ZvBaseFCurve> curve(out);
   EXPECT_EQ(curve->GetKind(), ZvBaseFCurve::StdKind);
-  EXPECT_EQ(BlockOf(*curve), block);
+  EXPECT_EQ(Block(*curve), block);
 }
 
 TEST(FCurveFactory, BoundedReadsTakeBlocksInARow) {
-  ByteVec row = BlockOf(RichStdCurve());
+  Bytes row = Block(RichStdCurve());
   const std::size_t first = row.size();
-  const ByteVec second = StdBlock(257);
+  const Bytes second = StdBlock(257);
   row.insert(row.end(), second.begin(), second.end());
   unsigned int consumed = 0;
   std::unique_ptr<ZvBaseFCurve> a(ZvBaseFCurve_CreateFromBuffer(row.data(), row.size(), consumed));
@@ -69,16 +69,16 @@ TEST(FCurveFactory, BoundedReadsTakeBlocksInARow) {
 TEST(FCurveFactory, EveryTruncatedBlockIsRefused) {
   for (const auto& seed : SeedBlocks()) {
     SCOPED_TRACE(seed.first);
-    const ByteVec& block = seed.second;
+    const Bytes& block = seed.second;
     ZvBaseFCurve* probe = nullptr;
     ASSERT_EQ(ZvBaseFCurve_CreateFromBufferBody(block.data() + 4, &probe), 1u);
     // What the reader needs: its length field and the body bytes it consumes.
     const std::size_t needed = 4 + probe->ReadFromBufferBody(block.data() + 4);
     delete probe;
     ZvStdFCurve target = RichStdCurve();
-    const ByteVec before = BlockOf(target);
+    const Bytes before = Block(target);
     for (std::size_t cut = 0; cut < block.size(); ++cut) {
-      ByteVec prefix(block.begin(), block.begin() + static_cast<std::ptrdiff_t>(cut));
+      Bytes prefix(block.begin(), block.begin() + static_cast<std::ptrdiff_t>(cut));
       unsigned int consumed = 1;
       // The length field asks for more than there is.
       EXPECT_EQ(ZvBaseFCurve_CreateFromBuffer(prefix.data(), cut, consumed), nullptr) << cut;
@@ -96,7 +96,7 @@ TEST(FCurveFactory, EveryTruncatedBlockIsRefused) {
         EXPECT_EQ(target.ReadFromBuffer(prefix.data(), cut), 0u) << cut;
       }
     }
-    EXPECT_EQ(BlockOf(target), before);
+    EXPECT_EQ(Block(target), before);
   }
 }
 
@@ -107,7 +107,7 @@ TEST(FCurveFactory, FuzzSeedsAreTheWrittenBlocks) {
 }
 
 template <class Curve>
-unsigned int ReadBounded(ZvBaseFCurve& curve, const ByteVec& block) {
+unsigned int ReadBounded(ZvBaseFCurve& curve, const Bytes& block) {
   return static_cast<Curve&>(curve).ReadFromBuffer(block.data(), block.size());
 }
 
@@ -117,7 +117,7 @@ TEST(FCurveFactory, BoundedReadersRefuseKeysOutOfOrder) {
   struct Case {
     std::unique_ptr<ZvBaseFCurve> curve;
     std::size_t secondParameter;
-    unsigned int (*read)(ZvBaseFCurve&, const ByteVec&);
+    unsigned int (*read)(ZvBaseFCurve&, const Bytes&);
   };
   std::vector<Case> cases;
   cases.push_back(
@@ -134,25 +134,25 @@ TEST(FCurveFactory, BoundedReadersRefuseKeysOutOfOrder) {
     SCOPED_TRACE(c.curve->GetKind());
     ASSERT_EQ(c.curve->CreateKey(1.0, 1.0), 1u);
     ASSERT_EQ(c.curve->CreateKey(2.0, 0.0), 1u);
-    const ByteVec good = BlockOf(*c.curve);
+    const Bytes good = Block(*c.curve);
     std::unique_ptr<ZvBaseFCurve> target(c.curve->Clone());
     ASSERT_EQ(target->CreateKey(5.0, 1.0), 1u);
-    const ByteVec before = BlockOf(*target);
+    const Bytes before = Block(*target);
     EXPECT_EQ(c.read(*target, good), good.size());
     for (double second : {1.0, 0.5}) {
-      ByteVec bad = good;
+      Bytes bad = good;
       std::memcpy(bad.data() + c.secondParameter, &second, 8);  // little-endian on every target
       unsigned int consumed = 1;
       EXPECT_EQ(ZvBaseFCurve_CreateFromBuffer(bad.data(), bad.size(), consumed), nullptr);
       EXPECT_EQ(consumed, 0u);
       ASSERT_EQ(c.read(*target, before), before.size());
       EXPECT_EQ(c.read(*target, bad), 0u);
-      EXPECT_EQ(BlockOf(*target), before);
+      EXPECT_EQ(Block(*target), before);
       // The trusting body reader takes such a foreign block, and the curve writes it repaired.
       ZvBaseFCurve* probe = nullptr;
       ASSERT_EQ(ZvBaseFCurve_CreateFromBufferBody(bad.data() + 4, &probe), 1u);
       std::unique_ptr<ZvBaseFCurve> foreign(probe);
-      const ByteVec rewritten = BlockOf(*foreign);
+      const Bytes rewritten = Block(*foreign);
       std::unique_ptr<ZvBaseFCurve> back(
           ZvBaseFCurve_CreateFromBuffer(rewritten.data(), rewritten.size(), consumed));
       EXPECT_NE(back, nullptr);

@@ -17,6 +17,8 @@
 #include <memory>
 #include <vector>
 
+#include "tests/support/byte_blocks.h"
+
 namespace {
 
 const double kNaN = std::numeric_limits<double>::quiet_NaN();
@@ -25,12 +27,6 @@ const double kInf = std::numeric_limits<double>::infinity();
 void ExpectAscending(const std::vector<double>& k) {
   for (size_t i = 1; i < k.size(); ++i)
     EXPECT_LT(k[i - 1], k[i]) << "at " << i;
-}
-
-std::vector<unsigned char> BlockOf(const ZvBaseFCurve& c) {
-  std::vector<unsigned char> block(c.GetBufferSize());
-  c.WriteToBuffer(block.data());
-  return block;
 }
 
 std::vector<double> KeysOf(const ZvBaseFCurve& c) {
@@ -410,7 +406,7 @@ TEST(HostileCurveInput, LargeSplicesResamplingsAndReadsTakeLinearTime) {
     ASSERT_EQ(c->Paste(*piece, 10.5, 10.5), 1u);
     EXPECT_EQ(c->GetNumKeys(), 2 * n + 2);
     ASSERT_EQ(c->Append(*piece), 1u);
-    const std::vector<unsigned char> block = BlockOf(*c);
+    const std::vector<unsigned char> block = Block(*c);
     unsigned int consumed = 0;
     std::unique_ptr<ZvBaseFCurve> back(
         ZvBaseFCurve_CreateFromBuffer(block.data(), block.size(), consumed));
@@ -484,12 +480,12 @@ TEST(HostileCurveInput, EditedStandardCurvesWriteBlocksThatReadBackEqual) {
   ZvStdFCurve c;
   ASSERT_EQ(c.ResampleSequence(1e-7, -32, -32, 1, 0), 1u);
   c.ReduceNumKeys(-32, -22.75, -32);
-  const std::vector<unsigned char> block = BlockOf(c);
+  const std::vector<unsigned char> block = Block(c);
   unsigned int consumed = 0;
   std::unique_ptr<ZvBaseFCurve> back(
       ZvBaseFCurve_CreateFromBuffer(block.data(), block.size(), consumed));
   ASSERT_NE(back, nullptr);
-  EXPECT_EQ(BlockOf(*back), block);
+  EXPECT_EQ(Block(*back), block);
 }
 
 }  // namespace

@@ -14,7 +14,7 @@ namespace {
 void Tag(ZvBaseFCurve& curve, const std::vector<std::pair<double, std::string>>& tags) {
   for (const auto& tag : tags) {
     CFCUserDataSet set;
-    set.SetUserData(MakeUID(1), Bytes(tag.second), Size(tag.second));
+    set.SetUserData(MakeUID(1), TextBytes(tag.second), Size(tag.second));
     curve.SetUserDataSet(set, tag.first);
   }
 }
@@ -70,9 +70,9 @@ TEST(KeyUserDataMove, TailMergesIntoTheKeyItLandsOn) {
   TestFCurve curve({0.0, 1.0, 2.0, 3.0, 4.0});
   Tag(curve, {{0.0, "k0"}, {1.0, "k1"}, {3.0, "k3"}, {4.0, "k4"}});
   double t = 1.0;
-  curve.SetKeyUserData(t, MakeUID(2), Bytes("only1"), 5, 0.0);
+  curve.SetKeyUserData(t, MakeUID(2), TextBytes("only1"), 5, 0.0);
   t = 3.0;
-  curve.SetKeyUserData(t, MakeUID(3), Bytes("only3"), 5, 0.0);
+  curve.SetKeyUserData(t, MakeUID(3), TextBytes("only3"), 5, 0.0);
 
   EXPECT_EQ(curve.MoveKeyUserDataTail(Array({3.0, 4.0}), Array({1.0 + 4e-16, 2.0})), 1u);
   EXPECT_EQ(Entries(curve, {0.0, 1.0, 1.0 + 4e-16, 2.0, 3.0, 4.0}),
@@ -134,7 +134,7 @@ TEST(KeyUserDataMove, NonFiniteParametersAreRefused) {
   EXPECT_EQ(curve.HasUserData(nan), 0u);
   EXPECT_EQ(curve.RemoveKeyUserData(nan), 0u);
   CFCUserDataSet set;
-  set.SetUserData(MakeUID(1), Bytes("n"), 1);
+  set.SetUserData(MakeUID(1), TextBytes("n"), 1);
   EXPECT_EQ(curve.SetUserDataSet(set, nan), 0u);
   EXPECT_EQ(curve.CopyKeyUserData(curve, 1.0, nan), 1u);
   EXPECT_EQ(curve.MoveKeyUserDataTail(Array({2.0}), Array({nan})), 0u);

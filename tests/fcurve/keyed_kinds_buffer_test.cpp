@@ -12,7 +12,7 @@
 
 namespace {
 
-std::unique_ptr<ZvBaseFCurve> ReadBounded(const ByteVec& block) {
+std::unique_ptr<ZvBaseFCurve> ReadBounded(const Bytes& block) {
   unsigned int consumed = 0;
   std::unique_ptr<ZvBaseFCurve> curve(
       ZvBaseFCurve_CreateFromBuffer(block.data(), block.size(), consumed));
@@ -44,7 +44,7 @@ TEST(KeyedKindsBuffer, FixedCurvesWriteTheseBytes) {
   double t = 2.5;
   integer.SetConstraint(t, ZvBaseFCurve::ValueLock, 1, 0.0);
   integer.SetExtrapolationMethod(ZvBaseFCurve::CycleExtrapolation);
-  const ByteVec integerBlock = HexBytes(
+  const Bytes integerBlock = HexBytes(
       "4b 00 00 00  02 01 00 00  0f 00 00 00"
       "61 14 f2 84 ca 97 d1 11 93 6a 00 a0 24 3e 35 f0"
       // the first key set the value without keys and the value before the first key
@@ -52,34 +52,34 @@ TEST(KeyedKindsBuffer, FixedCurvesWriteTheseBytes) {
       "00 00 00 00 00 00 f0 3f  fe ff ff ff  00 00"
       "00 00 00 00 00 00 04 40  07 00 00 00  02 00"
       "05 00 00 00  00 01 00 00  00");
-  EXPECT_EQ(BlockOf(integer), integerBlock);
+  EXPECT_EQ(Block(integer), integerBlock);
 
   ZvBooleanFCurve boolean(1.0);
   boolean.CreateKey(0.5, 1.0);
   t = 0.5;
   boolean.SetConstraint(t, ZvBaseFCurve::ParameterLock, 1, 0.0);
-  const ByteVec booleanBlock = HexBytes(
+  const Bytes booleanBlock = HexBytes(
       "34 00 00 00  02 01 00 00  0a 00 00 00"
       "62 14 f2 84 ca 97 d1 11 93 6a 00 a0 24 3e 35 f0"
       "01 01 01 00  01 00 00 00"
       "00 00 00 00 00 00 e0 3f  01  04 00"
       "05 00 00 00  00 01 00 00  00");
-  EXPECT_EQ(BlockOf(boolean), booleanBlock);
+  EXPECT_EQ(Block(boolean), booleanBlock);
 
   const ZvRawFCurve raw(0.0, 1.0, 2.0, 3.0);
-  const ByteVec rawBlock = HexBytes(
+  const Bytes rawBlock = HexBytes(
       "5c 00 00 00  08 01 00 00  1e 00 00 00"
       "00 00 00 00 00 00 f0 3f  ff ff ff ff ff ff ef ff  ff ff ff ff ff ff ef 7f"
       "02 00 00 00  00 00 00 00 00 00 00 00  00 00 00 00 00 00 f0 3f"
       "00 00 00 00 00 00 00 40  00 00 00 00 00 00 08 40"
       "00 00 00 00  02 01 00 00  01 00  05 00 00 00  00 01 00 00  00  08 01 00 00  01");
-  EXPECT_EQ(BlockOf(raw), rawBlock);
+  EXPECT_EQ(Block(raw), rawBlock);
 
   // Each reads back to the same bytes, and the body reader takes the whole body.
-  for (const ByteVec* block : {&integerBlock, &booleanBlock, &rawBlock}) {
+  for (const Bytes* block : {&integerBlock, &booleanBlock, &rawBlock}) {
     const std::unique_ptr<ZvBaseFCurve> curve = ReadBounded(*block);
     ASSERT_NE(curve, nullptr);
-    EXPECT_EQ(BlockOf(*curve), *block);
+    EXPECT_EQ(Block(*curve), *block);
     EXPECT_EQ(curve->ReadFromBufferBody(block->data() + 4), block->size() - 4);
   }
 }
@@ -109,35 +109,35 @@ TEST(KeyedKindsBuffer, RandomCurvesComeBackEqual) {
         curve->SetConstraint(at, ZvBaseFCurve::KeyConstraint(1 + random() % 2), 1, 0.0);
       if (random() % 3 == 0) {
         const std::string data(random() % 4, 'k');
-        curve->SetKeyUserData(at, MakeUID(random() % 3), Bytes(data), Size(data), 0.0);
+        curve->SetKeyUserData(at, MakeUID(random() % 3), TextBytes(data), Size(data), 0.0);
       }
     }
     const ZvBaseFCurve::ExtrapolationMethod methods[] = {
         ZvBaseFCurve::ConstantExtrapolation, ZvBaseFCurve::CycleExtrapolation,
         ZvBaseFCurve::CycleWithOffsetExtrapolation};
     curve->SetExtrapolationMethod(methods[random() % 3]);
-    if (random() % 2) curve->SetFCurveUserData(MakeUID(5), Bytes("c"), 1);
+    if (random() % 2) curve->SetFCurveUserData(MakeUID(5), TextBytes("c"), 1);
     curve->SetAsTimeFCurve(random() % 2);
     curve->SetReadOnlyConstraint(random() % 2);
 
-    const ByteVec block = BlockOf(*curve);
+    const Bytes block = Block(*curve);
     const std::unique_ptr<ZvBaseFCurve> back = ReadBounded(block);
     ASSERT_NE(back, nullptr) << "round " << round;
     EXPECT_EQ(back->GetKind(), curve->GetKind());
     EXPECT_EQ(Shown(*back), Shown(*curve)) << "round " << round;
     for (double x = -60.0; x < 120.0; x += 0.77)
       EXPECT_EQ(back->Eval(x, 0), curve->Eval(x, 0)) << "round " << round << " at " << x;
-    EXPECT_EQ(BlockOf(*back), block) << "round " << round;
+    EXPECT_EQ(Block(*back), block) << "round " << round;
   }
 }
 
 namespace {
 
-const ByteVec kIdentifierTail = HexBytes("ca 97 d1 11 93 6a 00 a0 24 3e 35 f0");
+const Bytes kIdentifierTail = HexBytes("ca 97 d1 11 93 6a 00 a0 24 3e 35 f0");
 
 // A boolean or integer body of `stamp`: header values, then keys of one-byte flags before 258.
-ByteVec StepBlock(unsigned int stamp, bool boolean, int noKeys, int before,
-                  const std::vector<std::pair<double, int>>& keys, unsigned int flags) {
+Bytes StepBlock(unsigned int stamp, bool boolean, int noKeys, int before,
+                const std::vector<std::pair<double, int>>& keys, unsigned int flags) {
   BlockBuilder b;
   b.U32(stamp).U32(boolean ? 10 : 15).U32(boolean ? 0x84F21462u : 0x84F21461u).Raw(kIdentifierTail);
   boolean ? b.U8(noKeys).U8(before) : b.U32(noKeys).U32(before);
@@ -151,7 +151,7 @@ ByteVec StepBlock(unsigned int stamp, bool boolean, int noKeys, int before,
 }
 
 // A raw body of `stamp`, with a flags array behind the marker when `marker` says so.
-ByteVec RawBlock(unsigned int stamp, std::uint32_t marker) {
+Bytes RawBlock(unsigned int stamp, std::uint32_t marker) {
   BlockBuilder b;
   b.U32(stamp).U32(30).F64(0.5).F64(-8.0).F64(8.0).U32(2);
   b.F64(1.0).F64(2.0).F64(3.0).F64(-1.0).U32(marker);
@@ -169,7 +169,7 @@ ByteVec RawBlock(unsigned int stamp, std::uint32_t marker) {
 TEST(KeyedKindsBuffer, OlderVersionsReadIntoTodaysFields) {
   // Boolean 257: one byte of flags; a key's value byte is on only when it is 1, a header byte
   // whenever it is not 0.
-  const ByteVec boolean = StepBlock(257, true, 2, 0, {{1.0, 1}, {2.0, 2}, {3.0, 1}}, 0x04);
+  const Bytes boolean = StepBlock(257, true, 2, 0, {{1.0, 1}, {2.0, 2}, {3.0, 1}}, 0x04);
   std::unique_ptr<ZvBaseFCurve> curve = ReadBounded(boolean);
   ASSERT_NE(curve, nullptr);
   EXPECT_EQ(Shown(*curve), (std::vector<double>{1, 0, 1, 0, 1, 2, 1, 0, 0, 1, 3, 0, 1, 0, 1}));
@@ -184,7 +184,7 @@ TEST(KeyedKindsBuffer, OlderVersionsReadIntoTodaysFields) {
 
   // Integer 257 and 258: the flags word widened.
   for (unsigned int stamp : {257u, 258u}) {
-    const ByteVec block = StepBlock(stamp, false, -4, 6, {{0.5, -70000}, {1.5, 12}}, 0x02);
+    const Bytes block = StepBlock(stamp, false, -4, 6, {{0.5, -70000}, {1.5, 12}}, 0x02);
     curve = ReadBounded(block);
     ASSERT_NE(curve, nullptr) << stamp;
     EXPECT_EQ(Shown(*curve), (std::vector<double>{0.5, 6, -70000, 1, 0, 1.5, -70000, 12, 1, 0}))
@@ -195,7 +195,7 @@ TEST(KeyedKindsBuffer, OlderVersionsReadIntoTodaysFields) {
   for (unsigned int stamp : {256u, 257u, 258u, 259u, 263u, 264u}) {
     for (std::uint32_t marker : {0u, 0xFFFFFFFFu}) {
       SCOPED_TRACE(stamp);
-      const ByteVec block = RawBlock(stamp, marker);
+      const Bytes block = RawBlock(stamp, marker);
       curve = ReadBounded(block);
       ASSERT_NE(curve, nullptr) << marker;
       EXPECT_EQ(Shown(*curve), (std::vector<double>{1, 2, 2, 0, 0, 3, -1, -1, 0, 0}));
@@ -211,41 +211,41 @@ TEST(KeyedKindsBuffer, OlderVersionsReadIntoTodaysFields) {
 }
 
 TEST(KeyedKindsBuffer, RefusedBlocksLeaveTheCurveAlone) {
-  const ByteVec boolean = StepBlock(258, true, 1, 0, {{1.0, 1}}, 0);
-  std::vector<ByteVec> refusedBoolean;
+  const Bytes boolean = StepBlock(258, true, 1, 0, {{1.0, 1}}, 0);
+  std::vector<Bytes> refusedBoolean;
   for (std::size_t at = 12; at < 28; ++at) {
-    ByteVec b = boolean;
+    Bytes b = boolean;
     b[at] ^= 0x01;  // one identifier byte off
     refusedBoolean.push_back(b);
   }
   for (std::uint32_t stamp : {256u, 0xFFFFFFFFu}) {
-    ByteVec b = boolean;
+    Bytes b = boolean;
     for (int i = 0; i < 4; ++i)
       b[4 + i] = static_cast<unsigned char>(stamp >> (8 * i));
     refusedBoolean.push_back(b);
   }
   ZvBooleanFCurve target(0.0);
   target.CreateKey(4.0, 1.0);
-  const ByteVec before = BlockOf(target);
-  for (const ByteVec& b : refusedBoolean) {
+  const Bytes before = Block(target);
+  for (const Bytes& b : refusedBoolean) {
     EXPECT_EQ(target.ReadFromBufferBody(b.data() + 4), 0u);
     EXPECT_EQ(target.ReadFromBuffer(b.data(), b.size()), 0u);
     EXPECT_EQ(ReadBounded(b), nullptr);
   }
-  EXPECT_EQ(BlockOf(target), before);
+  EXPECT_EQ(Block(target), before);
 
   // Raw: a stamp below 256, another kind, a wrong tag.
-  const ByteVec raw = RawBlock(264, 0);
-  std::vector<ByteVec> refusedRaw(4, raw);
+  const Bytes raw = RawBlock(264, 0);
+  std::vector<Bytes> refusedRaw(4, raw);
   refusedRaw[0][5] = 0;                 // stamp 8
   refusedRaw[1][8] = 20;                // the standard kind, which the raw reader refuses
   refusedRaw[2][raw.size() - 20] ^= 1;  // tag 258
   refusedRaw[3][raw.size() - 5] ^= 1;   // tag 264
   ZvRawFCurve rawTarget(0.0, 1.0, 2.0, 3.0);
-  const ByteVec rawBefore = BlockOf(rawTarget);
-  for (const ByteVec& b : refusedRaw) {
+  const Bytes rawBefore = Block(rawTarget);
+  for (const Bytes& b : refusedRaw) {
     EXPECT_EQ(rawTarget.ReadFromBufferBody(b.data() + 4), 0u);
     EXPECT_EQ(rawTarget.ReadFromBuffer(b.data(), b.size()), 0u);
   }
-  EXPECT_EQ(BlockOf(rawTarget), rawBefore);
+  EXPECT_EQ(Block(rawTarget), rawBefore);
 }

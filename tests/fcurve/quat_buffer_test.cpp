@@ -34,14 +34,14 @@ TEST(QuatCurveBuffer, AFixedViewWritesTheseBytes) {
   ZvQuatCurve& rotation = *view.GetQuatCurve();
   rotation.SetKey(ZvQuatKey(1.0, {0.5, -0.25, 2.0}, 0.5f, 0.0f, -1.0f, 3), 0.0);
   rotation.SetValueLock(0, 1);
-  const ByteVec block = HexBytes(
+  const Bytes block = HexBytes(
       "69 00 00 00  31 30 31 30  28 00 00 00  01 00 00 00  01 00 00 00"
       // time, three angles, tension, continuity, bias, spins, value lock (2), zero
       "00 00 00 00 00 00 f0 3f  00 00 00 00 00 00 e0 3f  00 00 00 00 00 00 d0 bf"
       "00 00 00 00 00 00 00 40  00 00 00 3f  00 00 00 00  00 00 80 bf  03 00  02  00"
       "00 00 00 00 00 00 00 00  00 00 00 00 00 00 00 00  00 00 00 00 00 00 00 00"
       "00 00 00 00  01 00 00 00  05 00 00 00  00 01 00 00  00");
-  EXPECT_EQ(BlockOf(view), block);
+  EXPECT_EQ(Block(view), block);
 
   // A read replaces the rotation that every view of it shows.
   ZvQuatFCurve reader(2);
@@ -50,7 +50,7 @@ TEST(QuatCurveBuffer, AFixedViewWritesTheseBytes) {
   EXPECT_EQ(reader.GetComponent(), 1u);
   EXPECT_EQ(sibling.GetNumKeys(), 1u);
   EXPECT_NEAR(sibling.Eval(1.0, 0), 0.5 * 57.29577951308232, 1e-9);
-  EXPECT_EQ(BlockOf(reader), block);
+  EXPECT_EQ(Block(reader), block);
 }
 
 TEST(QuatCurveBuffer, RandomViewsComeBackEqual) {
@@ -70,15 +70,15 @@ TEST(QuatCurveBuffer, RandomViewsComeBackEqual) {
       rotation.SetConstraintData(at, random() % 8);
       if (random() % 3 == 0) {
         double p = t;
-        view.SetKeyUserData(p, MakeUID(random() % 3), Bytes("q"), 1, 0.0);
+        view.SetKeyUserData(p, MakeUID(random() % 3), TextBytes("q"), 1, 0.0);
       }
     }
     rotation.SetValueWhenNoKeys({angle(random), angle(random), angle(random)});
     rotation.SetExtrapolationMethod(1 + random() % 4);
-    if (random() % 2) view.SetFCurveUserData(MakeUID(4), Bytes("view"), 4);
+    if (random() % 2) view.SetFCurveUserData(MakeUID(4), TextBytes("view"), 4);
     rotation.SetReadOnlyConstraint(random() % 2);
 
-    const ByteVec block = BlockOf(view);
+    const Bytes block = Block(view);
     unsigned int consumed = 0;
     std::unique_ptr<ZvBaseFCurve> read(
         ZvBaseFCurve_CreateFromBuffer(block.data(), block.size(), consumed));
@@ -89,12 +89,12 @@ TEST(QuatCurveBuffer, RandomViewsComeBackEqual) {
     ExpectSameRotation(*back.GetQuatCurve(), rotation);
     for (double x = -10.0; x < 60.0; x += 0.61)
       EXPECT_EQ(back.Eval(x, 0), view.Eval(x, 0)) << "round " << round << " at " << x;
-    EXPECT_EQ(BlockOf(back), block) << "round " << round;
+    EXPECT_EQ(Block(back), block) << "round " << round;
   }
 }
 
 TEST(QuatCurveBuffer, TheOlderFormKeepsTheComponent) {
-  const ByteVec block = QuatBlockWithoutComponent();
+  const Bytes block = QuatBlockWithoutComponent();
   ZvQuatFCurve view(2);
   EXPECT_EQ(view.ReadFromBuffer(block.data(), block.size()), block.size());
   EXPECT_EQ(view.GetComponent(), 2u);
@@ -111,8 +111,8 @@ TEST(QuatCurveBuffer, TheOlderFormKeepsTheComponent) {
 TEST(QuatCurveBuffer, RefusedBlocksLeaveTheViewAlone) {
   ZvQuatFCurve source(0);
   source.GetQuatCurve()->SetKey(1.0, {0.1, 0.2, 0.3}, 0.0);
-  const ByteVec good = BlockOf(source);
-  std::vector<ByteVec> refused(3, good);
+  const Bytes good = Block(source);
+  std::vector<Bytes> refused(3, good);
   refused[0][4] = '2';  // stamp "2010"
   refused[1][8] = 20;   // the standard kind behind a rotation stamp
   refused[2].resize(good.size() - 1);
@@ -120,8 +120,8 @@ TEST(QuatCurveBuffer, RefusedBlocksLeaveTheViewAlone) {
 
   ZvQuatFCurve target(1);
   target.CreateKey(5.0, 30.0);
-  const ByteVec before = BlockOf(target);
-  for (const ByteVec& b : refused) {
+  const Bytes before = Block(target);
+  for (const Bytes& b : refused) {
     EXPECT_EQ(target.ReadFromBuffer(b.data(), b.size()), 0u);
     unsigned int consumed = 7;
     EXPECT_EQ(ZvBaseFCurve_CreateFromBuffer(b.data(), b.size(), consumed), nullptr);
@@ -129,5 +129,5 @@ TEST(QuatCurveBuffer, RefusedBlocksLeaveTheViewAlone) {
   }
   for (std::size_t i = 0; i < 2; ++i)
     EXPECT_EQ(target.ReadFromBufferBody(refused[i].data() + 4), 0u);
-  EXPECT_EQ(BlockOf(target), before);
+  EXPECT_EQ(Block(target), before);
 }

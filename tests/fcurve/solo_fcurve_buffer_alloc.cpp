@@ -26,17 +26,17 @@ TEST(FCurveBufferAllocFailure, BodyReaderThrowsAndChangesNothing) {
       ASSERT_EQ(ZvBaseFCurve_CreateFromBufferBody(body, &made), 1u);
       target.reset(made);
       // Unlike the block, so that a half-done read would show.
-      target->SetFCurveUserData(MakeUID(99), Bytes("other"), 5);
+      target->SetFCurveUserData(MakeUID(99), TextBytes("other"), 5);
     };
     fresh();
-    const ByteVec before = BlockOf(*target);
+    const Bytes before = Block(*target);
     unsigned int read = 0;
     const int failures = ForEachFailure([&] { read = target->ReadFromBufferBody(body); },
                                         [&](bool threw) {
                                           // An item's bytes lost while copying are dropped in
                                           // silence; anything else throws.
                                           if (threw) {
-                                            EXPECT_EQ(BlockOf(*target), before);
+                                            EXPECT_EQ(Block(*target), before);
                                           }
                                           EXPECT_EQ(target->GetLockCount(), 0u);
                                           fresh();
@@ -49,7 +49,7 @@ TEST(FCurveBufferAllocFailure, BodyReaderThrowsAndChangesNothing) {
 TEST(FCurveBufferAllocFailure, FactoriesAnswerNull) {
   for (const auto& seed : SeedBlocks()) {
     SCOPED_TRACE(seed.first);
-    const ByteVec& block = seed.second;
+    const Bytes& block = seed.second;
     ZvBaseFCurve* out = nullptr;
     unsigned int result = 0;
     int failures =
@@ -78,7 +78,7 @@ TEST(FCurveBufferAllocFailure, FactoriesAnswerNull) {
         });
     EXPECT_GT(failures, 0);
     ASSERT_NE(curve, nullptr);
-    EXPECT_EQ(BlockOf(*curve), BlockOf(*reference));
+    EXPECT_EQ(Block(*curve), Block(*reference));
     delete curve;
   }
 }

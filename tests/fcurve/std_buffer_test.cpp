@@ -42,7 +42,7 @@ void ExpectSameKeys(const ZvStdFCurve& a, const ZvStdFCurve& b) {
 }
 
 // Reads a body that should be taken whole but for the bytes its writer left unwritten.
-ZvStdFCurve Read(const ByteVec& block, unsigned int unwritten = 0) {
+ZvStdFCurve Read(const Bytes& block, unsigned int unwritten = 0) {
   ZvStdFCurve curve;
   EXPECT_EQ(curve.ReadFromBufferBody(block.data() + 4), block.size() - 4 - unwritten);
   return curve;
@@ -58,12 +58,12 @@ int Flag(const ZvStdFCurve& curve, unsigned int key, ZvBaseFCurve::KeyConstraint
 
 TEST(StdCurveBuffer, FixedCurvesWriteTheseBytes) {
   // No keys, no user data: 77 bytes, of which the reader takes 69 after the length field.
-  const ByteVec empty = HexBytes(
+  const Bytes empty = HexBytes(
       "49 00 00 00  08 01 00 00  14 00 00 00  00 00 00 00 00 00 00 00"
       "ff ff ff ff ff ff ef ff  ff ff ff ff ff ff ef 7f  03 00 00 00  00 00 00 00"
       "01 01 00 00  03 01 00 00  01 00  05 00 00 00  00 01 00 00  00"
       "06 01 00 00  00  08 01 00 00  01  00 00 00 00");
-  EXPECT_EQ(BlockOf(ZvStdFCurve()), empty);
+  EXPECT_EQ(Block(ZvStdFCurve()), empty);
   EXPECT_EQ(ZvStdFCurve().ReadFromBufferBody(empty.data() + 4), 69u);
 
   // One key at 1 with left value 2 and right value 3, a parameter lock, clamps, linear
@@ -74,8 +74,8 @@ TEST(StdCurveBuffer, FixedCurvesWriteTheseBytes) {
   double t = 1.0;
   curve.SetConstraint(t, ZvBaseFCurve::ParameterLock, 1, 0.0);
   _zvUID uid = {0x01020304, 0x0506, 0x0708, {9, 10, 11, 12, 13, 14, 15, 16}};
-  curve.SetFCurveUserData(uid, Bytes("hi"), 2);
-  const ByteVec block = HexBytes(
+  curve.SetFCurveUserData(uid, TextBytes("hi"), 2);
+  const Bytes block = HexBytes(
       "ad 00 00 00  08 01 00 00  14 00 00 00"
       "00 00 00 00 00 00 00 40  00 00 00 00 00 00 10 c0  00 00 00 00 00 00 20 40"
       "01 00 00 00  01 00 00 00"
@@ -89,9 +89,9 @@ TEST(StdCurveBuffer, FixedCurvesWriteTheseBytes) {
       "1e 00 00 00  00 01 00 00  01 00 00 00"
       "04 03 02 01 06 05 08 07  09 0a 0b 0c 0d 0e 0f 10  02 00 00 00  68 69  00"
       "06 01 00 00  00  08 01 00 00  01  00 00 00 00");
-  EXPECT_EQ(BlockOf(curve), block);
+  EXPECT_EQ(Block(curve), block);
   const ZvStdFCurve back = Read(block, 4);
-  EXPECT_EQ(BlockOf(back), block);
+  EXPECT_EQ(Block(back), block);
 }
 
 TEST(StdCurveBuffer, RandomCurvesComeBackEqual) {
@@ -117,18 +117,18 @@ TEST(StdCurveBuffer, RandomCurvesComeBackEqual) {
         double p;
         curve.GetKeyParameter(i, p);
         const std::string data(random() % 5, char('a' + i));
-        curve.SetKeyUserData(p, MakeUID(random() % 3), Bytes(data), Size(data), 0.0);
+        curve.SetKeyUserData(p, MakeUID(random() % 3), TextBytes(data), Size(data), 0.0);
       }
     }
     curve.SetExtrapolationMethod(ZvBaseFCurve::ExtrapolationMethod(1 + random() % 4));
     const double low = value(random);
     curve.SetClampingValues(low, low + std::fabs(value(random)));
-    if (random() % 2) curve.SetFCurveUserData(MakeUID(7), Bytes("c"), 1);
+    if (random() % 2) curve.SetFCurveUserData(MakeUID(7), TextBytes("c"), 1);
     curve.SetDefaultBezierTangentConstraint(random() % 2);
     curve.SetAsTimeFCurve(random() % 2);
     curve.SetReadOnlyConstraint(random() % 2);
 
-    const ByteVec block = BlockOf(curve);
+    const Bytes block = Block(curve);
     unsigned int consumed = 0;
     ZvBaseFCurve* read = ZvBaseFCurve_CreateFromBuffer(block.data(), block.size(), consumed);
     ASSERT_NE(read, nullptr) << "round " << round;
@@ -140,7 +140,7 @@ TEST(StdCurveBuffer, RandomCurvesComeBackEqual) {
       EXPECT_EQ(curve.EvalLeft(x, 0), back.EvalLeft(x, 0)) << "round " << round << " at " << x;
     }
     // The rest (user data, settings) shows in the block written again.
-    EXPECT_EQ(BlockOf(back), block) << "round " << round;
+    EXPECT_EQ(Block(back), block) << "round " << round;
     delete read;
   }
 }
@@ -154,12 +154,11 @@ TEST(StdCurveBuffer, FiniteExtremesOfKeyFieldsWriteUnchanged) {
   f.keys[0].right = std::numeric_limits<double>::denorm_min();
   f.keys[1].left = std::numeric_limits<double>::max();
   f.keys[1].right = std::numeric_limits<double>::lowest();
-  const ByteVec block = StdBlock(264, f);
+  const Bytes block = StdBlock(264, f);
   // The written block only adds the four zeroed tail bytes, which its length word counts.
-  const ByteVec written = BlockOf(Read(block));
+  const Bytes written = Block(Read(block));
   ASSERT_EQ(written.size(), block.size() + 4);
-  EXPECT_EQ(ByteVec(written.begin() + 4, written.end() - 4),
-            ByteVec(block.begin() + 4, block.end()));
+  EXPECT_EQ(Bytes(written.begin() + 4, written.end() - 4), Bytes(block.begin() + 4, block.end()));
 }
 
 TEST(StdCurveBuffer, WritingDropsKeysOutOfOrderWithTheirUserData) {
@@ -183,7 +182,7 @@ TEST(StdCurveBuffer, WritingDropsKeysOutOfOrderWithTheirUserData) {
       "00 00 00 00 00 00 00 40" +
       item + "62");
   f.userData[0] = static_cast<unsigned char>(f.userData.size() - 4);
-  const ByteVec block = StdBlock(264, f);
+  const Bytes block = StdBlock(264, f);
   ZvStdFCurve curve = Read(block);
   EXPECT_EQ(curve.GetNumKeys(), 5u);
   EXPECT_NE(curve.GetUserDataSet(1.0), nullptr);
@@ -202,7 +201,7 @@ TEST(StdCurveBuffer, EveryOlderVersionReadsIntoTodaysFields) {
   const StdFields f;
   for (unsigned int stamp : {1u, 256u, 257u, 258u, 259u, 260u, 261u, 262u, 263u, 264u, 300u}) {
     SCOPED_TRACE(stamp);
-    const ByteVec block = StdBlock(stamp, f);
+    const Bytes block = StdBlock(stamp, f);
     const ZvStdFCurve curve = Read(block);
     ZvBaseFCurve::FCurveInfo info;
     info.mask = 0x7F;
@@ -225,7 +224,7 @@ TEST(StdCurveBuffer, EveryOlderVersionReadsIntoTodaysFields) {
     EXPECT_EQ(left.x, -0.25);
     EXPECT_EQ(right.y, 1.0);
     // The extra bytes came with 259; they travel on into today's block.
-    const ByteVec again = BlockOf(curve);
+    const Bytes again = Block(curve);
     const std::size_t extra = 44 + 3 * 60 + 4 + 6 + 4 + 2;
     EXPECT_EQ(again[extra], stamp >= 259 ? 0xA0 : 0);
     EXPECT_EQ(again[extra + 5], stamp >= 259 ? 0x0B : 0);
@@ -250,7 +249,7 @@ TEST(StdCurveBuffer, OlderBlocksGetHandlesThatMakeFunctions) {
   f.flags = 0;
   for (unsigned int stamp : {256u, 257u, 258u}) {
     SCOPED_TRACE(stamp);
-    const ByteVec block = StdBlock(stamp, f);
+    const Bytes block = StdBlock(stamp, f);
     const ZvStdFCurve curve = Read(block);
     ZvPoint2<double> l0, r0, l1, r1, l2, r2;
     curve.GetActualKeyTgtHandles(0.0, l0, r0, 0.0);
@@ -284,37 +283,37 @@ TEST(StdCurveBuffer, OlderBlocksGetHandlesThatMakeFunctions) {
 }
 
 TEST(StdCurveBuffer, RefusedBodiesLeaveTheCurveAlone) {
-  const ByteVec good = StdBlock(264);
-  std::vector<ByteVec> refused;
+  const Bytes good = StdBlock(264);
+  std::vector<Bytes> refused;
   for (unsigned int stamp : {0u, 2u, 255u}) {
-    ByteVec b = good;
+    Bytes b = good;
     b[4] = static_cast<unsigned char>(stamp);
     b[5] = 0;
     refused.push_back(b);
   }
-  ByteVec kind = good;
+  Bytes kind = good;
   kind[8] = ZvBaseFCurve::RawKind;
   refused.push_back(kind);
   // Each tag in turn: 257, 259, 262, 264.
   for (std::size_t at :
        {std::size_t{44 + 180}, std::size_t{44 + 180 + 10}, good.size() - 10, good.size() - 5}) {
-    ByteVec b = good;
+    Bytes b = good;
     b[at] ^= 0x40;
     refused.push_back(b);
   }
-  ByteVec userData = good;
+  Bytes userData = good;
   userData[44 + 180 + 10 + 4 + 2 + 6 + 5] = 0;  // user data version 0
   refused.push_back(userData);
-  ByteVec oldest = StdBlock(1);
+  Bytes oldest = StdBlock(1);
   oldest[oldest.size() - 1] = 1;  // a key record whose last word is not 0
   refused.push_back(oldest);
 
   ZvStdFCurve target = RichStdCurve();
-  const ByteVec before = BlockOf(target);
+  const Bytes before = Block(target);
   for (std::size_t i = 0; i < refused.size(); ++i) {
     EXPECT_EQ(target.ReadFromBufferBody(refused[i].data() + 4), 0u) << "block " << i;
     EXPECT_EQ(target.ReadFromBuffer(refused[i].data(), refused[i].size()), 0u) << "block " << i;
-    EXPECT_EQ(BlockOf(target), before) << "block " << i;
+    EXPECT_EQ(Block(target), before) << "block " << i;
   }
   // A NaN read from a block becomes 0.0.
   StdFields nan;

@@ -116,7 +116,7 @@ TEST(StdEditConstruct, PartOfACurve) {
     stdedit::SetFlag(curve, t, C::AutoTangent, 1);
   stdedit::SetFlag(curve, 0.0, C::WholeKeyLock, 1);
   double at = 4.5;
-  curve.SetKeyUserData(at, MakeUID(2), Bytes("d"), 1, 0.0);
+  curve.SetKeyUserData(at, MakeUID(2), TextBytes("d"), 1, 0.0);
   curve.SetReadOnlyConstraint(1);
   const ZvStdFCurve part(curve, 2.0, 7.5);
   EXPECT_EQ(part.IsValid(), 1u);

@@ -58,7 +58,7 @@ TEST(StdEditKeys, LockedOrReadOnlyCurvesRefuseAndStayAsTheyWere) {
 TEST(StdEditKeys, MergeReplacesTheIntervalWithTheKindsAsked) {
   ZvStdFCurve curve = stdedit::Mixed();
   double at = 3.0;
-  curve.SetKeyUserData(at, MakeUID(7), Bytes("abc"), 3, 0.0);
+  curve.SetKeyUserData(at, MakeUID(7), TextBytes("abc"), 3, 0.0);
   ASSERT_EQ(
       curve.MergeAndCreateKey(2.0, 5.0, 3.2, 1.0, C::LinearSegment, C::ConstantSegment, 0, 0, 1),
       1u);

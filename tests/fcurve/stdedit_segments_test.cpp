@@ -84,7 +84,7 @@ TEST(StdEditSegments, ExtendingALineMovesItsLastKey) {
   curve.CreateKey(0.0, 0.0);
   curve.AppendLinearSegment({1.0, 2.0});
   double at = 1.0;
-  curve.SetKeyUserData(at, MakeUID(1), Bytes("k"), 1, 0.0);
+  curve.SetKeyUserData(at, MakeUID(1), TextBytes("k"), 1, 0.0);
   ASSERT_EQ(curve.AppendOrExtendLinearSegment({2.0, 4.05}, 0.1), 1u);
   EXPECT_EQ(KeyParams(curve), (V{0.0, 2.0}));
   EXPECT_EQ(curve.Eval(2.0, 0), 4.0);  // on the line, not at the point

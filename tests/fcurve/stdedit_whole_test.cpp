@@ -23,7 +23,7 @@ using stdedit::SetFlag;
 using V = std::vector<double>;
 
 void Tag(ZvStdFCurve& curve, double t, unsigned int id) {
-  curve.SetKeyUserData(t, MakeUID(id), Bytes("x"), 1, 0.0);
+  curve.SetKeyUserData(t, MakeUID(id), TextBytes("x"), 1, 0.0);
 }
 
 TEST(StdEditWhole, CutClosesTheGapAndPasteRestoresIt) {

@@ -17,7 +17,7 @@ inline _zvUID MakeUID(unsigned int n) {
   return uid;
 }
 
-inline const unsigned char* Bytes(const std::string& s) {
+inline const unsigned char* TextBytes(const std::string& s) {
   return reinterpret_cast<const unsigned char*>(s.data());
 }
 

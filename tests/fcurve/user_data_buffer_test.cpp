@@ -29,7 +29,7 @@ TEST(UserDataBuffer, BlocksWithoutAndWithAnEmptyStore) {
   EXPECT_EQ(U32(none, 4), 256u);
   EXPECT_EQ(none[8], 0);
 
-  curve.SetFCurveUserData(MakeUID(1), Bytes("a"), 1);
+  curve.SetFCurveUserData(MakeUID(1), TextBytes("a"), 1);
   curve.RemoveFCurveUserData(MakeUID(1));
   std::vector<unsigned char> empty = Write(curve);
   ASSERT_EQ(empty.size(), 11u);
@@ -44,11 +44,11 @@ TEST(UserDataBuffer, BlocksWithoutAndWithAnEmptyStore) {
 
 TEST(UserDataBuffer, RoundTripOfCurveAndKeyItems) {
   TestFCurve curve({-1.5, 2.0});
-  curve.SetFCurveUserData(MakeUID(1), Bytes("curve"), 5);
+  curve.SetFCurveUserData(MakeUID(1), TextBytes("curve"), 5);
   double t = -1.5;
-  curve.SetKeyUserData(t, MakeUID(2), Bytes("left"), 4, 0.0);
+  curve.SetKeyUserData(t, MakeUID(2), TextBytes("left"), 4, 0.0);
   t = 2.0;
-  curve.SetKeyUserData(t, MakeUID(3), Bytes("right"), 5, 0.0);
+  curve.SetKeyUserData(t, MakeUID(3), TextBytes("right"), 5, 0.0);
   curve.SetKeyUserData(t, MakeUID(4), nullptr, 0, 0.0);
 
   std::vector<unsigned char> buffer = Write(curve);
@@ -74,7 +74,7 @@ TEST(UserDataBuffer, RoundTripOfCurveAndKeyItems) {
 
   // A curve that has a store already only steps over the block.
   TestFCurve holder({2.0});
-  holder.SetFCurveUserData(MakeUID(9), Bytes("mine"), 4);
+  holder.SetFCurveUserData(MakeUID(9), TextBytes("mine"), 4);
   EXPECT_EQ(holder.ReadUserDataFromBufferBody(buffer.data() + 4), buffer.size() - 4);
   EXPECT_EQ(holder.GetUserDataSet(2.0), nullptr);
   EXPECT_EQ(holder.GetFCurveUserData(MakeUID(1), data, size), 0u);
@@ -83,7 +83,7 @@ TEST(UserDataBuffer, RoundTripOfCurveAndKeyItems) {
 TEST(UserDataBuffer, NonFiniteParametersAndRefusedBlocks) {
   TestFCurve curve({1.0});
   CFCUserDataSet set;
-  set.SetUserData(MakeUID(1), Bytes("x"), 1);
+  set.SetUserData(MakeUID(1), TextBytes("x"), 1);
   curve.SetUserDataSet(set, std::numeric_limits<double>::infinity());
   std::vector<unsigned char> buffer = Write(curve);
   double written;

@@ -40,18 +40,18 @@ TEST(UserDataValue, CopiesOwnTheirBytesAndWrappersDoNot) {
 
 TEST(UserDataSet, SetReplacesInsertKeepsRemoveAndMerge) {
   CFCUserDataSet set;
-  set.SetUserData(MakeUID(1), Bytes("one"), 3);
-  set.SetUserData(MakeUID(1), Bytes("uno"), 3);
+  set.SetUserData(MakeUID(1), TextBytes("one"), 3);
+  set.SetUserData(MakeUID(1), TextBytes("uno"), 3);
   EXPECT_EQ(set.GetCount(), 1u);
   EXPECT_EQ(AsString(set.FindUserData(MakeUID(1))), "uno");
 
-  EXPECT_EQ(set.InsertUserData(MakeUID(1), Bytes("eins"), 4), 0u);
-  EXPECT_EQ(set.InsertUserData(MakeUID(2), Bytes("two"), 3), 1u);
+  EXPECT_EQ(set.InsertUserData(MakeUID(1), TextBytes("eins"), 4), 0u);
+  EXPECT_EQ(set.InsertUserData(MakeUID(2), TextBytes("two"), 3), 1u);
   EXPECT_EQ(AsString(set.FindUserData(MakeUID(1))), "uno");
 
   CFCUserDataSet other;
-  other.SetUserData(MakeUID(2), Bytes("deux"), 4);
-  other.SetUserData(MakeUID(3), Bytes("trois"), 5);
+  other.SetUserData(MakeUID(2), TextBytes("deux"), 4);
+  other.SetUserData(MakeUID(3), TextBytes("trois"), 5);
   set.MergeUserData(other);
   EXPECT_EQ(set.GetCount(), 3u);
   EXPECT_EQ(AsString(set.FindUserData(MakeUID(2))), "deux");
@@ -76,7 +76,7 @@ TEST(UserDataSet, OrderIsStrictOverAllSixteenBytes) {
   uids[4].Data4[7] += 1;
   CFCUserDataSet set;
   for (unsigned int i = 0; i < uids.size(); ++i)
-    set.SetUserData(uids[i], Bytes("x"), 1);
+    set.SetUserData(uids[i], TextBytes("x"), 1);
   EXPECT_EQ(set.GetCount(), 5u);
   for (const _zvUID& a : uids) {
     EXPECT_FALSE(CFCUserDataKey(a) < CFCUserDataKey(a));
@@ -90,7 +90,7 @@ TEST(UserDataSet, OrderIsStrictOverAllSixteenBytes) {
 TEST(UserDataSet, BufferBlockLayoutAndRoundTrip) {
   CFCUserDataSet set;
   _zvUID uid = {0x04030201u, 0x0605, 0x0807, {9, 10, 11, 12, 13, 14, 15, 16}};
-  set.SetUserData(uid, Bytes("abc"), 3);
+  set.SetUserData(uid, TextBytes("abc"), 3);
   set.SetUserData(MakeUID(7), nullptr, 0);
   ASSERT_EQ(set.GetBufferSize(), 12u + 23u + 20u);
 
@@ -111,7 +111,7 @@ TEST(UserDataSet, BufferBlockLayoutAndRoundTrip) {
 
   // A set that holds items steps over the block and keeps its own.
   CFCUserDataSet holder;
-  holder.SetUserData(uid, Bytes("keep"), 4);
+  holder.SetUserData(uid, TextBytes("keep"), 4);
   EXPECT_EQ(holder.ReadFromBufferBody(buffer.data() + 4), buffer.size() - 4);
   EXPECT_EQ(holder.GetCount(), 1u);
   EXPECT_EQ(AsString(holder.FindUserData(uid)), "keep");
@@ -141,14 +141,14 @@ std::vector<unsigned char> Written(const CFCUserDataSet& set) {
 
 TEST(UserDataSet, BoundedReadsRefuseCutBlocksAndChangeNothing) {
   CFCUserDataSet set;
-  set.SetUserData(MakeUID(1), Bytes("abc"), 3);
+  set.SetUserData(MakeUID(1), TextBytes("abc"), 3);
   set.SetUserData(MakeUID(2), nullptr, 0);
-  set.SetUserData(MakeUID(3), Bytes("longer item"), 11);
+  set.SetUserData(MakeUID(3), TextBytes("longer item"), 11);
   const std::vector<unsigned char> block = Written(set);
   const unsigned int body = static_cast<unsigned int>(block.size() - 4);
 
   CFCUserDataSet holder;
-  holder.SetUserData(MakeUID(9), Bytes("old"), 3);
+  holder.SetUserData(MakeUID(9), TextBytes("old"), 3);
   for (unsigned int size = 0; size < body; ++size) {
     CFCUserDataSet empty;
     EXPECT_EQ(empty.ReadFromBufferBody(block.data() + 4, size), 0u) << size;

@@ -22,9 +22,9 @@ TEST(UserDataThreads, OneCurveSharedByFourThreads) {
   auto work = [&](unsigned int id) {
     const std::string mine = "thread-" + std::to_string(id);
     for (int i = 0; i < kIterations; ++i) {
-      curve.SetFCurveUserData(MakeUID(id), Bytes(mine), Size(mine));
+      curve.SetFCurveUserData(MakeUID(id), TextBytes(mine), Size(mine));
       double t = (i + id) % keys.size() + 0.2;
-      curve.SetKeyUserData(t, MakeUID(id), Bytes(mine), Size(mine), 0.5);
+      curve.SetKeyUserData(t, MakeUID(id), TextBytes(mine), Size(mine), 0.5);
 
       // Held across several calls: what we read is what we wrote.
       curve.Lock();
@@ -72,7 +72,7 @@ TEST(UserDataThreads, OneCurveSharedByFourThreads) {
     }
     for (double key : keys) {
       double t = key;
-      curve.SetKeyUserData(t, MakeUID(id), Bytes(mine), Size(mine), 0.0);
+      curve.SetKeyUserData(t, MakeUID(id), TextBytes(mine), Size(mine), 0.0);
     }
   };
 

@@ -7,15 +7,9 @@
 #include <random>
 #include <vector>
 
+#include "tests/support/byte_blocks.h"
+
 using P3 = ZvPoint3<double>;
-using Bytes = std::vector<unsigned char>;
-
-inline Bytes Block(const ZvMotionPath3d& path) {
-  Bytes block(path.GetBufferSize(), 0xee);
-  path.WriteToBuffer(block.data());
-  return block;
-}
-
 // Four nodes of cubics at times 0, 1, 2.5, 3, winding through space.
 inline ZvMotionPath3d Wave() {
   ZvMotionPath3d path;

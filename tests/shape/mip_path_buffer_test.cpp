@@ -22,14 +22,6 @@
 
 namespace {
 
-using Bytes = std::vector<unsigned char>;
-
-Bytes Block(const ZvMipPath2fProp1d& mip) {
-  Bytes block(mip.GetBufferSize(), 0xee);
-  EXPECT_EQ(mip.WriteToBuffer(block.data()), block.size());
-  return block;
-}
-
 ZvPath2fProp1d Line(float x0, float y0, float x1, float y1) {
   ZvPath2fProp1d path;
   path.Moveto({x0, y0});

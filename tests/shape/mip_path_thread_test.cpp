@@ -10,16 +10,9 @@
 #include <vector>
 
 #include "mip_path_fixtures.h"
+#include "tests/support/byte_blocks.h"
 
 namespace {
-
-using Bytes = std::vector<unsigned char>;
-
-Bytes Block(const ZvPath2fProp1d& path) {
-  Bytes block(path.GetBufferSize());
-  path.WriteToBuffer(block.data());
-  return block;
-}
 
 TEST(MipPathThreads, AgentsEvaluateConsistentlyWhileOneEdits) {
   // The key at 1 swaps between a sibling of the key at 0 (a blend of points) and a path of

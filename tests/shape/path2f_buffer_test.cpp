@@ -20,14 +20,6 @@
 
 namespace {
 
-using Bytes = std::vector<unsigned char>;
-
-Bytes Block(const ZvShape2f& shape) {
-  Bytes block(shape.GetBufferSize(), 0xee);
-  EXPECT_EQ(shape.WriteToBuffer(block.data()), block.size());
-  return block;
-}
-
 ZvPath2f Line() {
   return Segment(1, -2, 0.5f, 3);
 }

@@ -20,14 +20,6 @@
 
 namespace {
 
-using Bytes = std::vector<unsigned char>;
-
-Bytes Block(const ZvShape2f& shape) {
-  Bytes block(shape.GetBufferSize(), 0xee);
-  EXPECT_EQ(shape.WriteToBuffer(block.data()), block.size());
-  return block;
-}
-
 void PutU32(Bytes& b, std::uint32_t v) {
   for (int i = 0; i < 4; ++i)
     b.push_back(static_cast<unsigned char>(v >> (8 * i)));

@@ -12,17 +12,10 @@
 #include <vector>
 
 #include "mip_path_fixtures.h"
+#include "tests/support/byte_blocks.h"
 #include "tests/support/failing_allocator.h"
 
 namespace {
-
-using Bytes = std::vector<unsigned char>;
-
-Bytes Block(const ZvMipPath2fProp1d& mip) {
-  Bytes block(mip.GetBufferSize());
-  mip.WriteToBuffer(block.data());
-  return block;
-}
 
 ZvMipPath2fProp1d Three() {
   ZvMipPath2fProp1d mip;

@@ -12,19 +12,12 @@
 
 #include "path_fixtures.h"
 #include "path_prop_fixtures.h"
+#include "tests/support/byte_blocks.h"
 #include "tests/support/failing_allocator.h"
 
 using zv_test::ForEachFailure;
 
-namespace {
-
-std::vector<unsigned char> Block(const ZvShape2f& shape) {
-  std::vector<unsigned char> block(shape.GetBufferSize());
-  shape.WriteToBuffer(block.data());
-  return block;
-}
-
-}  // namespace
+namespace {}  // namespace
 
 TEST(PathPropAllocFailure, ReadersLeaveTheObjectAsItWas) {
   std::mt19937 rng(2);

@@ -1,5 +1,6 @@
-// Byte blocks in tests: literal bytes written as hex, and the fuzz targets' seed corpora, which
-// are the blocks the tests' own writers make, so that a format change shows up here first.
+// Byte blocks in tests: the block an object writes, literal bytes written as hex, and the fuzz
+// targets' seed corpora, which are the blocks the tests' own writers make, so that a format
+// change shows up here first.
 #ifndef ZV_TESTS_SUPPORT_BYTE_BLOCKS_H
 #define ZV_TESTS_SUPPORT_BYTE_BLOCKS_H
 
@@ -10,6 +11,17 @@
 #include <iterator>
 #include <string>
 #include <vector>
+
+using Bytes = std::vector<unsigned char>;
+
+// The whole block a persistent object writes (GetBufferSize, then WriteToBuffer); bytes the
+// writer would skip show as 0xEE, and a writer that reports another length fails the test.
+template <class T>
+Bytes Block(const T& object) {
+  Bytes block(object.GetBufferSize(), 0xEE);
+  EXPECT_EQ(object.WriteToBuffer(block.data()), block.size());
+  return block;
+}
 
 // "0a 1b ...": pairs of hex digits; spaces and line breaks are ignored.
 inline std::vector<unsigned char> HexBytes(const std::string& text) {
