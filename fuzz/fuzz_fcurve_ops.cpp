@@ -253,8 +253,16 @@ void Step(ZvBaseFCurve& c, Script& s) {
       c.ReduceNumKeys(a, b, d);
       break;
     case 15: {
+      // A sampling flattens the curve on its way, as a drawing of the interval would: its cycles
+      // are narrowed and its tolerance floored likewise. Far below the floor a sampling runs into
+      // the library's cap on streamed points, which it reaches in over a second under the
+      // sanitizers (a subnormal tolerance makes a million points of every cubic); the unit tests
+      // cover that refusal.
+      const double end = NarrowedCycleEnd(c, a, b, 1.0, 1e6);
+      const double height = c.GetValueUpperBound(0) - c.GetValueLowerBound(0);
+      const double tolerance = DrawingTolerance(s.Number(), end - a, height);
       ZvDoubleArray params, values;
-      c.EvalSequence(a, b, Coarsened(a, b, d), s.Number(), params, values, f0);
+      c.EvalSequence(a, end, Coarsened(a, end, d), tolerance, params, values, f0);
       break;
     }
     case 16: {
