@@ -2,19 +2,13 @@
 #include <zv/fill.h>
 #include <zv/gc.h>
 #include <zv/path2f.h>
+#include <zv/rect2f.h>
 
 #include <gtest/gtest.h>
 
 namespace {
 ZvPath2f Square(float x0, float y0, float x1, float y1) {
-  ZvPath2f p;
-  p.Moveto({x0, y0});
-  p.Lineto({x1, y0});
-  p.Lineto({x1, y1});
-  p.Lineto({x0, y1});
-  p.Lineto({x0, y0});
-  p.Closeto();
-  return p;
+  return ZvPath2f(ZvRect2f({x0, y0}, {x1, y1}));
 }
 
 int calls = 0;

@@ -1,6 +1,7 @@
 // Soft fills against a direct 2-D convolution of the plain fill, and the exact values the run
 // lookups promise inside and far outside a shape.
 #include <zv/gc.h>
+#include <zv/oval2f.h>
 #include <zv/path2f.h>
 
 #include <gtest/gtest.h>
@@ -25,15 +26,7 @@ ZvPath2f Polygon(const std::vector<ZvPoint2<float>>& p) {
 }
 
 ZvPath2f Disc(float cx, float cy, float r) {
-  ZvPath2f path;
-  const float k = 0.5523f * r;
-  path.Moveto({cx + r, cy});
-  path.Curveto({cx + r, cy + k}, {cx + k, cy + r}, {cx, cy + r});
-  path.Curveto({cx - k, cy + r}, {cx - r, cy + k}, {cx - r, cy});
-  path.Curveto({cx - r, cy - k}, {cx - k, cy - r}, {cx, cy - r});
-  path.Curveto({cx + k, cy - r}, {cx + r, cy - k}, {cx + r, cy});
-  path.Closeto();
-  return path;
+  return ZvPath2f(ZvOval2f({cx, cy}, 2 * r, 2 * r));
 }
 
 // The filter taps, sampled from the profile the way the fill is documented to sample it.

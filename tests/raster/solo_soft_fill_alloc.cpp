@@ -4,6 +4,7 @@
 // step's mask leaves the unclipped result.
 #include <zv/gc.h>
 #include <zv/path2f.h>
+#include <zv/rect2f.h>
 
 #include <gtest/gtest.h>
 
@@ -17,14 +18,7 @@ void CountTables(std::size_t n) {
 }
 
 ZvPath2f Square(float x0, float y0, float x1, float y1) {
-  ZvPath2f path;
-  path.Moveto({x0, y0});
-  path.Lineto({x1, y0});
-  path.Lineto({x1, y1});
-  path.Lineto({x0, y1});
-  path.Lineto({x0, y0});
-  path.Closeto();
-  return path;
+  return ZvPath2f(ZvRect2f({x0, y0}, {x1, y1}));
 }
 }  // namespace
 
