@@ -364,8 +364,8 @@ class ZV_API ZvBaseFCurve {
   mutable std::atomic<unsigned int> m_lockCount;
 };
 
-// Declares, inside a concrete curve class, every slot of the contract that the class overrides;
-// the keyed kinds override them all.
+// Declares, inside a concrete curve class, every slot of the contract: each concrete kind
+// overrides them all, and its header notes only where a slot says more than the account above.
 #define ZV_BASE_FCURVE_OVERRIDES                                                                   \
   ZvBaseFCurve& operator=(const ZvBaseFCurve& other) override;                                     \
   ZvBaseFCurve* QueryFCurveKind(Kind kind) const override;                                         \

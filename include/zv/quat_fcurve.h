@@ -183,116 +183,17 @@ class ZV_API ZvQuatFCurve : public ZvBaseFCurve {
   unsigned int AppendOrExtendLinearSegment(const ZvPoint2<double>& point, double tolerance);
 
   // ---- The contract of ZvBaseFCurve ----
-  ZvBaseFCurve& operator=(const ZvBaseFCurve& other) override;
-  ZvBaseFCurve* QueryFCurveKind(Kind kind) const override;
-  Kind GetKind() const override;
-  ZvBaseFCurve* Clone() const override;
-  ZvBaseFCurve* SnapShot(double start, double end, ExtrapolationMethod method) const override;
-  unsigned int CreateKey(double parameter, double value) override;
-  unsigned int MergeAndCreateKey(double start, double end, double parameter, double value,
-                                 int excludeStart, int excludeEnd, int keepAttributes) override;
-  unsigned int CreateNonModifyingKey(double parameter, int noFold) override;
-  unsigned int MergeAndCreateNonModifyingKey(double start, double end, double parameter,
-                                             int excludeStart, int excludeEnd, int keepAttributes,
-                                             int noFold) override;
-  unsigned int RemoveKey(double parameter, double tolerance) override;
-  unsigned int RemoveKeys(double start, double end, int excludeStart, int excludeEnd) override;
-  unsigned int SetValueWhenNoKeys(double value) override;
-  unsigned int GetKeyValue(double parameter, KeySide side, double& value,
-                           double tolerance) const override;
-  unsigned int GetKeyValues(double parameter, double& left, double& right,
-                            double tolerance) const override;
-  unsigned int SetKeyValue(double parameter, KeySide side, double value, double tolerance) override;
-  unsigned int Cut(double start, double end, ZvBaseFCurve& cutOut) override;
-  unsigned int RemoveTail(double parameter) override;
-  unsigned int RemoveHead(double parameter) override;
-  unsigned int Append(const ZvBaseFCurve& curve) override;
-  unsigned int Paste(const ZvBaseFCurve& curve, double start, double end) override;
-  unsigned int ShiftParameters(double delta) override;
-  unsigned int ScaleParameterAxis(double factor) override;
-  unsigned int ShiftValues(double delta) override;
-  unsigned int ReduceNumKeys(double start, double end, double tolerance) override;
-  unsigned int GetFCurveInfo(FCurveInfo* info) const override;
-  unsigned int GetKeyInfoFromIndex(unsigned int index, KeyInfo* info) const override;
-  unsigned int GetKeyInfoFromParameter(double parameter, KeyInfo* info) const override;
-  unsigned int GetKeyParameter(unsigned int index, double& parameter) const override;
-  unsigned int GetKeyIndex(double parameter, unsigned int& index) const override;
-  unsigned int GetNumKeys() const override;
-  unsigned int GetKeyParameters(double start, double end, ZvDoubleArray& parameters,
-                                int excludeStart, int excludeEnd) const override;
-  unsigned int IsKeyParameter(double parameter, double tolerance) const override;
-  unsigned int GetAllKeyParameters(ZvDoubleArray& parameters) const override;
-  unsigned int GetNextKeyParameter(double parameter, double& next, int inclusive) const override;
-  unsigned int GetPrevKeyParameter(double parameter, double& prev, int inclusive) const override;
-  unsigned int GetNearestKeyParameter(double parameter, double& nearest) const override;
-  unsigned int GetNearestKeyParameterInCenteredInterval(double& parameter,
-                                                        double tolerance) const override;
-  unsigned int SetClampingValues(double minValue, double maxValue) override;
-  unsigned int GetClampingValues(double& minValue, double& maxValue) const override;
-  unsigned int GetSmallestKeyParameter(double& parameter) const override;
-  unsigned int IsSmallestKeyParameter(double parameter) const override;
-  double GetMinusInfinityVal() const override;
-  unsigned int GetLargestKeyParameter(double& parameter) const override;
-  unsigned int IsLargestKeyParameter(double parameter) const override;
-  double GetPlusInfinityVal() const override;
-  double GetValueUpperBound(int clamped) const override;
-  double GetValueLowerBound(int clamped) const override;
-  double Eval(double parameter, int clamped) const override;
-  // Samples Eval at start, start + step, ... while below end, then at end; replaces the arrays'
-  // contents and returns the number of samples (0 for a step that is not positive).
-  unsigned int EvalSequence(double start, double end, double step, double tolerance,
-                            ZvDoubleArray& parameters, ZvDoubleArray& values,
-                            int clamped) const override;
-  unsigned int Flatten(const ZvTransfo4& transfo, double tolerance, ZvPoint2dArray& points,
-                       ZvPointTagArray& tags, int clamped) const override;
-  unsigned int FlattenFromTo(const ZvExtent2<double>& box, const ZvTransfo4& transfo,
-                             double tolerance, ZvPoint2dArray& points, ZvPointTagArray& tags,
-                             ZvBoolArray& extrapolated, int clamped) const override;
-  unsigned int GetKeys(ZvDoubleArray& parameters, ZvDoubleArray& leftValues,
-                       ZvDoubleArray& rightValues, int clamped) const override;
-  unsigned int ResampleSequence(double start, double end, double step, int keepExistingKeys,
-                                int ignoredFlag) override;
-  unsigned int SmoothSequence(double start, double end, const double* kernel,
-                              unsigned int kernelSize) override;
-  unsigned int MirrorValues() override;
-  unsigned int MirrorParameters() override;
-  unsigned int ScaleAndOffsetParameters(double start, double end, double pivot, double scale,
-                                        double offset, int moveHead, int moveTail,
-                                        RegionHandle handle) override;
-  unsigned int SetReadOnlyConstraint(int on) override;
-  unsigned int IsReadOnly() const override;
-  unsigned int SetConstraint(double& parameter, KeyConstraint constraints, int on,
-                             double tolerance) override;
-  unsigned int GetConstraint(double& parameter, KeyConstraint constraint, int& on,
-                             double tolerance) const override;
-  unsigned int IsConstraintSupported(KeyConstraint constraint) const override;
-  unsigned int AreAnyValuesLockedInInterval(double start, double end, int excludeStart,
-                                            int excludeEnd) const override;
-  unsigned int AreAnyParametersLockedInInterval(double start, double end, int excludeStart,
-                                                int excludeEnd) const override;
-  unsigned int AreAnyKeysLockedInInterval(double start, double end, int excludeStart,
-                                          int excludeEnd) const override;
-  unsigned int SetExtrapolationMethod(ExtrapolationMethod method) override;
-  ExtrapolationMethod GetExtrapolationMethod() const override;
-  double FoldParameter(double parameter) const override;
-  unsigned int GetBufferSize() const override;
-  unsigned int WriteToBuffer(void* buffer) const override;
-  unsigned int ReadFromBufferBody(const void* body) override;
+  // Beyond the base class's account: EvalSequence samples Eval at start, start + step, ... while
+  // below end, then at end, replaces the arrays' contents and returns the number of samples (0
+  // for a step that is not positive); EvalInverse writes the largest float to `parameter` and
+  // returns 0, as a rotation angle has no inverse; Set, from another rotation view, takes its
+  // component and a copy of its rotation curve.
+  ZV_BASE_FCURVE_OVERRIDES
   // Reads a whole block of `size` bytes, length field included, refusing one whose length exceeds
   // `size`, whose contents would be read past its body, or whose keys do not stand in strictly
   // ascending order (the body reader takes those and repairs them on writing): the bytes taken
   // (4 + the stored length), or 0 with the curve unchanged. Otherwise exactly ReadFromBufferBody.
   unsigned int ReadFromBuffer(const void* buffer, std::size_t size);
-  unsigned int ScaleAndShiftValues(double scale, double offset) override;
-  // Writes the largest float to `parameter` and returns 0: a rotation angle has no inverse.
-  unsigned int EvalInverse(double value, double& parameter, int clamped) const override;
-  unsigned int IsBijective() const override;
-  unsigned int SetDefaultBezierTangentConstraint(int on) override;
-  unsigned int IsDefautlBezierTangentConstraintOn() const override;
-  unsigned int SetAsTimeFCurve(int on) override;
-  unsigned int IsTimeFCurve() const override;
-  // From another rotation view: takes its component and a copy of its rotation curve.
-  unsigned int Set(const ZvBaseFCurve& curve) override;
 
  private:
   // The reader behind ReadFromBufferBody and ReadFromBuffer; the latter asks for ascending keys.
