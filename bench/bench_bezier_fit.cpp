@@ -170,29 +170,25 @@ int main(int argc, char** argv) {
       state.counters["seg/stroke"] = static_cast<double>(segments) / kStrokes;
     })->Unit(benchmark::kMillisecond);
   }
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-
-  std::printf(
-      "\n%d pen strokes of %u points, tolerance %.1f (2geom: squared error %.1f).\n"
-      "us/stroke: median CPU time of the runs above. max dist: the largest distance of an input\n"
-      "point from its fitted chain, per stroke; mean and maximum over the strokes, and the share\n"
-      "of strokes beyond the tolerance. Ratios against zv-OpenFit-d3.\n\n",
-      kStrokes, kPointsPerStroke, kTolerance, kTolerance * kTolerance);
-  std::printf("%-16s %10s %10s %10s %10s %8s %10s %10s\n", "method", "us/stroke", "seg/stroke",
-              "mean max", "max max", ">tol %", "time", "segments");
-  const double zvTime = reporter.MedianSeconds(methods[0].name) / kStrokes * 1e6;
-  const Accuracy zv = Measure(methods[0]);
-  for (const Method& m : methods) {
-    const double us = reporter.MedianSeconds(m.name) / kStrokes * 1e6;
-    if (us == 0.0) continue;
-    const Accuracy a = &m == &methods[0] ? zv : Measure(m);
-    std::printf("%-16s %10.1f %10.2f %10.3f %10.3f %8.1f %9.2fx %9.2fx\n", m.name.c_str(), us,
-                a.segmentsPerStroke, a.meanMax, a.maxMax, a.overTolerance,
-                zvTime > 0 ? us / zvTime : 0.0, a.segmentsPerStroke / zv.segmentsPerStroke);
-  }
-  benchmark::Shutdown();
-  return 0;
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    std::printf(
+        "\n%d pen strokes of %u points, tolerance %.1f (2geom: squared error %.1f).\n"
+        "us/stroke: median CPU time of the runs above. max dist: the largest distance of an input\n"
+        "point from its fitted chain, per stroke; mean and maximum over the strokes, and the "
+        "share\n"
+        "of strokes beyond the tolerance. Ratios against zv-OpenFit-d3.\n\n",
+        kStrokes, kPointsPerStroke, kTolerance, kTolerance * kTolerance);
+    std::printf("%-16s %10s %10s %10s %10s %8s %10s %10s\n", "method", "us/stroke", "seg/stroke",
+                "mean max", "max max", ">tol %", "time", "segments");
+    const double zvTime = reporter.MedianSeconds(methods[0].name) / kStrokes * 1e6;
+    const Accuracy zv = Measure(methods[0]);
+    for (const Method& m : methods) {
+      const double us = reporter.MedianSeconds(m.name) / kStrokes * 1e6;
+      if (us == 0.0) continue;
+      const Accuracy a = &m == &methods[0] ? zv : Measure(m);
+      std::printf("%-16s %10.1f %10.2f %10.3f %10.3f %8.1f %9.2fx %9.2fx\n", m.name.c_str(), us,
+                  a.segmentsPerStroke, a.meanMax, a.maxMax, a.overTolerance,
+                  zvTime > 0 ? us / zvTime : 0.0, a.segmentsPerStroke / zv.segmentsPerStroke);
+    }
+  });
 }

@@ -89,22 +89,17 @@ BENCHMARK(BM_ReadBounded)->Repetitions(5)->ReportAggregatesOnly(true);
 BENCHMARK(BM_Memcpy)->Repetitions(5)->ReportAggregatesOnly(true);
 
 int main(int argc, char** argv) {
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
   TheBlock();  // built outside the timings
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-  benchmark::Shutdown();
-
-  const double megabytes = static_cast<double>(TheBlock().size()) / 1e6;
-  const double copy = reporter.FunctionMedianSeconds("BM_Memcpy");
-  std::printf("\nmedian MB/s, a block of %d keys (%zu bytes)\n", kKeys, TheBlock().size());
-  std::printf("  memcpy          %10.1f\n", copy > 0.0 ? megabytes / copy : 0.0);
-  for (const char* name : {"BM_Write", "BM_Read", "BM_ReadBounded"}) {
-    const double seconds = reporter.FunctionMedianSeconds(name);
-    if (seconds <= 0.0 || copy <= 0.0) continue;
-    std::printf("  %-15s %10.1f   memcpy is %.1f times faster (target: at most 5)\n", name + 3,
-                megabytes / seconds, seconds / copy);
-  }
-  return 0;
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    const double megabytes = static_cast<double>(TheBlock().size()) / 1e6;
+    const double copy = reporter.FunctionMedianSeconds("BM_Memcpy");
+    std::printf("\nmedian MB/s, a block of %d keys (%zu bytes)\n", kKeys, TheBlock().size());
+    std::printf("  memcpy          %10.1f\n", copy > 0.0 ? megabytes / copy : 0.0);
+    for (const char* name : {"BM_Write", "BM_Read", "BM_ReadBounded"}) {
+      const double seconds = reporter.FunctionMedianSeconds(name);
+      if (seconds <= 0.0 || copy <= 0.0) continue;
+      std::printf("  %-15s %10.1f   memcpy is %.1f times faster (target: at most 5)\n", name + 3,
+                  megabytes / seconds, seconds / copy);
+    }
+  });
 }

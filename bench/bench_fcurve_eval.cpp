@@ -98,30 +98,29 @@ BENCHMARK(BM_GslRandom)->Repetitions(5)->ReportAggregatesOnly(true);
 
 int main(int argc, char** argv) {
   TheCurve();  // built outside the timings
-  ZvMedianReporter reporter;
-  if (EvalBenchRun(argc, argv, reporter)) return 1;
-
-  auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name) * 1e9; };
-  const double zvSeq = median("BM_ZvSequential"), zvRnd = median("BM_ZvRandom");
-  const double lock = median("BM_ZvLockUnlock");
-  const double sequence =
-      median("BM_ZvEvalSequence") / static_cast<double>(TheData().sequential.size());
-  std::printf("\nmedian ns per evaluation, %d keys\n", kKeys);
-  std::printf("  zv  Eval sequential %8.1f   random %8.1f\n", zvSeq, zvRnd);
-  std::printf("  zv  EvalSequence, the same sweep %8.1f per sample\n", sequence);
-  if (zvSeq > 0.0) {
-    std::printf("  lock + unlock alone %8.1f   (%.0f%% of a sequential Eval)\n", lock,
-                100.0 * lock / zvSeq);
-  }
+  EvalBenchQuietPeers();
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name) * 1e9; };
+    const double zvSeq = median("BM_ZvSequential"), zvRnd = median("BM_ZvRandom");
+    const double lock = median("BM_ZvLockUnlock");
+    const double sequence =
+        median("BM_ZvEvalSequence") / static_cast<double>(TheData().sequential.size());
+    std::printf("\nmedian ns per evaluation, %d keys\n", kKeys);
+    std::printf("  zv  Eval sequential %8.1f   random %8.1f\n", zvSeq, zvRnd);
+    std::printf("  zv  EvalSequence, the same sweep %8.1f per sample\n", sequence);
+    if (zvSeq > 0.0) {
+      std::printf("  lock + unlock alone %8.1f   (%.0f%% of a sequential Eval)\n", lock,
+                  100.0 * lock / zvSeq);
+    }
 #if ZV_HAVE_GSL
-  const double gslSeq = median("BM_GslSequential"), gslRnd = median("BM_GslRandom");
-  std::printf("  gsl spline sequential %6.1f   random %8.1f\n", gslSeq, gslRnd);
-  if (gslSeq > 0.0 && gslRnd > 0.0) {
-    std::printf("  ratio zv / gsl: sequential %.2f (target 2.5), random %.2f (target 3)\n",
-                zvSeq / gslSeq, zvRnd / gslRnd);
-  }
+    const double gslSeq = median("BM_GslSequential"), gslRnd = median("BM_GslRandom");
+    std::printf("  gsl spline sequential %6.1f   random %8.1f\n", gslSeq, gslRnd);
+    if (gslSeq > 0.0 && gslRnd > 0.0) {
+      std::printf("  ratio zv / gsl: sequential %.2f (target 2.5), random %.2f (target 3)\n",
+                  zvSeq / gslSeq, zvRnd / gslRnd);
+    }
 #else
-  std::printf("  GSL not found at configure time: no comparison\n");
+    std::printf("  GSL not found at configure time: no comparison\n");
 #endif
-  return 0;
+  });
 }

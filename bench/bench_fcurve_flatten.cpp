@@ -133,24 +133,20 @@ BENCHMARK(BM_CairoCopyPathFlat)
 #endif
 
 int main(int argc, char** argv) {
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
   TheCurve();  // built outside the timings
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-  benchmark::Shutdown();
-  auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name); };
-  const double whole = median("BM_ZvFlatten") * 1e3,
-               box = median("BM_ZvFlattenFromTo100Keys") * 1e6;
-  std::printf("\nmedians, %d keys, tolerance %.2f\n", kKeys, kTolerance);
-  std::printf("  zv Flatten whole curve      %8.3f ms (target well under 10 ms)\n", whole);
-  std::printf("  zv FlattenFromTo, 100 keys  %8.1f us\n", box);
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name); };
+    const double whole = median("BM_ZvFlatten") * 1e3,
+                 box = median("BM_ZvFlattenFromTo100Keys") * 1e6;
+    std::printf("\nmedians, %d keys, tolerance %.2f\n", kKeys, kTolerance);
+    std::printf("  zv Flatten whole curve      %8.3f ms (target well under 10 ms)\n", whole);
+    std::printf("  zv FlattenFromTo, 100 keys  %8.1f us\n", box);
 #if ZV_HAVE_CAIRO
-  const double cairo = median("BM_CairoCopyPathFlat") * 1e3;
-  std::printf("  cairo copy_path_flat        %8.3f ms   ratio zv / cairo %.2f\n", cairo,
-              cairo > 0.0 ? whole / cairo : 0.0);
+    const double cairo = median("BM_CairoCopyPathFlat") * 1e3;
+    std::printf("  cairo copy_path_flat        %8.3f ms   ratio zv / cairo %.2f\n", cairo,
+                cairo > 0.0 ? whole / cairo : 0.0);
 #else
-  std::printf("  cairo not found at configure time: no comparison\n");
+    std::printf("  cairo not found at configure time: no comparison\n");
 #endif
-  return 0;
+  });
 }

@@ -521,11 +521,6 @@ int main(int argc, char** argv) {
   for (int scene = 0; scene < 5; ++scene)
     GetScene(scene);  // built outside the timings
   Register();
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-  PrintSummary(reporter);
-  benchmark::Shutdown();
-  return 0;
+  return ZvRunBenchmarks(argc, argv,
+                         [&](const ZvMedianReporter& reporter) { PrintSummary(reporter); });
 }

@@ -300,31 +300,26 @@ int main(int argc, char** argv) {
       })->Unit(benchmark::kMillisecond);
     }
   }
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-
-  std::printf(
-      "\nPer cubic over %d random cubics (spans 10-1000 px). ns/cubic: median CPU time of the\n"
-      "runs above (on a shared machine the wall clock also counts other processes). Distances:\n"
-      "largest distance of each polyline from its true curve, as mean, 99th percentile and\n"
-      "maximum over the cubics, and the share of cubics straying beyond the tolerance.\n"
-      "ratio: time / time of zv.\n\n",
-      kCubicCount);
-  std::printf("%-12s %5s %10s %9s %10s %10s %10s %7s %12s\n", "method", "tol", "ns/cubic",
-              "pts/cubic", "mean max", "p99 max", "max max", ">tol %", "ratio");
-  for (double tol : kTolerances) {
-    const double zv = reporter.MedianSeconds(Key("zv", tol)) / kCubicCount * 1e9;
-    for (const Method& m : methods) {
-      const double ns = reporter.MedianSeconds(Key(m.name, tol)) / kCubicCount * 1e9;
-      if (ns == 0.0) continue;
-      const Accuracy a = Measure(m.make(tol), tol);
-      std::printf("%-12s %5.2f %10.1f %9.2f %10.4f %10.4f %10.4f %7.2f %11.2fx\n", m.name.c_str(),
-                  tol, ns, a.pointsPerCubic, a.meanMax, a.p99Max, a.maxMax, a.overTolerance,
-                  zv > 0.0 ? ns / zv : 0.0);
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    std::printf(
+        "\nPer cubic over %d random cubics (spans 10-1000 px). ns/cubic: median CPU time of the\n"
+        "runs above (on a shared machine the wall clock also counts other processes). Distances:\n"
+        "largest distance of each polyline from its true curve, as mean, 99th percentile and\n"
+        "maximum over the cubics, and the share of cubics straying beyond the tolerance.\n"
+        "ratio: time / time of zv.\n\n",
+        kCubicCount);
+    std::printf("%-12s %5s %10s %9s %10s %10s %10s %7s %12s\n", "method", "tol", "ns/cubic",
+                "pts/cubic", "mean max", "p99 max", "max max", ">tol %", "ratio");
+    for (double tol : kTolerances) {
+      const double zv = reporter.MedianSeconds(Key("zv", tol)) / kCubicCount * 1e9;
+      for (const Method& m : methods) {
+        const double ns = reporter.MedianSeconds(Key(m.name, tol)) / kCubicCount * 1e9;
+        if (ns == 0.0) continue;
+        const Accuracy a = Measure(m.make(tol), tol);
+        std::printf("%-12s %5.2f %10.1f %9.2f %10.4f %10.4f %10.4f %7.2f %11.2fx\n", m.name.c_str(),
+                    tol, ns, a.pointsPerCubic, a.meanMax, a.p99Max, a.maxMax, a.overTolerance,
+                    zv > 0.0 ? ns / zv : 0.0);
+      }
     }
-  }
-  benchmark::Shutdown();
-  return 0;
+  });
 }

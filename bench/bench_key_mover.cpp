@@ -81,22 +81,20 @@ BENCHMARK_TEMPLATE(BM_Copy, ZvRawFCurve)
 }  // namespace
 
 int main(int argc, char** argv) {
-  benchmark::Initialize(&argc, argv);
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-  auto ms = [&](const std::string& name) { return reporter.MedianSeconds(name) * 1e3; };
-  std::printf("\nmedian ms per Update (selection of every 100th key)\n");
-  for (const char* kind : {"ZvStdFCurve", "ZvRawFCurve"}) {
-    const std::string update = std::string("BM_Update<") + kind + ">/",
-                      copy = std::string("BM_Copy<") + kind + ">/";
-    const double small = ms(update + "10000/repeats:5"), large = ms(update + "100000/repeats:5");
-    const double copySmall = ms(copy + "10000/repeats:5"),
-                 copyLarge = ms(copy + "100000/repeats:5");
-    std::printf("  %s  10,000 keys %.4f   100,000 keys %.4f   growth x%.1f (linear: x10)\n", kind,
-                small, large, small > 0 ? large / small : 0.0);
-    std::printf("  %s  whole-curve copy %.4f / %.4f   Update / copy %.2f / %.2f\n", kind, copySmall,
-                copyLarge, copySmall > 0 ? small / copySmall : 0.0,
-                copyLarge > 0 ? large / copyLarge : 0.0);
-  }
-  return 0;
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    auto ms = [&](const std::string& name) { return reporter.MedianSeconds(name) * 1e3; };
+    std::printf("\nmedian ms per Update (selection of every 100th key)\n");
+    for (const char* kind : {"ZvStdFCurve", "ZvRawFCurve"}) {
+      const std::string update = std::string("BM_Update<") + kind + ">/",
+                        copy = std::string("BM_Copy<") + kind + ">/";
+      const double small = ms(update + "10000/repeats:5"), large = ms(update + "100000/repeats:5");
+      const double copySmall = ms(copy + "10000/repeats:5"),
+                   copyLarge = ms(copy + "100000/repeats:5");
+      std::printf("  %s  10,000 keys %.4f   100,000 keys %.4f   growth x%.1f (linear: x10)\n", kind,
+                  small, large, small > 0 ? large / small : 0.0);
+      std::printf("  %s  whole-curve copy %.4f / %.4f   Update / copy %.2f / %.2f\n", kind,
+                  copySmall, copyLarge, copySmall > 0 ? small / copySmall : 0.0,
+                  copyLarge > 0 ? large / copyLarge : 0.0);
+    }
+  });
 }

@@ -68,21 +68,16 @@ int main(int argc, char** argv) {
       ->Unit(benchmark::kMicrosecond);
   benchmark::RegisterBenchmark("LinearMorph/non-siblings", BM_LinearMorph, false)
       ->Unit(benchmark::kMicrosecond);
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-
-  const double sibling = reporter.MedianSeconds("LinearMorph/siblings") * 1e6;
-  const double general = reporter.MedianSeconds("LinearMorph/non-siblings") * 1e6;
-  std::printf("\nMedian CPU time per morph of two paths of %u cubics (us)\n\n", kSegments);
-  std::printf("%-14s %12s %12s\n", "pair", "us/morph", "out points");
-  std::printf("%-14s %12.1f %12.0f\n", "siblings", sibling,
-              reporter.Counter("LinearMorph/siblings", "out points"));
-  std::printf("%-14s %12.1f %12.0f\n", "non-siblings", general,
-              reporter.Counter("LinearMorph/non-siblings", "out points"));
-  if (sibling > 0.0)
-    std::printf("\nnon-siblings / siblings: %.1fx (target: at least 5x)\n", general / sibling);
-  benchmark::Shutdown();
-  return 0;
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    const double sibling = reporter.MedianSeconds("LinearMorph/siblings") * 1e6;
+    const double general = reporter.MedianSeconds("LinearMorph/non-siblings") * 1e6;
+    std::printf("\nMedian CPU time per morph of two paths of %u cubics (us)\n\n", kSegments);
+    std::printf("%-14s %12s %12s\n", "pair", "us/morph", "out points");
+    std::printf("%-14s %12.1f %12.0f\n", "siblings", sibling,
+                reporter.Counter("LinearMorph/siblings", "out points"));
+    std::printf("%-14s %12.1f %12.0f\n", "non-siblings", general,
+                reporter.Counter("LinearMorph/non-siblings", "out points"));
+    if (sibling > 0.0)
+      std::printf("\nnon-siblings / siblings: %.1fx (target: at least 5x)\n", general / sibling);
+  });
 }

@@ -104,28 +104,23 @@ BENCHMARK(BM_Eval)->Arg(200)->Arg(2000)->Repetitions(5)->ReportAggregatesOnly(tr
 BENCHMARK(BM_EvalSequence)->Arg(200)->Arg(2000)->Repetitions(5)->ReportAggregatesOnly(true);
 
 int main(int argc, char** argv) {
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
   ThePath(200);
   ThePath(2000);
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-  benchmark::Shutdown();
-
-  const auto median = [&](const std::string& name) {
-    return reporter.MedianSeconds(name + "/repeats:5") * 1e9;
-  };
-  const double flatten = reporter.FunctionMedianSeconds("BM_FlattenOneSegment") * 1e9;
-  std::printf("\nmedian ns, tolerance %g, %d sequential times\n", kTolerance, kSamples);
-  std::printf("  FlattenCubic3d of one segment %10.1f\n", flatten);
-  for (int nodes : {200, 2000}) {
-    const std::string arg = "/" + std::to_string(nodes);
-    const double eval = median("BM_Eval" + arg);
-    const double sequence = median("BM_EvalSequence" + arg) / kSamples;
-    std::printf(
-        "  %4d nodes: Eval %8.1f per call (%.3f of a flatten, target <= 0.2),"
-        " EvalSequence %8.1f per sample\n",
-        nodes, eval, flatten > 0.0 ? eval / flatten : 0.0, sequence);
-  }
-  return 0;
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    const auto median = [&](const std::string& name) {
+      return reporter.MedianSeconds(name + "/repeats:5") * 1e9;
+    };
+    const double flatten = reporter.FunctionMedianSeconds("BM_FlattenOneSegment") * 1e9;
+    std::printf("\nmedian ns, tolerance %g, %d sequential times\n", kTolerance, kSamples);
+    std::printf("  FlattenCubic3d of one segment %10.1f\n", flatten);
+    for (int nodes : {200, 2000}) {
+      const std::string arg = "/" + std::to_string(nodes);
+      const double eval = median("BM_Eval" + arg);
+      const double sequence = median("BM_EvalSequence" + arg) / kSamples;
+      std::printf(
+          "  %4d nodes: Eval %8.1f per call (%.3f of a flatten, target <= 0.2),"
+          " EvalSequence %8.1f per sample\n",
+          nodes, eval, flatten > 0.0 ? eval / flatten : 0.0, sequence);
+    }
+  });
 }

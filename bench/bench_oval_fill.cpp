@@ -218,21 +218,18 @@ int main(int argc, char** argv) {
 #if ZV_HAVE_CAIRO
   benchmark::RegisterBenchmark(kNames[4], Cairo)->Unit(benchmark::kMillisecond);
 #endif
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-  const double direct = reporter.MedianSeconds(kNames[0]) * 1e3;
-  std::printf("\nMedian CPU ms per scene (400 ovals, 1024x1024, aliased); ratio: time / direct.\n");
-  std::printf("Targets: path fill at least 2 times the direct time, both peers above it.\n\n");
-  std::printf("%-20s %10s %8s\n", "contender", "median ms", "ratio");
-  for (const char* name : kNames) {
-    const double ms = reporter.MedianSeconds(name) * 1e3;
-    if (ms <= 0.0) continue;
-    std::printf("%-20s %10.3f %8.2f\n", name, ms, direct > 0.0 ? ms / direct : 0.0);
-  }
-  std::printf("\npixels differing between the direct fill and the path fill: %d of %d\n",
-              Differences(), kSize * kSize);
-  benchmark::Shutdown();
-  return 0;
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    const double direct = reporter.MedianSeconds(kNames[0]) * 1e3;
+    std::printf(
+        "\nMedian CPU ms per scene (400 ovals, 1024x1024, aliased); ratio: time / direct.\n");
+    std::printf("Targets: path fill at least 2 times the direct time, both peers above it.\n\n");
+    std::printf("%-20s %10s %8s\n", "contender", "median ms", "ratio");
+    for (const char* name : kNames) {
+      const double ms = reporter.MedianSeconds(name) * 1e3;
+      if (ms <= 0.0) continue;
+      std::printf("%-20s %10.3f %8.2f\n", name, ms, direct > 0.0 ? ms / direct : 0.0);
+    }
+    std::printf("\npixels differing between the direct fill and the path fill: %d of %d\n",
+                Differences(), kSize * kSize);
+  });
 }

@@ -129,30 +129,25 @@ int main(int argc, char** argv) {
       state.counters["seg/stroke"] = static_cast<double>(segments) / kStrokes;
     })->Unit(benchmark::kMillisecond);
   }
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-
-  std::printf("\n%d pen strokes of %u points. us/stroke: median CPU time per stroke.%s\n\n",
-              kStrokes, kPointsPerStroke,
-              ZV_HAVE_2GEOM ? " Ratios against 2geom-cubic_r." : " (lib2geom not built in.)");
-  std::printf("%-18s %10s %10s %8s\n", "method", "us/stroke", "seg/stroke", "ratio");
-  const double reference = reporter.MedianSeconds(methods.back().name) / kStrokes * 1e6;
-  for (const Method& m : methods) {
-    const double us = reporter.MedianSeconds(m.name) / kStrokes * 1e6;
-    if (us == 0.0) continue;
-    std::printf("%-18s %10.1f %10.2f %7.2fx\n", m.name.c_str(), us,
-                reporter.Counter(m.name, "seg/stroke"), reference > 0 ? us / reference : 0.0);
-  }
-  std::vector<double> wall, cpu;
-  CallLatencies(3, wall, cpu);
-  std::printf("\nzv-builder-live, one AddInputPoint + GetTrailingSamples, %zu calls:\n",
-              wall.size());
-  for (const std::vector<double>* v : {&wall, &cpu})
-    std::printf("  %-11s median %.2f us, 99.9%% %.2f us, worst %.2f us\n",
-                v == &wall ? "wall time" : "thread CPU", (*v)[v->size() / 2],
-                (*v)[v->size() * 999 / 1000], v->back());
-  benchmark::Shutdown();
-  return 0;
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    std::printf("\n%d pen strokes of %u points. us/stroke: median CPU time per stroke.%s\n\n",
+                kStrokes, kPointsPerStroke,
+                ZV_HAVE_2GEOM ? " Ratios against 2geom-cubic_r." : " (lib2geom not built in.)");
+    std::printf("%-18s %10s %10s %8s\n", "method", "us/stroke", "seg/stroke", "ratio");
+    const double reference = reporter.MedianSeconds(methods.back().name) / kStrokes * 1e6;
+    for (const Method& m : methods) {
+      const double us = reporter.MedianSeconds(m.name) / kStrokes * 1e6;
+      if (us == 0.0) continue;
+      std::printf("%-18s %10.1f %10.2f %7.2fx\n", m.name.c_str(), us,
+                  reporter.Counter(m.name, "seg/stroke"), reference > 0 ? us / reference : 0.0);
+    }
+    std::vector<double> wall, cpu;
+    CallLatencies(3, wall, cpu);
+    std::printf("\nzv-builder-live, one AddInputPoint + GetTrailingSamples, %zu calls:\n",
+                wall.size());
+    for (const std::vector<double>* v : {&wall, &cpu})
+      std::printf("  %-11s median %.2f us, 99.9%% %.2f us, worst %.2f us\n",
+                  v == &wall ? "wall time" : "thread CPU", (*v)[v->size() / 2],
+                  (*v)[v->size() * 999 / 1000], v->back());
+  });
 }

@@ -151,31 +151,27 @@ int main(int argc, char** argv) {
       benchmark::RegisterBenchmark(Name(c.name, n).c_str(), BM_Edit, c, n)
           ->Unit(benchmark::kMicrosecond);
   }
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-
-  std::printf(
-      "\nMedian CPU time per edit (us), and per edit per 100,000 segments (us): linear growth\n"
-      "keeps the second figure flat across sizes. 'x ref' is the time per edit over that of the\n"
-      "bare vector erase+insert at the same size.\n\n");
-  std::vector<std::string> names = {"vector erase+insert"};
-  std::vector<int> perIteration = {2};
-  for (const Case& c : cases) {
-    names.push_back(c.name);
-    perIteration.push_back(c.editsPerIteration);
-  }
-  std::printf("%-24s %8s %10s %12s %8s\n", "edit", "segments", "us/edit", "us/edit/100k", "x ref");
-  for (size_t k = 0; k < names.size(); ++k) {
-    for (unsigned int n : kSizes) {
-      const double us = reporter.MedianSeconds(Name(names[k], n)) * 1e6 / perIteration[k];
-      const double ref = reporter.MedianSeconds(Name(names[0], n)) * 1e6 / perIteration[0];
-      if (us == 0.0) continue;
-      std::printf("%-24s %8u %10.3f %12.3f %7.2fx\n", names[k].c_str(), n, us, us * 100000.0 / n,
-                  ref > 0.0 ? us / ref : 0.0);
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    std::printf(
+        "\nMedian CPU time per edit (us), and per edit per 100,000 segments (us): linear growth\n"
+        "keeps the second figure flat across sizes. 'x ref' is the time per edit over that of the\n"
+        "bare vector erase+insert at the same size.\n\n");
+    std::vector<std::string> names = {"vector erase+insert"};
+    std::vector<int> perIteration = {2};
+    for (const Case& c : cases) {
+      names.push_back(c.name);
+      perIteration.push_back(c.editsPerIteration);
     }
-  }
-  benchmark::Shutdown();
-  return 0;
+    std::printf("%-24s %8s %10s %12s %8s\n", "edit", "segments", "us/edit", "us/edit/100k",
+                "x ref");
+    for (size_t k = 0; k < names.size(); ++k) {
+      for (unsigned int n : kSizes) {
+        const double us = reporter.MedianSeconds(Name(names[k], n)) * 1e6 / perIteration[k];
+        const double ref = reporter.MedianSeconds(Name(names[0], n)) * 1e6 / perIteration[0];
+        if (us == 0.0) continue;
+        std::printf("%-24s %8u %10.3f %12.3f %7.2fx\n", names[k].c_str(), n, us, us * 100000.0 / n,
+                    ref > 0.0 ? us / ref : 0.0);
+      }
+    }
+  });
 }

@@ -179,30 +179,27 @@ int main(int argc, char** argv) {
                                                          benchmark::Counter::kInvert);
     })->Unit(benchmark::kMillisecond);
   }
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-
-  constexpr int kRounds = 41;
-  const std::vector<double> paired = PairedRatios(methods, kRounds);
-  std::printf(
-      "\nOne closed subpath of %d cubics at tolerance %.2f. ns/point: median CPU time per output\n"
-      "point; ratio: ns/point over that of the free flattener (below 1 is faster); paired: median\n"
-      "ratio over %d rounds that time every method back to back.\n\n",
-      kCubics, kTolerance, kRounds);
-  std::printf("%-32s %10s %10s %8s %8s\n", "method", "points", "ns/point", "ratio", "paired");
-  const std::string ref = methods[0].name;
-  const double refNs = reporter.MedianSeconds(ref) * 1e3 * 1e6 / reporter.Counter(ref, "points");
-  for (size_t k = 0; k < methods.size(); ++k) {
-    const Method& m = methods[k];
-    const double ms = reporter.MedianSeconds(m.name) * 1e3;
-    if (ms == 0.0) continue;
-    const double pts = reporter.Counter(m.name, "points");
-    const double ns = ms * 1e6 / pts;
-    std::printf("%-32s %10.0f %10.3f %7.2fx %7.3fx\n", m.name.c_str(), pts, ns, ns / refNs,
-                paired[k]);
-  }
-  benchmark::Shutdown();
-  return 0;
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    constexpr int kRounds = 41;
+    const std::vector<double> paired = PairedRatios(methods, kRounds);
+    std::printf(
+        "\nOne closed subpath of %d cubics at tolerance %.2f. ns/point: median CPU time per "
+        "output\n"
+        "point; ratio: ns/point over that of the free flattener (below 1 is faster); paired: "
+        "median\n"
+        "ratio over %d rounds that time every method back to back.\n\n",
+        kCubics, kTolerance, kRounds);
+    std::printf("%-32s %10s %10s %8s %8s\n", "method", "points", "ns/point", "ratio", "paired");
+    const std::string ref = methods[0].name;
+    const double refNs = reporter.MedianSeconds(ref) * 1e3 * 1e6 / reporter.Counter(ref, "points");
+    for (size_t k = 0; k < methods.size(); ++k) {
+      const Method& m = methods[k];
+      const double ms = reporter.MedianSeconds(m.name) * 1e3;
+      if (ms == 0.0) continue;
+      const double pts = reporter.Counter(m.name, "points");
+      const double ns = ms * 1e6 / pts;
+      std::printf("%-32s %10.0f %10.3f %7.2fx %7.3fx\n", m.name.c_str(), pts, ns, ns / refNs,
+                  paired[k]);
+    }
+  });
 }

@@ -134,32 +134,27 @@ BENCHMARK(BM_EigenRandom)->Repetitions(5)->ReportAggregatesOnly(true);
 #endif
 
 int main(int argc, char** argv) {
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
   TheCurve();  // built outside the timings
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-  benchmark::Shutdown();
-
-  auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name) * 1e9; };
-  const double zvSeq = median("BM_ZvSequential"), zvRnd = median("BM_ZvRandom");
-  const double zvRep = median("BM_ZvRepeated"), lock = median("BM_ZvLockUnlock");
-  std::printf("\nmedian ns per evaluation, %d keys\n", kKeys);
-  std::printf("  zv  Eval sequential %8.1f   random %8.1f   repeated time %8.1f\n", zvSeq, zvRnd,
-              zvRep);
-  if (zvSeq > 0.0) {
-    std::printf("  lock + unlock alone %8.1f   (%.0f%% of a sequential Eval)\n", lock,
-                100.0 * lock / zvSeq);
-  }
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name) * 1e9; };
+    const double zvSeq = median("BM_ZvSequential"), zvRnd = median("BM_ZvRandom");
+    const double zvRep = median("BM_ZvRepeated"), lock = median("BM_ZvLockUnlock");
+    std::printf("\nmedian ns per evaluation, %d keys\n", kKeys);
+    std::printf("  zv  Eval sequential %8.1f   random %8.1f   repeated time %8.1f\n", zvSeq, zvRnd,
+                zvRep);
+    if (zvSeq > 0.0) {
+      std::printf("  lock + unlock alone %8.1f   (%.0f%% of a sequential Eval)\n", lock,
+                  100.0 * lock / zvSeq);
+    }
 #if ZV_HAVE_EIGEN
-  const double eSeq = median("BM_EigenSequential"), eRnd = median("BM_EigenRandom");
-  std::printf("  eigen slerp + eulerAngles sequential %8.1f   random %8.1f\n", eSeq, eRnd);
-  if (eSeq > 0.0 && eRnd > 0.0) {
-    std::printf("  ratio zv / eigen: sequential %.2f (target 3), random %.2f\n", zvSeq / eSeq,
-                zvRnd / eRnd);
-  }
+    const double eSeq = median("BM_EigenSequential"), eRnd = median("BM_EigenRandom");
+    std::printf("  eigen slerp + eulerAngles sequential %8.1f   random %8.1f\n", eSeq, eRnd);
+    if (eSeq > 0.0 && eRnd > 0.0) {
+      std::printf("  ratio zv / eigen: sequential %.2f (target 3), random %.2f\n", zvSeq / eSeq,
+                  zvRnd / eRnd);
+    }
 #else
-  std::printf("  Eigen not found at configure time: no comparison\n");
+    std::printf("  Eigen not found at configure time: no comparison\n");
 #endif
-  return 0;
+  });
 }

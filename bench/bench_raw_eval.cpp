@@ -80,27 +80,27 @@ BENCHMARK(BM_GslLinearRandom)->Repetitions(5)->ReportAggregatesOnly(true);
 
 int main(int argc, char** argv) {
   TheCurve();  // built outside the timings
-  ZvMedianReporter reporter;
-  if (EvalBenchRun(argc, argv, reporter)) return 1;
-
-  auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name) * 1e9; };
-  const double zvSeq = median("BM_RawSequential"), zvRnd = median("BM_RawRandom");
-  const double lock = median("BM_RawLockUnlock");
-  std::printf("\nmedian ns per evaluation, raw curve of %d keys\n", kEvalBenchKeys);
-  std::printf("  zv  Eval sequential %8.1f   random %8.1f\n", zvSeq, zvRnd);
-  if (zvSeq > 0.0 && zvRnd > 0.0) {
-    std::printf("  lock + unlock alone %8.1f   (%.0f%% of a sequential Eval, %.0f%% of a random)\n",
-                lock, 100.0 * lock / zvSeq, 100.0 * lock / zvRnd);
-  }
+  EvalBenchQuietPeers();
+  return ZvRunBenchmarks(argc, argv, [&](const ZvMedianReporter& reporter) {
+    auto median = [&](const char* name) { return reporter.FunctionMedianSeconds(name) * 1e9; };
+    const double zvSeq = median("BM_RawSequential"), zvRnd = median("BM_RawRandom");
+    const double lock = median("BM_RawLockUnlock");
+    std::printf("\nmedian ns per evaluation, raw curve of %d keys\n", kEvalBenchKeys);
+    std::printf("  zv  Eval sequential %8.1f   random %8.1f\n", zvSeq, zvRnd);
+    if (zvSeq > 0.0 && zvRnd > 0.0) {
+      std::printf(
+          "  lock + unlock alone %8.1f   (%.0f%% of a sequential Eval, %.0f%% of a random)\n", lock,
+          100.0 * lock / zvSeq, 100.0 * lock / zvRnd);
+    }
 #if ZV_HAVE_GSL
-  const double gslSeq = median("BM_GslLinearSequential"), gslRnd = median("BM_GslLinearRandom");
-  std::printf("  gsl linear sequential %6.1f   random %8.1f\n", gslSeq, gslRnd);
-  if (gslSeq > 0.0 && gslRnd > 0.0) {
-    std::printf("  ratio zv / gsl: sequential %.2f, random %.2f (target 2.5)\n", zvSeq / gslSeq,
-                zvRnd / gslRnd);
-  }
+    const double gslSeq = median("BM_GslLinearSequential"), gslRnd = median("BM_GslLinearRandom");
+    std::printf("  gsl linear sequential %6.1f   random %8.1f\n", gslSeq, gslRnd);
+    if (gslSeq > 0.0 && gslRnd > 0.0) {
+      std::printf("  ratio zv / gsl: sequential %.2f, random %.2f (target 2.5)\n", zvSeq / gslSeq,
+                  zvRnd / gslRnd);
+    }
 #else
-  std::printf("  GSL not found at configure time: no comparison\n");
+    std::printf("  GSL not found at configure time: no comparison\n");
 #endif
-  return 0;
+  });
 }

@@ -158,11 +158,6 @@ void PrintSummary(const ZvMedianReporter& r) {
 
 int main(int argc, char** argv) {
   Register();
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  ZvMedianReporter reporter;
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-  PrintSummary(reporter);
-  benchmark::Shutdown();
-  return 0;
+  return ZvRunBenchmarks(argc, argv,
+                         [&](const ZvMedianReporter& reporter) { PrintSummary(reporter); });
 }

@@ -65,16 +65,11 @@ void EvalBenchLockLoop(benchmark::State& state, const Curve& curve) {
   }
 }
 
-// Runs the registered benchmarks into the reporter; 0, or 1 for arguments it does not know.
-inline int EvalBenchRun(int argc, char** argv, ZvMedianReporter& reporter) {
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
+// Before the run: an error of a peer must not abort it.
+inline void EvalBenchQuietPeers() {
 #if ZV_HAVE_GSL
-  gsl_set_error_handler_off();  // a peer's error must not abort the run
+  gsl_set_error_handler_off();
 #endif
-  benchmark::RunSpecifiedBenchmarks(&reporter);
-  benchmark::Shutdown();
-  return 0;
 }
 
 #endif

@@ -1,5 +1,6 @@
 // Console reporter that also keeps each benchmark's CPU time, so that a benchmark binary can
-// print its own summary (medians and ratios to its peers) after the run.
+// print its own summary (medians and ratios to its peers) after the run, and the main that
+// every such binary shares.
 #ifndef ZV_BENCH_MEDIAN_REPORTER_H
 #define ZV_BENCH_MEDIAN_REPORTER_H
 
@@ -64,5 +65,19 @@ class ZvMedianReporter : public benchmark::ConsoleReporter {
   std::map<std::string, double> functionMedians_;
   std::map<std::string, std::map<std::string, benchmark::Counter>> counters_;
 };
+
+// Runs the benchmarks registered so far, as the command line selects them, through a
+// ZvMedianReporter, then hands the reporter to `summary` to print the medians and ratios.
+// Answers main's exit status: 1 for an argument the benchmark library does not know.
+template <class Summary>
+int ZvRunBenchmarks(int argc, char** argv, Summary&& summary) {
+  benchmark::Initialize(&argc, argv);
+  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
+  ZvMedianReporter reporter;
+  benchmark::RunSpecifiedBenchmarks(&reporter);
+  benchmark::Shutdown();
+  summary(static_cast<const ZvMedianReporter&>(reporter));
+  return 0;
+}
 
 #endif
